@@ -1,0 +1,81 @@
+# One function per kind of target, so that every library, program and test is built with the same
+# language level, warnings and sanitizers.
+
+set(CMAKE_CXX_STANDARD 17)
+set(CMAKE_CXX_STANDARD_REQUIRED ON)
+set(CMAKE_CXX_EXTENSIONS OFF)
+set(CMAKE_EXPORT_COMPILE_COMMANDS ON)
+set(CMAKE_AUTOMOC_MOC_OPTIONS --no-notes)
+
+find_program(ORVALA_CCACHE ccache)
+if(ORVALA_CCACHE)
+  set(CMAKE_CXX_COMPILER_LAUNCHER ${ORVALA_CCACHE})
+endif()
+
+function(orvala_settings target)
+  target_compile_options(${target} PRIVATE -Wall -Wextra -Wpedantic -Wshadow -Wnon-virtual-dtor
+                                           -Woverloaded-virtual)
+  if(ORVALA_WERROR)
+    target_compile_options(${target} PRIVATE -Werror)
+  endif()
+  if(ORVALA_SANITIZE)
+    target_compile_options(${target} PRIVATE -fsanitize=address,undefined -fno-omit-frame-pointer)
+    target_link_options(${target} PRIVATE -fsanitize=address,undefined)
+  endif()
+endfunction()
+
+function(orvala_qt_settings target)
+  set_target_properties(${target} PROPERTIES AUTOMOC ON)
+  target_compile_definitions(${target} PRIVATE QT_NO_FOREACH QT_NO_JAVA_STYLE_ITERATORS
+                                               QT_DEPRECATED_WARNINGS)
+endfunction()
+
+# orvala_library(<name> SOURCES <files> LINKS <targets>): a static library of the client, one for
+# each folder below src/. Includes are written from src/, as in "network/connection.h".
+function(orvala_library name)
+  cmake_parse_arguments(arg "" "" "SOURCES;LINKS" ${ARGN})
+  add_library(orvala_${name} STATIC ${arg_SOURCES})
+  target_include_directories(orvala_${name} PUBLIC ${CMAKE_SOURCE_DIR}/src)
+  target_link_libraries(orvala_${name} PUBLIC ${arg_LINKS})
+  orvala_settings(orvala_${name})
+  orvala_qt_settings(orvala_${name})
+endfunction()
+
+# orvala_program(<name> SOURCES <files> LINKS <targets> [QT]): an executable.
+function(orvala_program name)
+  cmake_parse_arguments(arg "QT" "" "SOURCES;LINKS" ${ARGN})
+  add_executable(${name} ${arg_SOURCES})
+  target_link_libraries(${name} PRIVATE ${arg_LINKS})
+  orvala_settings(${name})
+  if(arg_QT)
+    orvala_qt_settings(${name})
+  endif()
+endfunction()
+
+# orvala_test(<name> SOURCES <files> LINKS <targets>): a QtTest program, run by ctest on the
+# off-screen platform.
+function(orvala_test name)
+  cmake_parse_arguments(arg "" "" "SOURCES;LINKS" ${ARGN})
+  orvala_program(${name} QT SOURCES ${arg_SOURCES} LINKS ${arg_LINKS} Qt5::Test)
+  target_include_directories(${name} PRIVATE ${CMAKE_SOURCE_DIR}/tests)
+  add_test(NAME ${name} COMMAND ${name})
+  set_tests_properties(${name} PROPERTIES ENVIRONMENT "QT_QPA_PLATFORM=offscreen" TIMEOUT 120)
+endfunction()
+
+# orvala_gtest(<name> SOURCES <files> LINKS <targets>): a GoogleTest program, run by ctest.
+function(orvala_gtest name)
+  cmake_parse_arguments(arg "" "" "SOURCES;LINKS" ${ARGN})
+  orvala_program(${name} SOURCES ${arg_SOURCES} LINKS ${arg_LINKS} GTest::gtest GTest::gtest_main)
+  target_include_directories(${name} PRIVATE ${CMAKE_SOURCE_DIR}/tests)
+  add_test(NAME ${name} COMMAND ${name})
+  set_tests_properties(${name} PROPERTIES TIMEOUT 120)
+endfunction()
+
+# orvala_subdirectories(<dirs>): add each folder that has a build file.
+function(orvala_subdirectories)
+  foreach(dir ${ARGN})
+    if(EXISTS ${CMAKE_CURRENT_SOURCE_DIR}/${dir}/CMakeLists.txt)
+      add_subdirectory(${dir})
+    endif()
+  endforeach()
+endfunction()

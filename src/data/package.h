@@ -1,0 +1,31 @@
+#pragma once
+
+#include "data/orvaladata.h"
+#include "data/packageproperty.h"
+
+#include <QList>
+
+// One downloaded list: its request, its records in feed order and the feed's total count. Owned by
+// the package manager's cache; owns its records.
+class Package
+{
+public:
+    Package() = default;
+    ~Package() { qDeleteAll(mDataList); }
+    Package(const Package &) = delete;
+    Package &operator=(const Package &) = delete;
+
+    // The record, or null outside the list or when this list holds records of another kind.
+    template <typename Record>
+    const Record *record(int index) const
+    {
+        if (index < 0 || index >= mDataList.size() || !Record::isRecordOf(mProperty.mType))
+            return nullptr;
+        return static_cast<const Record *>(mDataList.at(index));
+    }
+    int count() const { return mDataList.size(); }
+
+    PackageProperty mProperty;
+    QList<OrvalaData *> mDataList;
+    int mTotalCount = 0; // of the whole feed, for featured photos and searches
+};

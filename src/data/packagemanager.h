@@ -1,0 +1,50 @@
+#pragma once
+
+#include "data/package.h"
+#include "network/errorcode.h"
+
+#include <QHash>
+#include <QList>
+#include <QString>
+
+class Connection;
+
+// Owner of every list that a screen shows. Fetches pages, keeps recent ones for a while, fetches
+// the next featured page ahead, and answers on the screen's static call-back.
+//
+//   screen: getPackage() -> package, or null -> downloadPage(property, callback)
+//           callback(property, code): on 0, getPackage() again; otherwise show the failure.
+//
+// A request for a list that is already under way joins it: only the newest call-back is called, so
+// a screen compares the property it gets with the one it now wants. GUI thread only.
+class PackageManager
+{
+public:
+    using Callback = void (*)(PackageProperty &property, ErrorCode code);
+
+    // The cached list when it can serve this page, else null. It stays valid until the next call
+    // that may evict (any download's end): never keep the pointer over the event loop without
+    // asking again.
+    static Package *getPackage(PackageProperty &property);
+    // True when a request for this list is running afterwards; false calls nothing.
+    static bool downloadPage(PackageProperty &property, Callback callback);
+    static void prepareNextDatas(PackageProperty property, int startIndex);
+
+    static void networkCallback(QString url, CallbackType type, int param);
+    static void handleDownloadFinished(const QString &url);
+    static void handleDownloadError(const QString &url);
+
+    static void addToCache(PackageProperty &property, Package *package, bool appended);
+    static void removeCache(PackageProperty &property);
+    static bool canBeRemovedByNewlyArrivedPackage(PackageProperty &property, int arrivedType);
+    // Forgets every list and ends every request, without calling back.
+    static void clearAll();
+
+private:
+    static QHash<QString, Package *> mCachedPackageHash;
+    static QHash<QString, Connection *> mDownlodingConnectionHash;
+    static QHash<QString, PackageProperty> mDownlodingPropertyHash;
+    static QHash<QString, Callback> mCallbackFunHash;
+    static QList<PackageProperty> mRecentlyAccessPackagePropertyList;
+    static QList<PackageProperty> mRecentlyDownloadedPackagePropertyList;
+};
