@@ -111,10 +111,12 @@ Comment::Comment(const JsonObject &entry)
 
 PhotoTagList::PhotoTagList(const JsonObject &entry)
     : mTagList(splitTags(text(entry, QStringLiteral("title"))))
-{}
+{
+}
 
 FavoritePeople::FavoritePeople(const JsonObject &entry)
     : mUser(text(entry, QStringLiteral("gphoto$user")))
     , mNickname(text(entry, QStringLiteral("gphoto$nickname")))
     , mThumbnail(text(entry, QStringLiteral("gphoto$thumbnail")))
-{}
+{
+}

@@ -69,9 +69,8 @@ QString UrlCreator::getUrl(const PackageProperty &property)
 
 QString UrlCreator::getUrlOfFeaturedPhotosList(int startIndex, int itemsPerPage)
 {
-    const QString path =
-        QStringLiteral("/data/feed/api/featured?start-index=%1&max-results=%2&v=2"
-                       "&prettyprint=true&alt=json&strict=true&kind=photo");
+    const QString path = QStringLiteral("/data/feed/api/featured?start-index=%1&max-results=%2&v=2"
+                                        "&prettyprint=true&alt=json&strict=true&kind=photo");
     return feedUrl(path.arg(QString::number(startIndex), QString::number(itemsPerPage)));
 }
 
