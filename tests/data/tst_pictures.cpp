@@ -47,11 +47,6 @@ QByteArray chunk(const QByteArray &type, const QByteArray &data, quint32 claimed
     return bigEndian(claimed, 4) + type + data + QByteArray(4, '\0');
 }
 
-QByteArray withPngSize(QByteArray png, quint32 width, quint32 height)
-{
-    return png.replace(16, 8, bigEndian(width, 4) + bigEndian(height, 4));
-}
-
 // Puts a size into the frame header; its marker may become that of a progressive picture.
 QByteArray withJpegSize(QByteArray jpeg, quint32 width, quint32 height, char marker)
 {
@@ -128,13 +123,13 @@ private slots:
         QTest::newRow("huge text chunk") << header + chunk("tEXt", "abcd\0e", 0x3fffffff);
         QTest::newRow("negative chunk") << header + chunk("IDAT", "abcd", 0xfffffff0);
         QTest::newRow("cut png") << png.left(png.size() - 20);
-        QTest::newRow("huge png") << withPngSize(png, 30000, 30000);
+        QTest::newRow("huge png") << encoded(QImage(8001, 8000, QImage::Format_Mono), "png");
         QTest::newRow("huge jpeg") << withJpegSize(jpeg, 65000, 65000, '\xc0');
         QTest::newRow("progressive jpeg") << withJpegSize(jpeg, 11000, 5800, '\xc2');
         QTest::newRow("empty jpeg") << withJpegSize(jpeg, 0, 0, '\xc0');
         QTest::newRow("jpeg header") << jpeg.left(jpeg.indexOf("\xff\xda"));
         QTest::newRow("huge gif") << QByteArray("GIF89a\xff\xff\xff\xff\x00\x00\x00", 13);
-        QTest::newRow("bmp without pixels") << encoded(plain(64, 64), "bmp").left(60);
+        QTest::newRow("bmp header") << encoded(plain(64, 64), "bmp").left(30);
     }
     void refusesWhatIsNoPicture()
     {

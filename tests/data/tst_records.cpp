@@ -13,6 +13,12 @@ using OwnedPackage = std::unique_ptr<Package>;
 
 namespace {
 
+// Feeds are written with single quotes here.
+QByteArray json(QByteArray text)
+{
+    return text.replace('\'', '"');
+}
+
 PackageProperty listOf(PackageType type, int start = 1)
 {
     PackageProperty property;
@@ -34,14 +40,16 @@ OwnedPackage packageOf(PackageType type, const QByteArray &text)
     return OwnedPackage(package);
 }
 
-const QByteArray photoEntry = R"({"title":{"$t":"Sea &amp; sky"},
- "gphoto$width":{"$t":"4000"},"gphoto$height":{"$t":"3000"},
- "content":{"src":"http://h/abc/name.jpg"},
- "media$group":{"media$thumbnail":[{"url":"t1"},{"url":"t2"}],
-                "media$keywords":{"$t":"a, b, , c"}},
- "gphoto$albumid":{"$t":"al"},"author":[{"gphoto$user":{"$t":"ann"}},{"gphoto$user":{"$t":"x"}}],
- "published":{"$t":"2012-03-01T10:20:30.000Z"},"summary":{"$t":"s"},
- "gphoto$id":{"$t":"5555555555555555555"},"gphoto$commentCount":{"$t":7}})";
+const QByteArray photoEntry =
+    json("{'title':{'$t':'Sea &amp; sky'},"
+         "'gphoto$width':{'$t':'4000'},'gphoto$height':{'$t':'3000'},"
+         "'content':{'src':'http://h/abc/name.jpg'},"
+         "'media$group':{'media$thumbnail':[{'url':'t1'},{'url':'t2'}],"
+         "'media$keywords':{'$t':'a, b, , c'}},"
+         "'gphoto$albumid':{'$t':'al'},'author':[{'gphoto$user':{'$t':'ann'}},{'gphoto$user':{'$t':"
+         "'x'}}],"
+         "'published':{'$t':'2012-03-01T10:20:30.000Z'},'summary':{'$t':'s'},"
+         "'gphoto$id':{'$t':'5555555555555555555'},'gphoto$commentCount':{'$t':7}}");
 
 } // namespace
 
@@ -92,13 +100,14 @@ private slots:
 
     void readsAlbumWithFeedOwner()
     {
-        const QByteArray entry = R"({"published":{"$t":"2012-03-01T10:00:00.000Z"},
- "title":{"$t":"T"},"gphoto$numphotos":{"$t":12},"gphoto$id":{"$t":"id"},
- "gphoto$user":{"$t":"bob"},"gphoto$nickname":{"$t":"Bob"},
- "media$group":{"media$content":[{"url":"c1"},{"url":"c2"}],
-                "media$thumbnail":[{"url":"t1"},{"url":"t2"}]}})";
+        const QByteArray entry =
+            json("{'published':{'$t':'2012-03-01T10:00:00.000Z'},"
+                 "'title':{'$t':'T'},'gphoto$numphotos':{'$t':12},'gphoto$id':{'$t':'id'},"
+                 "'gphoto$user':{'$t':'bob'},'gphoto$nickname':{'$t':'Bob'},"
+                 "'media$group':{'media$content':[{'url':'c1'},{'url':'c2'}],"
+                 "'media$thumbnail':[{'url':'t1'},{'url':'t2'}]}}");
         const OwnedPackage package =
-            packageOf(ALBUMS_LIST, feed(entry, R"("gphoto$user":{"$t":"owner"})"));
+            packageOf(ALBUMS_LIST, feed(entry, json("'gphoto$user':{'$t':'owner'}")));
         const auto *album = package->record<Album>(0);
         QVERIFY(album);
         QCOMPARE(album->userId() + album->user() + album->nickname(), QString("ownerbobBob"));
@@ -110,9 +119,10 @@ private slots:
 
     void showsCommentsInThePlatformsZone()
     {
-        const QByteArray text = feed(R"({"published":{"$t":"2012-03-01T10:00:00.000Z"},
- "author":[{"gphoto$user":{"$t":"u"},"gphoto$nickname":{"$t":"n"}}],"content":{"$t":"hi"},
- "gphoto$id":{"$t":"c"},"gphoto$photoid":{"$t":"p"}})");
+        const QByteArray text = feed(json("{'published':{'$t':'2012-03-01T10:00:00.000Z'},"
+                                          "'author':[{'gphoto$user':{'$t':'u'},'gphoto$nickname':{'"
+                                          "$t':'n'}}],'content':{'$t':'hi'},"
+                                          "'gphoto$id':{'$t':'c'},'gphoto$photoid':{'$t':'p'}}"));
         IsSetTimeZone = false;
         OwnedPackage package = packageOf(PHOTO_COMMENTS_LIST, text);
         const QDateTime created(QDate(2012, 3, 1), QTime(10, 0), Qt::UTC);
@@ -133,10 +143,12 @@ private slots:
 
     void readsTagsAndPeople()
     {
-        OwnedPackage package = packageOf(PHOTO_TAGS_LIST, feed(R"({"title":{"$t":"x, y, "}})"));
+        OwnedPackage package = packageOf(PHOTO_TAGS_LIST, feed(json("{'title':{'$t':'x, y, '}}")));
         QCOMPARE(package->record<PhotoTagList>(0)->tagList(), QStringList({"x", "y"}));
-        package = packageOf(FAVORITE_PEOPLE_LIST, feed(R"({"gphoto$user":{"$t":"u"},
- "gphoto$nickname":{"$t":"n"},"gphoto$thumbnail":{"$t":"t"}})"));
+        package =
+            packageOf(FAVORITE_PEOPLE_LIST,
+                      feed(json("{'gphoto$user':{'$t':'u'},"
+                                "'gphoto$nickname':{'$t':'n'},'gphoto$thumbnail':{'$t':'t'}}")));
         const auto *person = package->record<FavoritePeople>(0);
         QCOMPARE(person->user() + person->nickname() + person->thumbnail(), QString("unt"));
     }
@@ -167,7 +179,7 @@ private slots:
 
     void readsTotalCountOfPagedFeeds()
     {
-        const QByteArray total = R"("openSearch$totalResults":{"$t":"321"})";
+        const QByteArray total = json("'openSearch$totalResults':{'$t':'321'}");
         for (const auto &[type, expected] : {std::pair{FEATURED_PHOTOS_LIST, 321},
                                              {SEARCH_PHOTOS_LIST, 321},
                                              {SEARCH_MORE_PHOTOS_LIST, 321},
