@@ -197,6 +197,7 @@ private slots:
         QTest::newRow("smaller") << QSize(400, 300) << QSize(100, 100) << QSize(100, 75);
         QTest::newRow("larger") << QSize(40, 30) << QSize(400, 400) << QSize(400, 300);
         QTest::newRow("same") << QSize(400, 300) << QSize(400, 320) << QSize(400, 300);
+        QTest::newRow("a little smaller") << QSize(288, 216) << QSize(280, 200) << QSize(266, 200);
         QTest::newRow("thin") << QSize(1000, 1) << QSize(100, 100) << QSize(100, 1);
         QTest::newRow("no size yet") << QSize(40, 30) << QSize(0, 0) << QSize(40, 30);
     }
@@ -211,6 +212,9 @@ private slots:
         SystemConfig::setScale(1);
         QTEST(target.shown.size(), "shown");
         QCOMPARE(target.shown.devicePixelRatio(), 1.5);
+        const QImage shown = target.shown.toImage();
+        for (const QPoint &corner : {QPoint(0, 0), shown.rect().bottomRight()})
+            QCOMPARE(shown.pixelColor(corner), QColor(Qt::red));
     }
 
     void deliversFailuresOnlyToThoseWhoStillWait()
