@@ -44,7 +44,12 @@ void FormScrollWidget::addItem(QFrame *cell, int position)
         cell->installEventFilter(filter);
     else
         logLine("ScrollWidget not has parentWidget()");
-    mLayout->addWidget(cell, position / mColumn, position % mColumn);
+    const int row = position / mColumn;
+    mLayout->addWidget(cell, row, position % mColumn);
+    // Columns keep their places while cells are hidden, and rows stay at the top.
+    mLayout->setColumnStretch(position % mColumn, 1);
+    mLayout->setRowStretch(row, 0);
+    mLayout->setRowStretch(mLayout->rowCount(), 1);
 }
 
 // A scroll area puts its viewport between itself and its content.
