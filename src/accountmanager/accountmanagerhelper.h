@@ -47,6 +47,10 @@ public:
     static QStringList getAccounts(bool oauth);
 
 private:
+    static bool isSignedIn();
+    // Takes tokens and name of the account from the database.
+    static void readTokens(const QString &user);
+
     static QString mLatestLoginAccount;
     static QString mCurrentToken;
     static QString mRefreshToken;
