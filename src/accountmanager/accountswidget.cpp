@@ -9,7 +9,14 @@
 
 namespace {
 
-constexpr int kSpacing = 8;
+constexpr int kSpacing = 7;
+constexpr int kPitch = AccountItem::rowHeight + kSpacing;
+
+// As many whole rows as fit into the height; at least one.
+int rowsIn(int height)
+{
+    return std::max(1, (height + kSpacing) / kPitch);
+}
 
 } // namespace
 
@@ -23,7 +30,7 @@ AccountsWidget::AccountsWidget(QWidget *parent)
     auto *content = new QWidget;
     content->setObjectName(QStringLiteral("rows"));
     mRows = new QVBoxLayout(content);
-    mRows->setContentsMargins(0, 0, 8, 0);
+    mRows->setContentsMargins(0, 0, kSpacing, 0);
     mRows->setSpacing(kSpacing);
     mRows->addStretch();
     setWidget(content);
@@ -83,10 +90,7 @@ void AccountsWidget::moveFocus(int rows)
 
 void AccountsWidget::movePage(int pages)
 {
-    if (mItems.isEmpty())
-        return;
-    const int rowHeight = mItems.first()->height() + kSpacing;
-    moveFocus(pages * std::max(1, viewport()->height() / rowHeight));
+    moveFocus(pages * rowsIn(viewport()->height()));
 }
 
 bool AccountsWidget::hasRowFocus() const
@@ -97,4 +101,17 @@ bool AccountsWidget::hasRowFocus() const
 void AccountsWidget::keyPressEvent(QKeyEvent *event)
 {
     event->ignore(); // a scroll area would take the arrows for itself
+}
+
+QSize AccountsWidget::sizeHint() const
+{
+    // The same for any number of rows: the page must not move with it.
+    return {400, kPitch};
+}
+
+void AccountsWidget::resizeEvent(QResizeEvent *event)
+{
+    const int rows = rowsIn(height()) * kPitch - kSpacing;
+    setViewportMargins(0, 0, 0, std::max(0, height() - rows));
+    QScrollArea::resizeEvent(event);
 }
