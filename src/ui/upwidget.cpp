@@ -91,8 +91,8 @@ void UpWidget::setUserName(const QString &name)
     if (!mUserName)
         return;
     const QString whole = name.left(kLongestName);
-    const int usable = SystemConfig::mScreen_Width - SystemConfig::borderLeft() -
-                       SystemConfig::borderRight();
+    const int usable =
+        SystemConfig::mScreen_Width - SystemConfig::borderLeft() - SystemConfig::borderRight();
     const QFontMetrics metrics = mUserName->fontMetrics();
     const bool fits = metrics.horizontalAdvance(whole) < usable / 5;
     mUserName->setText(fits ? whole
