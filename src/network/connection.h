@@ -10,6 +10,8 @@
 #include <QPointer>
 #include <QSslError>
 #include <QString>
+#include <QTimer>
+#include <QUrl>
 
 class QNetworkAccessManager;
 
@@ -43,10 +45,15 @@ public:
     static Connection *createConfiguredConnection();
     static Connection *findConnection(const QString &url);
     // Takes the connection out of the pool and schedules its deletion; false if it was not in it.
+    // A request under way is aborted and reports nothing more. Removed while it reports its error,
+    // it still reports the finish that belongs to it, before removal can be noticed elsewhere.
     static bool removeConnection(Connection *connection);
     static void removeAllConnections();
     // Empties the pool without deleting anything.
     static void clearConnections();
+    // Closes the sockets that ended requests have left open for the next ones; for the moment when
+    // the network link goes down, since they lead nowhere then.
+    static void closeIdleSockets();
 
     ~Connection() override;
 
@@ -93,14 +100,27 @@ public slots:
 private:
     Connection();
 
+    void release();
+    ErrorCode startGet(const QUrl &url);
+    ErrorCode wait(QNetworkReply *reply);
+    void adopt(QNetworkReply *reply);
+    void dropReply();
+    bool enforceMaximumSize();
+    void follow(const QUrl &target);
+    void fail(QNetworkReply::NetworkError code, const QString &text);
+
     QPointer<QNetworkAccessManager> mManager;
     QString mProxyHost;
     quint16 mProxyPort = 0;
     QNetworkProxy mProxy;
     ErrorCode mErrorCode = NET_SUCCESS;
-    QNetworkReply *mReply = nullptr;
+    QPointer<QNetworkReply> mReply;
     QString mUrl;
     int mTimeout = 40000;
     Callback mCallback = nullptr;
     qint64 mMaximumSize = 32 * 1024 * 1024;
+    qint64 mTaken = 0; // bytes of the current reply that the owner has read
+    int mHops = 0;     // redirects of the current request
+    QTimer mNextHop;
+    bool mIsRemoved = false;
 };

@@ -78,6 +78,10 @@ public:
     static void setProxyFile(const QString &path);
 
 private:
+    static QSettings &settings();
+    static int integer(const char *key, int fallback);
+    static QSize size(const char *key, const QSize &fallback);
+
     static QString mConfigFile;
     static QSettings *mSettings;
 };
