@@ -1,6 +1,7 @@
 #include "ui/upwidget.h"
 
 #include "base/i18n.h"
+#include "common/ui/picture.h"
 #include "common/ui/remotekeys.h"
 #include "network/systemconfig.h"
 
@@ -36,7 +37,7 @@ UpWidget::UpWidget(QWidget *parent)
     QHBoxLayout *row = makeRow();
     setLayout(row);
     auto *logo = new QLabel(this);
-    logo->setPixmap(QPixmap(QStringLiteral(":/res/orvala_icon_big.png")));
+    logo->setPixmap(loadPicture(QStringLiteral(":/res/orvala_icon_big.png")));
     row->addWidget(logo);
     addSpacer(row);
 
