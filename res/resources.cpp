@@ -2,5 +2,7 @@
 
 #include <QtGlobal>
 
-
-void initResources() { Q_INIT_RESOURCE(pictures); }
+void initResources()
+{
+    Q_INIT_RESOURCE(pictures);
+}
