@@ -11,8 +11,6 @@
 
 #include <memory>
 
-Q_DECLARE_METATYPE(MisbehavingServer::Behaviour)
-
 namespace {
 
 using Server = MisbehavingServer;
@@ -68,6 +66,7 @@ void TestOAuthUtil::init()
     AccountManagerHelper::setAccessToken("old");
     AccountManagerHelper::setRefreshToken("old-r");
     AccountManagerHelper::setExpires(0);
+    qRegisterMetaType<QNetworkReply *>();
     serve(Server::Plain);
 }
 
