@@ -47,6 +47,7 @@ void AccountsWidget::setAccounts(const QVector<Account> &accounts)
             mCurrent = mItems.size();
         addRow(account);
     }
+    mRows->activate(); // the rows have their places at once, for the focus to scroll to
 }
 
 void AccountsWidget::addRow(const Account &account)
@@ -58,6 +59,7 @@ void AccountsWidget::addRow(const Account &account)
         emit selectItem();
     });
     mRows->insertWidget(row, item);
+    item->show(); // at once: a hidden row takes no focus
     mItems << item;
 }
 
