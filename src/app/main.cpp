@@ -7,6 +7,7 @@
 #include "paths.h"
 #include "platform/ipc.h"
 #include "platform/ipcthread.h"
+#include "res/resources.h"
 
 #include <QFontDatabase>
 #include <QLocale>
@@ -116,6 +117,7 @@ int main(int argc, char *argv[])
     MainApplication application(argc, argv);
     applyScale();
     readScreenSize();
+    initResources();
     MainWidget mainWidget;
     setLocale();
     setFont();
