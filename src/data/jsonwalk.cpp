@@ -1,7 +1,5 @@
 #include "data/jsonwalk.h"
 
-#include <cmath>
-
 namespace jsonwalk {
 
 namespace {
@@ -17,24 +15,6 @@ const QString &wrappedKey()
 {
     static const QString key = QStringLiteral("$t");
     return key;
-}
-
-bool isWholeNumber(const QVariant &value, double limit)
-{
-    if (value.userType() != QMetaType::Double)
-        return false;
-    const double number = value.toDouble();
-    return std::fabs(number) <= limit && std::trunc(number) == number;
-}
-
-QString toText(const QVariant &value)
-{
-    const double exactLimit = 9007199254740992.0; // doubles are whole and exact up to 2^53
-    if (value.userType() == QMetaType::QString)
-        return *static_cast<const QString *>(value.constData());
-    if (isWholeNumber(value, exactLimit))
-        return QString::number(static_cast<qint64>(value.toDouble()));
-    return value.toString();
 }
 
 } // namespace
@@ -67,7 +47,10 @@ const QVariantList &list(const JsonObject &parent, const QString &key)
 
 QString string(const JsonObject &parent, const QString &key)
 {
-    return toText(member(parent, key));
+    const QVariant &value = member(parent, key);
+    if (value.userType() == QMetaType::QString)
+        return *static_cast<const QString *>(value.constData());
+    return JsonParser::string(parent, key);
 }
 
 QString text(const JsonObject &parent, const QString &key)

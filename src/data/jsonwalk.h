@@ -17,7 +17,7 @@ const QVariantList &toList(const QVariant &value);
 const JsonObject &object(const JsonObject &parent, const QString &key);
 const QVariantList &list(const JsonObject &parent, const QString &key);
 
-// The member converted to text; whole numbers are written out in full.
+// The member converted to text, as JsonParser::string does it.
 QString string(const JsonObject &parent, const QString &key);
 
 // The service wraps a text as {"key": {"$t": "text"}}: that text, or its value as an integer (0

@@ -26,9 +26,9 @@ QString oneLine(const QString &text)
 
 QString albumCaption(const Album &album, const PhotoItem &cell)
 {
-    const QString title = QFontMetrics(cell.captionFont())
-                              .elidedText(oneLine(album.title()), Qt::ElideRight,
-                                          cell.captionWidth());
+    const QString title =
+        QFontMetrics(cell.captionFont())
+            .elidedText(oneLine(album.title()), Qt::ElideRight, cell.captionWidth());
     const QString unit = album.numPhotos() == 1 ? I18n::label(18) : I18n::label(26);
     return title + QLatin1Char('\n') + QString::number(album.numPhotos()) + unit;
 }

@@ -49,7 +49,8 @@ void FormScrollWidget::addItem(QFrame *cell, int position)
     // Columns keep their places while cells are hidden, and rows stay at the top.
     mLayout->setColumnStretch(position % mColumn, 1);
     mLayout->setRowStretch(row, 0);
-    mLayout->setRowStretch(mLayout->rowCount(), 1);
+    if (row + 1 >= mLayout->rowCount())
+        mLayout->setRowStretch(row + 1, 1);
 }
 
 // A scroll area puts its viewport between itself and its content.

@@ -40,7 +40,7 @@ void HomeState::openAlbum(int cell, const Album &album)
     logLine("Back up the select album index");
     mSelectedAlbumIndex = cell;
     mSelectedAlbumStart = mCurrentProperty.mStartIndex;
-    mInitIndex = 0;
+    mInitStart = 1;
     mCurrentProperty.mStartIndex = 1;
     mCurrentProperty.mType = TYPE_ALBUM_PHOTOS;
     mCurrentProperty.mUserId = album.userId();
@@ -53,7 +53,7 @@ void HomeState::openPerson(int cell, const FavoritePeople &person)
     mSelectedAlbumStart = 1;
     mSelectedPersonIndex = cell;
     mSelectedPersonStart = mCurrentProperty.mStartIndex;
-    mInitIndex = 0;
+    mInitStart = 1;
     mCurrentProperty = PackageProperty();
     mCurrentProperty.mType = TYPE_ALBUM_LIST;
     mCurrentProperty.mUserId = person.user();
@@ -101,14 +101,39 @@ bool HomeState::pageUp(int arg)
 
 bool HomeState::pageDown(int arg, const Package *package)
 {
-    const paging::Page page =
-        paging::pageDown(mCurrentProperty.mStartIndex, total(package), arg);
+    const paging::Page page = paging::pageDown(mCurrentProperty.mStartIndex, total(package), arg);
     if (!page.exists)
         return false;
     mIsPageDown = true;
     mIndexInPage = page.indexInPage;
     mCurrentProperty.mStartIndex = page.startIndex;
     return true;
+}
+
+void HomeState::packageArrived(const Package &package)
+{
+    if (hasFeedTotal(mCurrentProperty.mType))
+        mTotalPhotoNum = package.mTotalCount;
+    else if (mInitStart > 1 && mInitStart <= package.count())
+        mCurrentProperty.mStartIndex = mInitStart;
+    mInitStart = 1;
+}
+
+void HomeState::moveTo(int cell, const Package *package)
+{
+    mPhotoIndexInTotal = recordIndex(cell) + 1;
+    const bool isFeatured = mCurrentProperty.mType == TYPE_FEATURED_PHOTOS;
+    mPhotoDataCount = isFeatured ? mTotalPhotoNum : package ? package->count() : 0;
+    if (mPhotoDataCount == 0)
+        logLine("enter mPhotoDataCount is 0");
+}
+
+void HomeState::restart()
+{
+    if (hasFeedTotal(mCurrentProperty.mType))
+        return;
+    mInitStart = mCurrentProperty.mStartIndex;
+    mCurrentProperty.mStartIndex = 1;
 }
 
 int HomeState::recordIndex(int cell) const
@@ -127,4 +152,11 @@ bool HomeState::isPhotoList() const
 {
     const int type = mCurrentProperty.mType;
     return type == TYPE_ALBUM_PHOTOS || hasFeedTotal(type);
+}
+
+bool HomeState::isWholeList() const
+{
+    const int type = mCurrentProperty.mType;
+    return type == TYPE_ALBUM_LIST || type == TYPE_ALBUM_PHOTOS || type == TYPE_FAVORITE_PEOPLE ||
+           type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
 }

@@ -45,7 +45,14 @@ struct HomeState
     bool pageUp(int arg);
     bool pageDown(int arg, const Package *package);
 
+    // The list wanted has come, or a cell of it takes the focus.
+    void packageArrived(const Package &package);
+    void moveTo(int cell, const Package *package);
+    // The list is to be fetched anew, to show the same page.
+    void restart();
+
     int recordIndex(int cell) const;
     int total(const Package *package) const;
     bool isPhotoList() const;
+    bool isWholeList() const; // pages are cut from a list that is held
 };

@@ -36,8 +36,7 @@ Page pageDown(int startIndex, int total, int arg)
 
 int recordIndex(int packageType, int startIndex, int cell)
 {
-    const int first =
-        packageType == TYPE_SEARCH_MORE_PHOTOS ? startIndex % blockSize : startIndex;
+    const int first = packageType == TYPE_SEARCH_MORE_PHOTOS ? startIndex % blockSize : startIndex;
     return first + cell - 1;
 }
 

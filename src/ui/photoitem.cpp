@@ -1,5 +1,6 @@
 #include "ui/photoitem.h"
 
+#include "common/ui/picture.h"
 #include "data/packageproperty.h"
 #include "network/systemconfig.h"
 #include "ui/stretchedpicture.h"
@@ -43,7 +44,7 @@ PhotoItem::PhotoItem(QWidget *parent)
     column->setContentsMargins(0, 0, 0, 0);
     column->setSpacing(0);
     column->addWidget(mArea);
-    column->addWidget(mCaption, 0, Qt::AlignCenter);
+    column->addWidget(mCaption, 0, Qt::AlignHCenter);
 
     auto *row = new QHBoxLayout(mArea);
     row->setContentsMargins(0, 0, 0, 0);
@@ -202,7 +203,7 @@ void PictureArea::paintEvent(QPaintEvent *)
     QPainter painter(this);
     if (mColour.alpha() > 0)
         painter.fillRect(rect(), mColour);
-    painter.drawPixmap(0, 0, stretchedPicture(mResource, size(), 0, this));
+    painter.drawPixmap(0, 0, loadPicture(mResource, size()));
 }
 
 void PhotoLabel::setPicture(const QPixmap &picture)

@@ -7,7 +7,8 @@
 class QWidget;
 
 // Pictures of the program's own, fitted once to the size they are painted at and then blitted: a
-// style sheet's border-image would be stretched anew at every paint.
+// style sheet's border-image would be stretched anew at every paint. Both keep what they made in
+// Qt's pixmap cache.
 
 // The picture stretched over the size (in layout pixels), its outer margin of that many pixels kept
 // unstretched, as border-image does. Null when there is no such picture.

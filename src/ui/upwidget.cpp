@@ -1,6 +1,7 @@
 #include "ui/upwidget.h"
 
 #include "base/i18n.h"
+#include "common/ui/picture.h"
 #include "common/ui/remotekeys.h"
 #include "network/systemconfig.h"
 
@@ -13,6 +14,7 @@
 namespace {
 
 constexpr int kLongestName = 10000; // characters that are laid out at most
+constexpr QSize kLogo(192, 52);     // leaves room for the widest name between usual borders
 
 void addSpacer(QHBoxLayout *row)
 {
@@ -36,7 +38,7 @@ UpWidget::UpWidget(QWidget *parent)
     QHBoxLayout *row = makeRow();
     setLayout(row);
     auto *logo = new QLabel(this);
-    logo->setPixmap(QPixmap(QStringLiteral(":/res/orvala_icon_big.png")));
+    logo->setPixmap(loadPicture(QStringLiteral(":/res/orvala_icon_big.png"), kLogo));
     row->addWidget(logo);
     addSpacer(row);
 
@@ -91,8 +93,8 @@ void UpWidget::setUserName(const QString &name)
     if (!mUserName)
         return;
     const QString whole = name.left(kLongestName);
-    const int usable = SystemConfig::mScreen_Width - SystemConfig::borderLeft() -
-                       SystemConfig::borderRight();
+    const int usable =
+        SystemConfig::mScreen_Width - SystemConfig::borderLeft() - SystemConfig::borderRight();
     const QFontMetrics metrics = mUserName->fontMetrics();
     const bool fits = metrics.horizontalAdvance(whole) < usable / 5;
     mUserName->setText(fits ? whole

@@ -141,8 +141,8 @@ MisbehavingServer::Behaviour MisbehavingServer::behaviourFor(const Request &requ
 {
     if (!mQueue.isEmpty())
         return mQueue.takeFirst();
-    const int query = request.path.indexOf('?');
-    return mByPath.value(request.path.left(query), answer("not here", 404));
+    const QByteArray path = request.path.split('?').first();
+    return mByPath.value(path, answer("not here", 404));
 }
 
 MisbehavingServer::Behaviour MisbehavingServer::raw(const QByteArray &bytes, bool close)

@@ -82,3 +82,5 @@ private:
     QHash<QTcpSocket *, QByteArray> mBuffers; // of the open connections
     int mConnections = 0;
 };
+
+Q_DECLARE_METATYPE(MisbehavingServer::Behaviour)

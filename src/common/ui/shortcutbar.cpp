@@ -1,5 +1,6 @@
 #include "common/ui/shortcutbar.h"
 
+#include "common/ui/picture.h"
 #include "common/ui/remotekeys.h"
 
 #include <QHBoxLayout>
@@ -35,7 +36,7 @@ QPixmap pictureOf(int key)
 {
     for (const Cap &cap : kCaps) {
         if (cap.key == key)
-            return QPixmap(QString::fromLatin1(cap.picture));
+            return loadPicture(QString::fromLatin1(cap.picture));
     }
     return QPixmap();
 }
