@@ -136,18 +136,15 @@ void Connection::adopt(QNetworkReply *reply)
     mTaken = 0;
 }
 
-// The reply may be in the middle of a signal: it is silenced at once and deleted later.
+// The reply may be in the middle of a signal: it is silenced at once and deleted later, which also
+// ends its transfer.
 void Connection::dropReply()
 {
-    const QPointer<QNetworkReply> reply = mReply;
-    mReply.clear();
-    if (!reply)
+    if (!mReply)
         return;
-    disconnect(reply, nullptr, this, nullptr);
-    if (reply->isRunning() && reply->error() == QNetworkReply::NoError)
-        reply->abort();
-    if (reply)
-        reply->deleteLater();
+    disconnect(mReply, nullptr, this, nullptr);
+    mReply->deleteLater();
+    mReply.clear();
 }
 
 void Connection::handleReadyRead()
@@ -169,9 +166,13 @@ void Connection::handleDownloadProgress(qint64 bytesReceived, qint64 bytesTotal)
 {
     if (bytesReceived < 0)
         return;
-    if (bytesTotal <= 0 && mReply)
-        bytesTotal = mReply->header(QNetworkRequest::ContentLengthHeader).toLongLong();
+    const qint64 announced =
+        mReply ? mReply->header(QNetworkRequest::ContentLengthHeader).toLongLong() : 0;
+    // At the end the toolkit makes up a total for an answer that never had one.
+    const bool isMadeUp = mReply && announced <= 0 && bytesTotal == bytesReceived;
     if (bytesTotal <= 0)
+        bytesTotal = announced;
+    if (bytesTotal <= 0 || isMadeUp)
         return;
     const qint64 received = qMin(bytesReceived, bytesTotal);
     returnCallback(CALLBACK_PROGRESS, int(received * 100 / bytesTotal));
@@ -288,7 +289,8 @@ ErrorCode Connection::syncRequest()
     QTimer timer;
     timer.setSingleShot(true);
     if (!reply || !connect(&timer, &QTimer::timeout, &loop, &QEventLoop::quit) ||
-        !connect(reply, &QNetworkReply::finished, &loop, &QEventLoop::quit))
+        !connect(reply, &QNetworkReply::finished, &loop, &QEventLoop::quit) ||
+        !connect(reply, &QObject::destroyed, &loop, &QEventLoop::quit))
         return mErrorCode = NET_FAILED;
 
     const QPointer<Connection> self(this);

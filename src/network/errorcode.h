@@ -5,19 +5,16 @@
 // Result of every network operation and call-back: 0 for success, negative for failures.
 using ErrorCode = qint32;
 
-enum : ErrorCode {
-    NET_SUCCESS = 0,
-    NET_REJECTED = -1,       // managers: no factory for a list, not an image, refused by the server
-    NET_NOT_PERMITTED = -86, // the server refused the operation
-    NET_FAILED = -87,        // any other failure
-    NET_NO_DATA = -88,       // a finished download had no bytes (managers)
-    NET_CONTENT_ERROR = -89, // access denied, or content not found
-    NET_TIMEOUT = -90,       // a synchronous request ran out of time, or the transport did
-    NET_CANCELED = -91,      // the request was aborted, also for answers above the size cap
-    NET_REFUSED = -92,       // connection refused
-    NET_HOST_NOT_FOUND = -93, // host name not found
-    NET_OUT_OF_MEMORY = -97,  // a buffer could not be allocated (managers)
-};
+constexpr ErrorCode NET_SUCCESS = 0;
+constexpr ErrorCode NET_NOT_PERMITTED = -86;  // the server refused the operation
+constexpr ErrorCode NET_FAILED = -87;         // any other failure
+constexpr ErrorCode NET_NO_DATA = -88;        // a finished download had no bytes (managers)
+constexpr ErrorCode NET_CONTENT_ERROR = -89;  // access denied, or content not found
+constexpr ErrorCode NET_TIMEOUT = -90;        // the wait, or the transport, ran out of time
+constexpr ErrorCode NET_CANCELED = -91;       // aborted, also for answers above the size cap
+constexpr ErrorCode NET_REFUSED = -92;        // connection refused
+constexpr ErrorCode NET_HOST_NOT_FOUND = -93; // host name not found
+constexpr ErrorCode NET_OUT_OF_MEMORY = -97;  // a buffer could not be allocated (managers)
 
 // What a Connection reports to its owner.
 enum CallbackType : int {

@@ -26,5 +26,3 @@ public:
     // The value converted to text, or the empty text.
     static QString string(const JsonObject &object, const QString &key);
 };
-
-Q_DECLARE_METATYPE(JsonObject)

@@ -35,12 +35,15 @@ QSettings &SystemConfig::settings()
 
 int SystemConfig::integer(const char *key, int fallback)
 {
-    return settings().value(QLatin1String(key), fallback).toInt();
+    bool isNumber = false;
+    const int number = settings().value(QLatin1String(key)).toInt(&isNumber);
+    return isNumber ? number : fallback;
 }
 
 QSize SystemConfig::size(const char *key, const QSize &fallback)
 {
-    return settings().value(QLatin1String(key), fallback).toSize();
+    const QSize found = settings().value(QLatin1String(key)).toSize();
+    return found.isValid() ? found : fallback;
 }
 
 QString SystemConfig::value(const QString &key, const QString &fallback)
@@ -79,7 +82,8 @@ QString SystemConfig::proxyAddress()
 
 qint64 SystemConfig::imageCacheSize()
 {
-    return settings().value(QStringLiteral("Max/CacheSize")).toInt() * (Q_INT64_C(1) << 20);
+    constexpr qint64 bytesPerMegabyte = 1 << 20;
+    return integer("Max/CacheSize", 0) * bytesPerMegabyte;
 }
 
 int SystemConfig::photoDownloaderNumber()

@@ -6,8 +6,9 @@
 class QSettings;
 
 // The program's read-only settings: getters over one INI file, each with the default that holds
-// when the file or the key is missing. Every getter reads the key afresh. The screen size is set
-// once at start; all sizes are pixels of the 1280 x 720 layout unless a comment says otherwise.
+// when the file or the key is missing or the value is no number. Every getter reads the key afresh.
+// The screen size is set once at start; all sizes are pixels of the 1280 x 720 layout unless a
+// comment says otherwise.
 class SystemConfig
 {
 public:

@@ -1,0 +1,100 @@
+#include "accountmanager/accountswidget.h"
+
+#include "accountmanager/accountitem.h"
+
+#include <QKeyEvent>
+#include <QVBoxLayout>
+
+#include <algorithm>
+
+namespace {
+
+constexpr int kSpacing = 8;
+
+} // namespace
+
+AccountsWidget::AccountsWidget(QWidget *parent)
+    : QScrollArea(parent)
+{
+    setFocusPolicy(Qt::NoFocus);
+    setFrameShape(QFrame::NoFrame);
+    setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
+    setWidgetResizable(true);
+    auto *content = new QWidget;
+    content->setObjectName(QStringLiteral("rows"));
+    mRows = new QVBoxLayout(content);
+    mRows->setContentsMargins(0, 0, 8, 0);
+    mRows->setSpacing(kSpacing);
+    mRows->addStretch();
+    setWidget(content);
+}
+
+void AccountsWidget::setAccounts(const QVector<Account> &accounts)
+{
+    const QString current = currentAccount();
+    qDeleteAll(mItems);
+    mItems.clear();
+    mCurrent = 0;
+    for (const Account &account : accounts) {
+        if (account.mail == current)
+            mCurrent = mItems.size();
+        addRow(account);
+    }
+}
+
+void AccountsWidget::addRow(const Account &account)
+{
+    auto *item = new AccountItem(account.mail, account.name, widget());
+    const int row = mItems.size();
+    connect(item, &AccountItem::selectItem, this, [this, row] {
+        mCurrent = row;
+        emit selectItem();
+    });
+    mRows->insertWidget(row, item);
+    mItems << item;
+}
+
+bool AccountsWidget::contains(const QString &mail) const
+{
+    return std::any_of(mItems.cbegin(), mItems.cend(),
+                       [&mail](const AccountItem *item) { return item->mail() == mail; });
+}
+
+QString AccountsWidget::currentAccount() const
+{
+    return mItems.isEmpty() ? QString() : mItems.at(mCurrent)->mail();
+}
+
+void AccountsWidget::focusCurrent()
+{
+    if (mItems.isEmpty())
+        return;
+    mItems.at(mCurrent)->setFocus();
+    ensureWidgetVisible(mItems.at(mCurrent), 0, 0);
+}
+
+void AccountsWidget::moveFocus(int rows)
+{
+    if (mItems.isEmpty())
+        return;
+    mCurrent = qBound(0, mCurrent + rows, mItems.size() - 1);
+    focusCurrent();
+}
+
+void AccountsWidget::movePage(int pages)
+{
+    if (mItems.isEmpty())
+        return;
+    const int rowHeight = mItems.first()->height() + kSpacing;
+    moveFocus(pages * std::max(1, viewport()->height() / rowHeight));
+}
+
+bool AccountsWidget::hasRowFocus() const
+{
+    return !mItems.isEmpty() && mItems.at(mCurrent)->hasFocus();
+}
+
+void AccountsWidget::keyPressEvent(QKeyEvent *event)
+{
+    event->ignore(); // a scroll area would take the arrows for itself
+}

@@ -1,0 +1,15 @@
+#include "ui/widget.h"
+
+#include "ui/homewidget.h"
+
+#include <QStackedLayout>
+
+Widget::Widget(QWidget *parent)
+    : QWidget(parent)
+    , mHomeWidget(new HomeWidget(this))
+    , mPages(new QStackedLayout(this))
+{
+    mPages->setContentsMargins(0, 0, 0, 0);
+    mPages->addWidget(mHomeWidget);
+    setFocusProxy(mHomeWidget);
+}
