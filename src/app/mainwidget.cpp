@@ -192,10 +192,8 @@ void MainWidget::showStatusDialog(bool status)
                        I18n::prompt(status ? PluggedInPrompt : PluggedOutPrompt),
                        {I18n::button(CloseButton)});
     connect(dialog, &QPopupDialog::accepted, this, &MainWidget::closeStatusDialog);
-    dialog->adjustSize();
-    dialog->move(rect().center() - dialog->rect().center());
+    dialog->setFocusPolicy(Qt::NoFocus); // its keys are handed to it
     dialog->show();
-    dialog->raise();
     mStatusDialog = dialog;
     MainApplication::setDialog(dialog, true);
 }
