@@ -44,7 +44,7 @@ PhotoItem::PhotoItem(QWidget *parent)
     column->setContentsMargins(0, 0, 0, 0);
     column->setSpacing(0);
     column->addWidget(mArea);
-    column->addWidget(mCaption, 0, Qt::AlignCenter);
+    column->addWidget(mCaption, 0, Qt::AlignHCenter);
 
     auto *row = new QHBoxLayout(mArea);
     row->setContentsMargins(0, 0, 0, 0);
