@@ -65,6 +65,7 @@ std::string pictureMimeType(std::string_view bytes)
 PhotoFile::PhotoFile(const std::string &path)
 {
     startVips();
+    vips_error_clear(); // decoders leave texts behind even where they succeed
     // Opened without blocking: a pipe among the photos would hold the thread for ever.
     const int descriptor = ::open(path.c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC);
     if (descriptor < 0) {
