@@ -1,10 +1,11 @@
 #include "pictures/picturefolder.h"
 
+#include "pictures/wholefile.h"
+
 #include <algorithm>
 #include <fcntl.h>
 #include <fstream>
 #include <glib.h>
-#include <iterator>
 #include <sys/stat.h>
 #include <vector>
 
@@ -12,7 +13,7 @@ namespace fs = std::filesystem;
 
 namespace {
 
-constexpr const char *temporariesName = "incoming";
+constexpr const char *temporariesName = ".incoming";
 
 struct KeptFile
 {
@@ -21,15 +22,28 @@ struct KeptFile
     fs::file_time_type used;
 };
 
+// Whether the path is as pathOf() makes them. Nothing else is ever dropped, not even when somebody
+// points the store at a folder of photos.
+bool isKeptFile(const fs::directory_entry &entry)
+{
+    constexpr std::size_t nameLength = 60 + 4; // the hash without its two folders, and ".jpg"
+    const fs::path &path = entry.path();
+    const fs::path folder = path.parent_path();
+    std::error_code ignored;
+    return path.filename().native().size() == nameLength &&
+           folder.filename().native().size() == 2 &&
+           folder.parent_path().filename().native().size() == 2 && entry.is_regular_file(ignored);
+}
+
 std::vector<KeptFile> keptFiles(const fs::path &folder)
 {
     std::vector<KeptFile> files;
     std::error_code error;
     fs::recursive_directory_iterator at(folder, error), end;
     for (; !error && at != end; at.increment(error)) {
-        std::error_code ignored;
-        if (!at->is_regular_file(ignored) || at->path().parent_path().filename() == temporariesName)
+        if (!isKeptFile(*at))
             continue;
+        std::error_code ignored;
         const auto size = static_cast<std::int64_t>(at->file_size(ignored));
         if (!ignored)
             files.push_back({at->path(), size, at->last_write_time(ignored)});
@@ -98,8 +112,7 @@ fs::path PictureFolder::temporaryPath()
 std::string PictureFolder::find(const std::string &key) const
 {
     const fs::path path = pathOf(key);
-    std::ifstream file(path, std::ios::binary);
-    std::string bytes(std::istreambuf_iterator<char>(file), {});
+    std::string bytes = readWholeFile(path);
     if (!isWholeJpeg(bytes))
         return {};
     ::utimensat(AT_FDCWD, path.c_str(), nullptr, 0);
@@ -123,25 +136,26 @@ void PictureFolder::keep(const std::string &key, std::string_view bytes)
     }
     const std::lock_guard<std::mutex> lock(mMutex);
     mBytes += static_cast<std::int64_t>(bytes.size());
-    if (mBytes > mMaximumBytes)
+    if (mBytes > mMaximumBytes) {
+        mShouldTidy = true;
         mWake.notify_one();
+    }
 }
 
 void PictureFolder::tidyWhenAsked()
 {
-    bool counted = false;
     std::unique_lock<std::mutex> lock(mMutex);
     while (true) {
-        mWake.wait(lock, [&] { return !counted || mEnding || mBytes > mMaximumBytes; });
-        if (counted && mBytes <= mMaximumBytes)
+        mWake.wait(lock, [this] { return mShouldTidy || mEnding; });
+        if (!mShouldTidy)
             return;
+        mShouldTidy = false;
         const std::int64_t before = mBytes;
         lock.unlock();
         const std::int64_t left = dropLongestUnused();
         lock.lock();
         // What was kept meanwhile may be counted twice: too much is tidied early, never too late.
         mBytes += left - before;
-        counted = true;
     }
 }
 

@@ -36,6 +36,7 @@ private:
     std::condition_variable mWake;
     std::int64_t mBytes = 0;
     std::uint64_t mTemporaries = 0;
+    bool mShouldTidy = true; // what is there at start has to be counted
     bool mEnding = false;
     std::thread mTidier;
 };

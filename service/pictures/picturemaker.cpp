@@ -1,15 +1,13 @@
 #include "pictures/picturemaker.h"
 
 #include "pictures/photofile.h"
-
-#include <fstream>
-#include <iterator>
+#include "pictures/wholefile.h"
 
 namespace {
 
 constexpr int jpegQuality = 88;
-constexpr double backgroundLevel =
-    24; // behind transparent parts: the dark of the television's screens
+// Behind transparent parts: the dark of the television's screens.
+constexpr double backgroundLevel = 24;
 
 MadePicture failure(std::string error)
 {
@@ -81,12 +79,6 @@ MadePicture encoded(VipsImage *image)
 
 } // namespace
 
-std::string readWholeFile(const std::string &path)
-{
-    std::ifstream file(path, std::ios::binary);
-    return std::string(std::istreambuf_iterator<char>(file), {});
-}
-
 MadePicture makePicture(const std::string &sourcePath, int width)
 {
     PhotoFile file(sourcePath);
@@ -96,9 +88,8 @@ MadePicture makePicture(const std::string &sourcePath, int width)
     if (width == 0 && isUprightSrgbJpeg(file, header.get())) {
         MadePicture original;
         original.isOriginal = true;
-        original.result.bytes = readWholeFile(sourcePath);
-        original.result.mimeType = "image/jpeg";
-        return original;
+        original.result = {readWholeFile(sourcePath), "image/jpeg", {}};
+        return original.result.bytes.empty() ? failure("the file cannot be read") : original;
     }
     const GObjectPtr<VipsImage> shrunk = shrunkUpright(file.source(), header.get(), width);
     const GObjectPtr<VipsImage> opaque = shrunk ? flattened(shrunk.get()) : nullptr;

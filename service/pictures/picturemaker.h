@@ -14,6 +14,3 @@ struct MadePicture
 // Decodes the photo and makes an upright sRGB JPEG without metadata, at most `width` pixels wide; 0
 // keeps the photo's size. Takes as long as decoding does. May be called from any thread.
 MadePicture makePicture(const std::string &sourcePath, int width);
-
-// The whole file, empty when it cannot be read.
-std::string readWholeFile(const std::string &path);
