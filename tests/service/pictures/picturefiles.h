@@ -1,6 +1,5 @@
 #pragma once
 
-#include <array>
 #include <cstdint>
 #include <filesystem>
 #include <string>
@@ -18,32 +17,29 @@ private:
     std::filesystem::path mPath;
 };
 
-using Colour = std::array<int, 3>;
-
-// What a decoded picture shows in the middle of its quarters.
 struct Decoded
 {
     int width = 0;
     int height = 0;
     bool hasMetadata = false;
-    Colour topLeft = {}, topRight = {}, bottomLeft = {}, bottomRight = {};
+    std::string quarters; // one letter each, in the order of writePicture(); ? is another colour
 };
 
-// Writes a picture with a red, a green, a blue and a white quarter, from the top left to the bottom
-// right. The ending decides the format. Seen upright it is `width` x `height`; its pixels are
-// turned for `orientation`, which the file's EXIF data then names.
+// Writes a picture with a red, a green, a blue and a white quarter ("rgbw") from the top left to
+// the bottom right, as it lies in the file. The ending decides the format.
 void writePicture(const std::string &path, int width, int height, int orientation = 1);
 
 // Sets an EXIF, IPTC or XMP value in the file; may be repeated for values that come in lists.
 void addMetadata(const std::string &path, const std::string &key, const std::string &value);
 
 void writeBytes(const std::string &path, const std::string &bytes);
-std::string readBytes(const std::string &path);
 
-// The total size of the files below the folder.
-std::int64_t sizeOfFiles(const std::string &folder);
+// Number and total size of the files below a folder.
+struct Contents
+{
+    int files = 0;
+    std::int64_t bytes = 0;
+};
+Contents contentsOf(const std::string &folder);
 
 Decoded decode(const std::string &bytes);
-
-// Whether the channels differ by no more than what JPEG loses.
-bool isNear(const Colour &a, const Colour &b);
