@@ -1,0 +1,96 @@
+#include "pictures/picturemaker.h"
+
+#include "pictures/photofile.h"
+
+#include <fstream>
+#include <iterator>
+
+namespace {
+
+constexpr int jpegQuality = 88;
+constexpr double backgroundLevel =
+    24; // behind transparent parts: the dark of the television's screens
+
+MadePicture failure(std::string error)
+{
+    MadePicture made;
+    made.result.error = std::move(error);
+    return made;
+}
+
+// Whether the file's own bytes are what a full-size picture has to be.
+bool isUprightSrgbJpeg(const PhotoFile &file, VipsImage *header)
+{
+    return file.mimeType() == "image/jpeg" && vips_image_get_orientation(header) == 1 &&
+           vips_image_get_bands(header) == 3 &&
+           vips_image_get_typeof(header, VIPS_META_ICC_NAME) == 0;
+}
+
+GObjectPtr<VipsImage> shrunkUpright(VipsSource *source, int width)
+{
+    VipsImage *shrunk = nullptr;
+    const int result = vips_thumbnail_source(
+        source, &shrunk, width > 0 ? width : VIPS_MAX_COORD, "height", VIPS_MAX_COORD, "size",
+        VIPS_SIZE_DOWN, "export_profile", "srgb", "fail_on", VIPS_FAIL_ON_TRUNCATED, nullptr);
+    return GObjectPtr<VipsImage>(result == 0 ? shrunk : nullptr);
+}
+
+// Eight bits a channel, without transparency.
+GObjectPtr<VipsImage> flattened(VipsImage *image)
+{
+    VipsImage *opaque = nullptr;
+    VipsImage *bytes = nullptr;
+    if (vips_image_hasalpha(image)) {
+        VipsArrayDouble *background = vips_array_double_new(&backgroundLevel, 1);
+        const int result = vips_flatten(image, &opaque, "background", background, nullptr);
+        vips_area_unref(VIPS_AREA(background));
+        if (result != 0)
+            return nullptr;
+    } else {
+        opaque = image;
+        g_object_ref(opaque);
+    }
+    const GObjectPtr<VipsImage> owner(opaque);
+    return GObjectPtr<VipsImage>(vips_cast_uchar(opaque, &bytes, nullptr) == 0 ? bytes : nullptr);
+}
+
+MadePicture encoded(VipsImage *image)
+{
+    void *buffer = nullptr;
+    std::size_t size = 0;
+    if (vips_jpegsave_buffer(image, &buffer, &size, "Q", jpegQuality, "strip", TRUE,
+                             "optimize_coding", TRUE, "interlace", FALSE, "subsample_mode",
+                             VIPS_FOREIGN_SUBSAMPLE_ON, nullptr) != 0)
+        return failure(takeVipsError());
+    MadePicture made;
+    made.result.bytes.assign(static_cast<const char *>(buffer), size);
+    made.result.mimeType = "image/jpeg";
+    g_free(buffer);
+    return made;
+}
+
+} // namespace
+
+std::string readWholeFile(const std::string &path)
+{
+    std::ifstream file(path, std::ios::binary);
+    return std::string(std::istreambuf_iterator<char>(file), {});
+}
+
+MadePicture makePicture(const std::string &sourcePath, int width)
+{
+    PhotoFile file(sourcePath);
+    const GObjectPtr<VipsImage> header = file.readHeader();
+    if (!header)
+        return failure(file.error());
+    if (width == 0 && isUprightSrgbJpeg(file, header.get())) {
+        MadePicture original;
+        original.isOriginal = true;
+        original.result.bytes = readWholeFile(sourcePath);
+        original.result.mimeType = "image/jpeg";
+        return original;
+    }
+    const GObjectPtr<VipsImage> shrunk = shrunkUpright(file.source(), width);
+    const GObjectPtr<VipsImage> opaque = shrunk ? flattened(shrunk.get()) : nullptr;
+    return opaque ? encoded(opaque.get()) : failure(takeVipsError());
+}
