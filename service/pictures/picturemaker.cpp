@@ -26,12 +26,22 @@ bool isUprightSrgbJpeg(const PhotoFile &file, VipsImage *header)
            vips_image_get_typeof(header, VIPS_META_ICC_NAME) == 0;
 }
 
-GObjectPtr<VipsImage> shrunkUpright(VipsSource *source, int width)
+// Colours are converted only where the file names them: converting plain sRGB would shift them.
+bool needsColourConversion(VipsImage *header)
 {
+    return vips_image_get_typeof(header, VIPS_META_ICC_NAME) != 0 ||
+           vips_image_get_interpretation(header) == VIPS_INTERPRETATION_CMYK;
+}
+
+// A cut file is an error: half a photo over grey would be kept for good.
+GObjectPtr<VipsImage> shrunkUpright(VipsSource *source, VipsImage *header, int width)
+{
+    const char *profile = needsColourConversion(header) ? "srgb" : nullptr;
     VipsImage *shrunk = nullptr;
-    const int result = vips_thumbnail_source(
-        source, &shrunk, width > 0 ? width : VIPS_MAX_COORD, "height", VIPS_MAX_COORD, "size",
-        VIPS_SIZE_DOWN, "export_profile", "srgb", "fail_on", VIPS_FAIL_ON_TRUNCATED, nullptr);
+    const int result = vips_thumbnail_source(source, &shrunk, width > 0 ? width : VIPS_MAX_COORD,
+                                             "height", VIPS_MAX_COORD, "size", VIPS_SIZE_DOWN,
+                                             "import_profile", "cmyk", "export_profile", profile,
+                                             "option_string", "fail_on=truncated", nullptr);
     return GObjectPtr<VipsImage>(result == 0 ? shrunk : nullptr);
 }
 
@@ -90,7 +100,7 @@ MadePicture makePicture(const std::string &sourcePath, int width)
         original.result.mimeType = "image/jpeg";
         return original;
     }
-    const GObjectPtr<VipsImage> shrunk = shrunkUpright(file.source(), width);
+    const GObjectPtr<VipsImage> shrunk = shrunkUpright(file.source(), header.get(), width);
     const GObjectPtr<VipsImage> opaque = shrunk ? flattened(shrunk.get()) : nullptr;
     return opaque ? encoded(opaque.get()) : failure(takeVipsError());
 }
