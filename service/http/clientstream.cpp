@@ -81,6 +81,12 @@ void ClientStream::headArrived()
     mDeadline = Clock::now() + mLimits.body;
 }
 
+void ClientStream::closeAfterAnswer()
+{
+    mBytesLeft = 0;
+    mBroken = true;
+}
+
 bool ClientStream::hasInput() const
 {
     return mInputStart < mInput.size() || (mSsl && SSL_has_pending(mSsl));
@@ -111,7 +117,7 @@ bool ClientStream::is_writable() const
 
 ssize_t ClientStream::read(char *bytes, size_t size)
 {
-    if (mInputStart >= mInput.size() && (!flush() || !fill()))
+    if (mBytesLeft == 0 || (mInputStart >= mInput.size() && (!flush() || !fill())))
         return -1;
     const std::size_t part = std::min(size, mInput.size() - mInputStart);
     if (part > mBytesLeft) {

@@ -37,7 +37,8 @@ public:
     bool flush();
     // Something broke that leaves the rest of the input meaningless.
     bool isBroken() const { return mBroken; }
-    void closeAfterAnswer() { mBroken = true; }
+    // For a request whose body nobody will read.
+    void closeAfterAnswer();
 
     bool is_readable() const override;
     bool is_writable() const override;

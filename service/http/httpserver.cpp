@@ -1,5 +1,6 @@
 #include "http/httpserver.h"
 
+#include "base/texts.h"
 #include "http/accesslog.h"
 
 #include <spdlog/spdlog.h>
@@ -14,6 +15,12 @@ constexpr std::size_t longestPath = 1024; // matching by regular expression recu
 constexpr int waitingConnections = 128;
 constexpr time_t keepAliveSeconds = 300;
 constexpr std::size_t keepAliveRequests = 1'000'000;
+
+bool isTooLarge(const httplib::Request &request, std::size_t bodyBytes)
+{
+    const std::string length = request.get_header_value("Content-Length");
+    return !length.empty() && std::size_t(parseNumber(length).value_or(-1)) > bodyBytes;
+}
 
 bool hasBody(const httplib::Request &request)
 {
@@ -88,6 +95,11 @@ HttpServer::~HttpServer()
 void HttpServer::setUp()
 {
     new_task_queue = [this] { return mWorkers = new httplib::ThreadPool(mSettings.threads); };
+    // Not as the library does: with a shared port two services would take turns unnoticed.
+    set_socket_options([](socket_t socket) {
+        const int on = 1;
+        setsockopt(socket, SOL_SOCKET, SO_REUSEADDR, &on, sizeof on);
+    });
     set_keep_alive_timeout(keepAliveSeconds);
     set_keep_alive_max_count(keepAliveRequests);
     set_payload_max_length(mSettings.bodyBytes);
@@ -173,15 +185,19 @@ bool HttpServer::serveRequest(ClientStream &client)
 {
     client.beginRequest();
     bool isClosed = false;
-    const auto headArrived = [&client](httplib::Request &request) {
+    bool isUnderstood =
+        false; // after lines that are no request, nothing can be told from what follows
+    const auto headArrived = [this, &client, &isUnderstood](httplib::Request &request) {
+        isUnderstood = true;
         client.headArrived();
         simplify(request);
         noteRequestStart();
         // Bytes that nobody reads would be taken for the next request.
-        if (hasBody(request) && (!takesBody(request) || request.path.size() > longestPath))
+        if (isTooLarge(request, mSettings.bodyBytes) ||
+            (hasBody(request) && (!takesBody(request) || request.path.size() > longestPath)))
             client.closeAfterAnswer();
     };
     const bool answered = process_request(client, mStopping, isClosed, headArrived);
     const bool flushed = client.flush();
-    return answered && flushed && !isClosed && !client.isBroken();
+    return isUnderstood && answered && flushed && !isClosed && !client.isBroken();
 }
