@@ -281,6 +281,7 @@ void HomeWidget::focusContent()
         mCommentArea->initFocus();
     else if (mPages->currentWidget() != mNoPhotoPage)
         mPages->currentWidget()->setFocus();
+    mTitleWidget->updateFocusMark();
 }
 
 void HomeWidget::handleUpWidgetEnter(PackageProperty &property)
