@@ -67,13 +67,15 @@ void addUsers(CLI::App &program, UserOptions &options, int &result)
     token->callback([&] { result = runUserToken(options.data, options.mail); });
 }
 
-void addImport(CLI::App &program, std::string &data, std::string &file, int &result)
+void addImport(CLI::App &program, std::string &data, std::string &file, std::string &folder,
+               int &result)
 {
     CLI::App *command =
         program.add_subcommand("import", "Bring in users, comments and tags from a JSON file");
     addData(command, data);
     command->add_option("file", file, "The file")->required();
-    command->callback([&] { result = runImport(data, file); });
+    command->add_option("--photos", folder, "Folder that the paths in the file start at");
+    command->callback([&] { result = runImport(data, file, folder); });
 }
 
 void addPhotos(CLI::App &program, std::string &data, int &result)
@@ -94,11 +96,11 @@ int main(int argc, char **argv)
     ServeOptions serve;
     serve.service.data = standardData;
     UserOptions user{standardData, "", "", ""};
-    std::string data = standardData, file;
+    std::string data = standardData, file, folder;
     int result = 0;
     addServe(program, serve, result);
     addUsers(program, user, result);
-    addImport(program, data, file, result);
+    addImport(program, data, file, folder, result);
     addPhotos(program, data, result);
     CLI11_PARSE(program, argc, argv);
     return result;

@@ -116,14 +116,16 @@ int runUserToken(const std::string &data, const std::string &mail)
     });
 }
 
-int runImport(const std::string &data, const std::string &file)
+int runImport(const std::string &data, const std::string &file, const std::string &folder)
 {
     std::ifstream stream(file);
     if (!stream)
         return fail("cannot read " + file);
-    const json document = json::parse(stream, nullptr, false);
+    json document = json::parse(stream, nullptr, false);
     if (document.is_discarded())
         return fail(file + " is no JSON");
+    if (!folder.empty())
+        resolvePaths(document, folder);
     return withIndex(data, [&](Database &database) {
         ImportResult result;
         std::string error;

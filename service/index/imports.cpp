@@ -7,6 +7,8 @@
 
 #include <nlohmann/json.hpp>
 
+#include <filesystem>
+
 using nlohmann::json;
 
 namespace {
@@ -94,15 +96,17 @@ std::vector<Waiting> waitingImports(Session &session)
     return list;
 }
 
-// The path is the same below every user's folder: the first user's photo it is.
+// An absolute path lies in one user's folder; a relative one is the same below every user's: the
+// first user's photo it is.
 std::int64_t photoAtPath(Session &session, const std::string &path)
 {
     const std::size_t slash = path.rfind('/');
     const std::string folder = slash == std::string::npos ? "" : path.substr(0, slash);
     const std::string name = slash == std::string::npos ? path : path.substr(slash + 1);
     Query query(session,
-                "SELECT p.id FROM users u JOIN albums a ON a.user = u.id AND a.folder = ? "
-                "JOIN photos p ON p.album = a.id AND p.name = ? ORDER BY u.id LIMIT 1",
+                "SELECT p.id FROM users u JOIN albums a ON a.user = u.id "
+                "AND (a.folder = ?1 OR rtrim(u.photos || '/' || a.folder, '/') = ?1) "
+                "JOIN photos p ON p.album = a.id AND p.name = ?2 ORDER BY u.id LIMIT 1",
                 folder, name);
     return query.next() ? query.number(0) : 0;
 }
@@ -147,7 +151,27 @@ bool checkShape(const json &document, std::string *error)
            checkList(document, "tags", {"photo", "author", "tag"}, error);
 }
 
+void makeAbsolute(json &entry, const char *key, const std::filesystem::path &folder)
+{
+    if (entry.is_object() && entry.contains(key) && entry[key].is_string())
+        entry[key] = (folder / entry[key].get<std::string>()).lexically_normal().string();
+}
+
 } // namespace
+
+void resolvePaths(json &document, const std::string &folder)
+{
+    const auto start = std::filesystem::absolute(folder);
+    const auto resolve = [&](const char *list, const char *key) {
+        if (document.is_object() && document.contains(list) && document[list].is_array()) {
+            for (json &entry : document[list])
+                makeAbsolute(entry, key, start);
+        }
+    };
+    resolve("users", "photos");
+    resolve("comments", "photo");
+    resolve("tags", "photo");
+}
 
 bool importDocument(Database &database, const json &document, ImportResult *result,
                     std::string *error)

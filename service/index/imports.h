@@ -20,6 +20,9 @@ struct ImportResult
     int waiting = 0; // for photos that are not in the index
 };
 
+// Turns the document's paths into absolute ones, taken from the folder when they are relative.
+void resolvePaths(nlohmann::json &document, const std::string &folder);
+
 // False and the reason in `error` when the document is not of this shape; then nothing is written.
 bool importDocument(Database &database, const nlohmann::json &document, ImportResult *result,
                     std::string *error);
