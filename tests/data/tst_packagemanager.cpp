@@ -50,22 +50,16 @@ PackageProperty albumsOf(const QString &user)
 PackageProperty ofType(PackageType type, int start = 1)
 {
     PackageProperty property = albumsOf("u");
-    property.mAlbumId = "a";
-    property.mPhotoId = "p";
-    property.mSearchedStr = "sea";
     property.mType = type;
     property.mStartIndex = start;
     return property;
 }
 
-QByteArray feedOf(int entries, int total = 100)
+// Empty entries, of a hundred that the service has.
+QByteArray feedOf(int entries)
 {
-    QByteArray text =
-        "{\"feed\":{\"openSearch$totalResults\":{\"$t\":" + QByteArray::number(total) +
-        "},\"entry\":[";
-    for (int i = 0; i < entries; ++i)
-        text += i ? ",{}" : "{}";
-    return text + "]}}";
+    return "{\"feed\":{\"openSearch$totalResults\":{\"$t\":100},\"entry\":[{}" +
+           QByteArray(",{}").repeated(entries - 1) + "]}}";
 }
 
 } // namespace

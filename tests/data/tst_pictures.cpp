@@ -1,10 +1,9 @@
 #include "data/download.h"
-#include "data/imagetarget.h"
 #include "data/photomanager.h"
 #include "support/logcapture.h"
 #include "testconfig.h"
+#include "testpictures.h"
 
-#include <QBuffer>
 #include <QPainter>
 #include <QtEndian>
 #include <QtTest>
@@ -16,22 +15,6 @@ namespace {
 std::unique_ptr<QPixmap> decode(const QByteArray &data)
 {
     return std::unique_ptr<QPixmap>(PhotoManager::createPhoto(data.constData(), data.size()));
-}
-
-QByteArray encoded(const QImage &image, const char *format)
-{
-    QByteArray bytes;
-    QBuffer buffer(&bytes);
-    buffer.open(QIODevice::WriteOnly);
-    image.save(&buffer, format);
-    return bytes;
-}
-
-QImage plain(int width, int height, const QColor &colour = Qt::red)
-{
-    QImage image(width, height, QImage::Format_RGB32);
-    image.fill(colour);
-    return image;
 }
 
 QByteArray bigEndian(quint32 value, int bytes)
@@ -58,32 +41,11 @@ QByteArray withJpegSize(QByteArray jpeg, quint32 width, quint32 height, char mar
 // An application segment with an EXIF orientation of 6: turn by a quarter to the right.
 QByteArray turned(const QByteArray &jpeg)
 {
-    const QByteArray tiff = QByteArray::fromHex("4d4d002a00000008"
-                                                "0001"
-                                                "0112000300000001"
-                                                "00060000"
-                                                "00000000");
+    const QByteArray tiff =
+        QByteArray::fromHex("4d4d002a00000008000101120003000000010006000000000000");
     const QByteArray exif = QByteArray("Exif\0\0", 6) + tiff;
     return jpeg.left(2) + "\xff\xe1" + bigEndian(quint32(exif.size()) + 2, 2) + exif + jpeg.mid(2);
 }
-
-class Target : public ImageTarget
-{
-public:
-    explicit Target(const QSize &size)
-        : mSize(size)
-    {
-    }
-    QSize imageSize() const override { return mSize; }
-    void setImage(const QPixmap &picture) override { shown = picture; }
-    void setPlaceholder(const QString &resource) override { placeholder = resource; }
-
-    QPixmap shown;
-    QString placeholder;
-
-private:
-    QSize mSize;
-};
 
 } // namespace
 
@@ -96,18 +58,14 @@ private slots:
     {
         for (const char *format : {"png", "jpg", "bmp"}) {
             const auto picture = decode(encoded(plain(40, 30), format));
-            QVERIFY2(picture, format);
-            QCOMPARE(picture->size(), QSize(40, 30));
-            const QColor colour = picture->toImage().pixelColor(20, 15);
-            QVERIFY(colour.red() > 250 && colour.blue() < 5);
+            QVERIFY2(picture && picture->size() == QSize(40, 30), format);
+            QVERIFY(picture->toImage().pixelColor(20, 15).red() > 250);
         }
         const QByteArray gif = QByteArray::fromHex( // 1 x 1, two frames
             "47494638396101000100800000ff0000ffffff2c00000000010001000002024401002c0000000001000100"
             "000202440100"
             "3b");
-        const auto picture = decode(gif);
-        QVERIFY(picture);
-        QCOMPARE(picture->toImage().pixelColor(0, 0), QColor(Qt::red));
+        QCOMPARE(decode(gif)->toImage().pixelColor(0, 0), QColor(Qt::red));
     }
 
     void refusesWhatIsNoPicture_data()
@@ -183,7 +141,7 @@ private slots:
                                  {{40, 30}, {0, 0}, {40, 30}}}; // a label without a size yet
         SystemConfig::setScale(1.5);
         for (const auto &[size, room, expected] : rows) {
-            Target target(room);
+            TestTarget target(room);
             const QPixmap picture = QPixmap::fromImage(plain(size.width(), size.height()));
             Download::showPicture(&target, picture);
             QCOMPARE(target.shown.size(), expected);
@@ -198,9 +156,9 @@ private slots:
     void deliversFailuresOnlyToThoseWhoStillWait()
     {
         QString url = "http://h/a";
-        Target home({10, 10}), detail({10, 10});
+        TestTarget home({10, 10}), detail({10, 10});
         {
-            Target gone({10, 10});
+            TestTarget gone({10, 10});
             Download::mHomeLabelUrlHash.insert(url, &gone);
             Download::mHomeLabelUrlHash.insert(url, &home);
         }

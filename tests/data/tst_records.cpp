@@ -153,15 +153,12 @@ private slots:
     {
         const QList<QByteArray> values = {"null", "true", "7",  "-1e308",       "\"text\"",
                                           "[]",   "[{}]", "{}", "[[1],[null]]", "{\"$t\":{}}"};
-        const QList<QByteArray> members = {
-            "title",     "gphoto$width",       "content", "media$group", "author",
-            "published", "gphoto$commentCount"};
         for (const QByteArray &value : values) {
-            QByteArray entry = "{";
-            for (const QByteArray &member : members)
-                entry += "\"" + member + "\":" + value + ",";
-            entry += "\"media$group\":{\"media$thumbnail\":" + value +
-                     ",\"media$content\":" + value + ",\"media$keywords\":" + value + "}}";
+            const QByteArray entry =
+                json("{'title':@,'gphoto$width':@,'content':@,'author':@,'published':@,"
+                     "'gphoto$commentCount':@,'gphoto$id':@,'media$group':{'media$thumbnail':@,"
+                     "'media$content':@,'media$keywords':@}}")
+                    .replace('@', value);
             for (int type = FEATURED_PHOTOS_LIST; type <= SEARCH_MORE_PHOTOS_LIST; ++type) {
                 const auto kind = PackageType(type);
                 QCOMPARE(packageOf(kind, feed(entry + "," + entry))->count(), 2);
