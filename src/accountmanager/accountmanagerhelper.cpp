@@ -157,3 +157,13 @@ QStringList AccountManagerHelper::getAccounts(bool oauth)
 {
     return mDataBase ? mDataBase->getAccounts(oauth) : QStringList();
 }
+
+QString AccountManagerHelper::getDisplayName(const QString &user)
+{
+    return mDataBase ? mDataBase->getUserInfo(user).value(QStringLiteral("realname")) : QString();
+}
+
+bool AccountManagerHelper::hasFailed()
+{
+    return !mDataBase || mDataBase->hasFailed();
+}

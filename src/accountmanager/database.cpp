@@ -73,7 +73,7 @@ void DataBase::connectTo(const QString &file)
                     ? QSqlDatabase::database(kConnectionName, false)
                     : QSqlDatabase::addDatabase(mDriverName, kConnectionName);
     mDatabase.setDatabaseName(file);
-    mDatabase.setConnectOptions(QStringLiteral("QSQLITE_BUSY_TIMEOUT=200"));
+    mDatabase.setConnectOptions(QStringLiteral("QSQLITE_BUSY_TIMEOUT=100"));
 }
 
 bool DataBase::openConnection()
@@ -156,6 +156,7 @@ bool DataBase::hasAllTables() const
 bool DataBase::prepare(const QString &statement, const QString &complaint)
 {
     const QPointer<DataBase> self(this);
+    mFailed = true;
     if (!mDatabase.isOpen())
         openDataBase();
     // The message box of a failed opening delivers events, and one may end this instance.
@@ -164,16 +165,17 @@ bool DataBase::prepare(const QString &statement, const QString &complaint)
         return false;
     }
     mQuery->clear();
-    if (mQuery->prepare(statement))
-        return true;
-    logLine(complaint, mQuery->lastError().text());
-    return false;
+    mFailed = !mQuery->prepare(statement);
+    if (mFailed)
+        logLine(complaint, mQuery->lastError().text());
+    return !mFailed;
 }
 
 bool DataBase::execute(const QString &complaint)
 {
     if (mQuery->exec())
         return true;
+    mFailed = true;
     logLine(complaint, mQuery->lastError().text());
     mQuery->clear();
     return false;
@@ -218,11 +220,11 @@ bool DataBase::insertAccount(const AccountRecord &record)
     for (const QString &value : {record.usermail, record.password, record.name, record.token,
                                  record.refresh, record.login})
         mQuery->addBindValue(QVariantList{value});
-    const bool inserted = mQuery->execBatch();
-    if (!inserted)
+    mFailed = !mQuery->execBatch();
+    if (mFailed)
         logLine(mQuery->lastQuery(), " ", mQuery->lastError().text());
     mQuery->clear();
-    return inserted;
+    return !mFailed;
 }
 
 bool DataBase::updateLatestUser(const QString &user)

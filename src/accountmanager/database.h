@@ -24,7 +24,7 @@ struct AccountRecord
 // The SQLite file of the accounts. Every operation opens the file when it is not open, and returns
 // its failure value (false, an empty list or map, a null string) when a statement fails; failures
 // are only logged, but for a file that cannot be opened, which the user is told in a message box.
-// A file that another program keeps locked counts as a failure after a fifth of a second for each
+// A file that another program keeps locked counts as a failure after a tenth of a second for each
 // statement. One instance at a time: all share one connection.
 class DataBase : public QObject
 {
@@ -51,6 +51,8 @@ public:
     QMap<QString, QString> getUserInfo(const QString &user); // keys "token", "refresh", "realname"
     QString getLoginUser();
     QString getPwdByUser(const QString &user);
+    // Whether the last operation failed: tells an empty answer from none.
+    bool hasFailed() const { return mFailed; }
 
     // What tells the user that the file cannot be opened, in place of the message box; an empty
     // one restores the box. For programs without a screen, and tests.
@@ -74,4 +76,5 @@ private:
     QString mDriverName;
     QSqlDatabase mDatabase;
     std::unique_ptr<QSqlQuery> mQuery;
+    bool mFailed = false;
 };

@@ -9,6 +9,7 @@
 
 #include <malloc.h>
 
+PackageManager::RemovalHook PackageManager::mRemovalHook = nullptr;
 QHash<QString, Package *> PackageManager::mCachedPackageHash;
 QHash<QString, QPointer<Connection>> PackageManager::mDownlodingConnectionHash;
 QHash<QString, PackageProperty> PackageManager::mDownlodingPropertyHash;
@@ -239,7 +240,7 @@ void PackageManager::addToCache(PackageProperty &property, Package *package, boo
     Package *previous = mCachedPackageHash.value(key);
     mCachedPackageHash.insert(key, package);
     if (previous != package)
-        delete previous;
+        discard(previous);
     if (appended || previous)
         mRecentlyDownloadedPackagePropertyList.removeAll(property);
     mRecentlyDownloadedPackagePropertyList.append(appended ? package->mProperty : property);
@@ -303,13 +304,27 @@ void PackageManager::forget(PackageProperty property)
 void PackageManager::removeCache(PackageProperty &property)
 {
     logLine("packagemanager.cpp removeCache! Type = ", property.mType);
-    delete mCachedPackageHash.take(cacheKey(property));
+    discard(mCachedPackageHash.take(cacheKey(property)));
+}
+
+void PackageManager::discard(Package *package)
+{
+    if (package && mRemovalHook)
+        mRemovalHook(package);
+    delete package;
+}
+
+void PackageManager::setRemovalHook(RemovalHook hook)
+{
+    mRemovalHook = hook;
 }
 
 void PackageManager::clearAll()
 {
-    qDeleteAll(mCachedPackageHash);
+    const auto packages = mCachedPackageHash;
     mCachedPackageHash.clear();
+    for (Package *package : packages)
+        discard(package);
     mRecentlyAccessPackagePropertyList.clear();
     mRecentlyDownloadedPackagePropertyList.clear();
 

@@ -42,6 +42,10 @@ public:
     // the system.
     static void clearAll();
 
+    // Called before a list is deleted, so that a screen that shows it lets go of it; null: nobody.
+    using RemovalHook = void (*)(const Package *package);
+    static void setRemovalHook(RemovalHook hook);
+
 private:
     struct Request
     {
@@ -59,7 +63,9 @@ private:
     static bool isOther(const PackageProperty &entry, const Package *package);
     static void markAccessed(const PackageProperty &property);
     static void forget(PackageProperty property);
+    static void discard(Package *package);
 
+    static RemovalHook mRemovalHook;
     static QHash<QString, Package *> mCachedPackageHash;
     static QHash<QString, QPointer<Connection>> mDownlodingConnectionHash;
     static QHash<QString, PackageProperty> mDownlodingPropertyHash;

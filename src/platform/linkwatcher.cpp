@@ -12,8 +12,11 @@
 LinkWatcher::LinkWatcher(Listener listener)
     : mListener(std::move(listener))
 {
-    if (mStop.isValid() && open() && requestList())
-        mThread = std::thread(&LinkWatcher::run, this);
+    if (!mStop.isValid() || !open() || !requestList())
+        return;
+    // The kernel has the list ready at once, so that every later change is told.
+    readNotices();
+    mThread = std::thread(&LinkWatcher::run, this);
 }
 
 LinkWatcher::~LinkWatcher()
@@ -34,7 +37,6 @@ bool LinkWatcher::open()
     return ::bind(mSocket.get(), reinterpret_cast<sockaddr *>(&address), sizeof address) == 0;
 }
 
-// The kernel takes the list while it accepts the request: what changes afterwards is a notice.
 bool LinkWatcher::requestList()
 {
     struct
@@ -56,9 +58,9 @@ void LinkWatcher::run()
 {
     pollfd sources[] = {{mStop.fd(), POLLIN, 0}, {mSocket.get(), POLLIN, 0}};
     for (;;) {
-        // The kernel takes one request for a list at a time; a stale table waits for its end.
-        const bool retrying = mStale && !requestList();
-        if (::poll(sources, 2, retrying ? 1000 : -1) < 0 && errno != EINTR)
+        reportChanges();
+        const bool retryLater = mStale && !requestList();
+        if (::poll(sources, 2, retryLater ? 1000 : -1) < 0 && errno != EINTR)
             return;
         if (sources[0].revents)
             return;
@@ -68,29 +70,32 @@ void LinkWatcher::run()
 
 void LinkWatcher::readNotices()
 {
+    while (!mStale && readNotice()) {
+    }
+}
+
+bool LinkWatcher::readNotice()
+{
     alignas(nlmsghdr) std::array<char, 64 * 1024> buffer;
     sockaddr_nl sender = {};
     socklen_t senderSize = sizeof sender;
     const ssize_t size = ::recvfrom(mSocket.get(), buffer.data(), buffer.size(), MSG_TRUNC,
                                     reinterpret_cast<sockaddr *>(&sender), &senderSize);
     if (size < 0) {
-        mStale = mStale || errno == ENOBUFS;
-        return;
+        mStale = errno == ENOBUFS;
+        return false;
     }
     const bool fromKernel = senderSize == sizeof sender && sender.nl_pid == 0;
-    if (!fromKernel)
-        return;
-    if (size_t(size) > buffer.size())
-        mStale = true;
-    else
-        handle(buffer.data(), size_t(size));
+    if (fromKernel)
+        mStale =
+            size_t(size) > buffer.size() ||
+            mTable.read(buffer.data(), size_t(size), &mChanges) == LinkTable::Outcome::ListBroken;
+    return true;
 }
 
-void LinkWatcher::handle(const void *data, size_t size)
+void LinkWatcher::reportChanges()
 {
-    std::vector<LinkChange> changes;
-    if (mTable.read(data, size, &changes) == LinkTable::Outcome::ListBroken)
-        mStale = true;
-    for (const LinkChange &change : changes)
+    for (const LinkChange &change : mChanges)
         mListener(change);
+    mChanges.clear();
 }

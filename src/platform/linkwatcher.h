@@ -26,12 +26,14 @@ private:
     bool requestList();
     void run();
     void readNotices();
-    void handle(const void *data, size_t size);
+    bool readNotice();
+    void reportChanges();
 
     Listener mListener;
     WakeUp mStop;
     FileDescriptor mSocket;
     LinkTable mTable;
+    std::vector<LinkChange> mChanges; // read, but not reported yet
     uint32_t mSequence = 0;
     bool mStale = false; // notices were lost: the list must be read anew
     std::thread mThread;
