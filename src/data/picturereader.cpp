@@ -46,14 +46,15 @@ QSize decodeSize(const QImageReader &reader)
                                                                                         : size;
 }
 
-// A pixmap has 32 bits a pixel; a picture of another depth exists twice while it is converted, and
-// one that has to be turned while it is turned.
+// A pixmap has 32 bits a pixel; a picture of another depth exists twice while it is converted, one
+// that has to be turned while it is turned, and of a moving one the decoder keeps a copy.
 qint64 decodedBytes(const QImageReader &reader, const QSize &size)
 {
     const int depth = QImage::toPixelFormat(reader.imageFormat()).bitsPerPixel();
     const bool isConverted = reader.imageFormat() != QImage::Format_Invalid && depth != 32;
     const bool isTurned = reader.transformation() != QImageIOHandler::TransformationNone;
-    const int bits = 32 + (isConverted ? depth : 0) + (isTurned ? 32 : 0);
+    const bool isCopied = reader.format() == "gif";
+    const int bits = 32 + (isConverted ? depth : 0) + (isTurned ? 32 : 0) + (isCopied ? 32 : 0);
     return pixelsOf(size) * bits / 8;
 }
 
