@@ -132,7 +132,11 @@ void TestConnection::getDeliversTheBody()
     mServer->on("/chunked", Server::chunked("0123456789"));
     mServer->on("/gzip", Server::gzip("0123456789"));
     mServer->on("/drip", Server::drip("0123456789", 3, 1));
-    for (const char *path : {"/plain", "/chunked", "/gzip", "/drip"}) {
+    const QByteArray zlibStream = qCompress("0123456789").mid(4);
+    const Server::Headers deflate = {{"Content-Encoding", "deflate"}};
+    mServer->on("/zlib", Server::answer(zlibStream, 200, deflate));
+    mServer->on("/bare", Server::answer(zlibStream.mid(2).chopped(4), 200, deflate));
+    for (const char *path : {"/plain", "/chunked", "/gzip", "/zlib", "/bare", "/drip"}) {
         events.clear();
         Connection *connection = start(path);
         WAIT_FINISHED();
