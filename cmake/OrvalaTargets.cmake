@@ -6,6 +6,7 @@ set(CMAKE_CXX_STANDARD_REQUIRED ON)
 set(CMAKE_CXX_EXTENSIONS OFF)
 set(CMAKE_EXPORT_COMPILE_COMMANDS ON)
 set(CMAKE_AUTOMOC_MOC_OPTIONS --no-notes)
+set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bin)
 
 find_program(ORVALA_CCACHE ccache)
 if(ORVALA_CCACHE)
@@ -58,8 +59,11 @@ function(orvala_test name)
   cmake_parse_arguments(arg "" "" "SOURCES;LINKS" ${ARGN})
   orvala_program(${name} QT SOURCES ${arg_SOURCES} LINKS ${arg_LINKS} Qt5::Test)
   target_include_directories(${name} PRIVATE ${CMAKE_SOURCE_DIR}/tests)
+  set_target_properties(${name} PROPERTIES RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/tests)
   add_test(NAME ${name} COMMAND ${name})
-  set_tests_properties(${name} PROPERTIES ENVIRONMENT "QT_QPA_PLATFORM=offscreen" TIMEOUT 120)
+  set_tests_properties(${name} PROPERTIES
+    ENVIRONMENT "QT_QPA_PLATFORM=offscreen;LSAN_OPTIONS=suppressions=${CMAKE_SOURCE_DIR}/cmake/leaks.supp:print_suppressions=0"
+    TIMEOUT 120)
 endfunction()
 
 # orvala_gtest(<name> SOURCES <files> LINKS <targets>): a GoogleTest program, run by ctest.
@@ -67,6 +71,7 @@ function(orvala_gtest name)
   cmake_parse_arguments(arg "" "" "SOURCES;LINKS" ${ARGN})
   orvala_program(${name} SOURCES ${arg_SOURCES} LINKS ${arg_LINKS} GTest::gtest GTest::gtest_main)
   target_include_directories(${name} PRIVATE ${CMAKE_SOURCE_DIR}/tests)
+  set_target_properties(${name} PROPERTIES RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/tests)
   add_test(NAME ${name} COMMAND ${name})
   set_tests_properties(${name} PROPERTIES TIMEOUT 120)
 endfunction()
@@ -77,7 +82,7 @@ function(orvala_bench name)
   cmake_parse_arguments(arg "" "" "SOURCES;LINKS" ${ARGN})
   orvala_program(${name} QT SOURCES ${arg_SOURCES} LINKS ${arg_LINKS})
   target_include_directories(${name} PRIVATE ${CMAKE_SOURCE_DIR}/bench)
-  set_target_properties(${name} PROPERTIES RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bench/bin)
+  set_target_properties(${name} PROPERTIES RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bench)
 endfunction()
 
 # orvala_subdirectories(<dirs>): add each folder that has a build file.

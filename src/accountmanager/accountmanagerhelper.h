@@ -45,8 +45,15 @@ public:
     static bool removeAccount(const QString &user);
     static bool updateToken(const QString &user, const QString &token);
     static QStringList getAccounts(bool oauth);
+    static QString getDisplayName(const QString &user); // of a stored account
+    // Whether the last operation on the open database failed: tells an empty answer from none.
+    static bool hasFailed();
 
 private:
+    static bool isSignedIn();
+    // Takes tokens and name of the account from the database.
+    static void readTokens(const QString &user);
+
     static QString mLatestLoginAccount;
     static QString mCurrentToken;
     static QString mRefreshToken;

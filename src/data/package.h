@@ -11,7 +11,11 @@ class Package
 {
 public:
     Package() = default;
-    ~Package() { qDeleteAll(mDataList); }
+    ~Package()
+    {
+        qDeleteAll(mDataList);
+        qDeleteAll(mRetiredDataList);
+    }
     Package(const Package &) = delete;
     Package &operator=(const Package &) = delete;
 
@@ -25,7 +29,19 @@ public:
     }
     int count() const { return mDataList.size(); }
 
+    // Empties the list. The records live on until the next time or the package's end, for whoever
+    // shows them when the page that replaces them arrives.
+    void retireRecords()
+    {
+        qDeleteAll(mRetiredDataList);
+        mRetiredDataList.clear();
+        mRetiredDataList.swap(mDataList);
+    }
+
     PackageProperty mProperty;
     QList<OrvalaData *> mDataList;
     int mTotalCount = 0; // of the whole feed, for featured photos and searches
+
+private:
+    QList<OrvalaData *> mRetiredDataList;
 };

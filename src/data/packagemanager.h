@@ -5,6 +5,7 @@
 
 #include <QHash>
 #include <QList>
+#include <QPointer>
 #include <QString>
 
 class Connection;
@@ -37,12 +38,36 @@ public:
     static void addToCache(PackageProperty &property, Package *package, bool appended);
     static void removeCache(PackageProperty &property);
     static bool canBeRemovedByNewlyArrivedPackage(PackageProperty &property, int arrivedType);
-    // Forgets every list and ends every request, without calling back.
+    // Forgets every list and ends every request, without calling back; gives the memory back to
+    // the system.
     static void clearAll();
 
+    // Called before a list is deleted, so that a screen that shows it lets go of it; null: nobody.
+    using RemovalHook = void (*)(const Package *package);
+    static void setRemovalHook(RemovalHook hook);
+
 private:
+    struct Request
+    {
+        QPointer<Connection> connection;
+        PackageProperty property;
+        Callback callback = nullptr;
+    };
+
+    static Connection *startRequest(const QString &url);
+    static Request takeRequest(const QString &url, const char *where);
+    static ErrorCode storeFeed(PackageProperty &property, const QByteArray &feedText);
+    static void prepareFollowingPage(const PackageProperty &property, const Package &package);
+    static void removeStalePackages(const PackageProperty &arrived, const Package *kept);
+    static void removeSurplusPackages(const PackageProperty &arrived, const Package *kept);
+    static bool isOther(const PackageProperty &entry, const Package *package);
+    static void markAccessed(const PackageProperty &property);
+    static void forget(PackageProperty property);
+    static void discard(Package *package);
+
+    static RemovalHook mRemovalHook;
     static QHash<QString, Package *> mCachedPackageHash;
-    static QHash<QString, Connection *> mDownlodingConnectionHash;
+    static QHash<QString, QPointer<Connection>> mDownlodingConnectionHash;
     static QHash<QString, PackageProperty> mDownlodingPropertyHash;
     static QHash<QString, Callback> mCallbackFunHash;
     static QList<PackageProperty> mRecentlyAccessPackagePropertyList;

@@ -7,6 +7,7 @@
 #include <QHash>
 #include <QList>
 #include <QPixmap>
+#include <QPointer>
 #include <QString>
 
 class Connection;
@@ -18,7 +19,8 @@ class PhotoManager
 public:
     using Callback = void (*)(QString &url, ErrorCode code);
 
-    // Sets the cache's capacity from the configuration; called once at start.
+    // Sets the cache's capacity from the configuration and lets freed pictures go back to the
+    // system; called once at start.
     static void init();
 
     // True unless a connection could not be created or started; then nothing calls back.
@@ -41,12 +43,18 @@ public:
     static QPixmap *createPhoto(const char *data, qint64 length);
 
 private:
+    static Connection *createConnection();
+    static bool hasFreeConnection();
+    static bool startDownload(const QString &url);
+    static ErrorCode takePicture(const QString &url, QPointer<Connection> &connection);
+    // Starts the next queued URLs, first on the connection that has become free (or null).
     static void downloadWaitingPhoto(Connection *connection);
     static void notify(const QString &url, ErrorCode code);
 
     static QCache<QString, QPixmap> mPhotoCache;
-    static QHash<QString, Connection *> mDownlodingConnectionHash;
+    static QHash<QString, QPointer<Connection>> mDownlodingConnectionHash;
     static QHash<QString, QString> mDownlodingURLHash;
     static QMultiHash<QString, Callback> mCallbackFunHash;
     static QList<QString> mNeedDownloadPhotoUrlList;
+    static int mClearCount; // tells a call-back's caller that everything was cleared meanwhile
 };

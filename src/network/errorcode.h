@@ -6,6 +6,7 @@
 using ErrorCode = qint32;
 
 constexpr ErrorCode NET_SUCCESS = 0;
+constexpr ErrorCode NET_REJECTED = -1;        // no such list, no picture, or refused (managers)
 constexpr ErrorCode NET_NOT_PERMITTED = -86;  // the server refused the operation
 constexpr ErrorCode NET_FAILED = -87;         // any other failure
 constexpr ErrorCode NET_NO_DATA = -88;        // a finished download had no bytes (managers)

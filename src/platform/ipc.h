@@ -1,6 +1,8 @@
 #pragma once
 
 #include <cstdint>
+#include <memory>
+#include <string>
 
 // One message between the program and the device's menu shell: 68 bytes on the wire, native byte
 // order, unused bytes zero.
@@ -10,6 +12,8 @@ struct _NETWORK_MSG_T
     int32_t params[16];
 };
 static_assert(sizeof(_NETWORK_MSG_T) == 68, "the platform's messages are 68 bytes");
+
+class ShellLink;
 
 namespace netcommon {
 
@@ -34,6 +38,8 @@ public:
     // caller that ends the program deletes it.
     static Ipc *getInstance();
     ~Ipc();
+    Ipc(const Ipc &) = delete;
+    Ipc &operator=(const Ipc &) = delete;
 
     // Sends one message; false when there is no shell to take it.
     bool sendIpcMsg(const _NETWORK_MSG_T &message);
@@ -43,8 +49,13 @@ public:
     // the remote's exit key always works.
     void requestExit(bool isSystemError);
 
+    // Where the shell listens; for tests, before the first message.
+    static void setSocketPath(const std::string &path);
+
 private:
     Ipc();
+
+    std::shared_ptr<ShellLink> mLink;
 };
 
 } // namespace netcommon

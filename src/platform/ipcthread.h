@@ -2,6 +2,12 @@
 
 #include <QThread>
 
+#include <atomic>
+#include <memory>
+
+class ShellLink;
+struct _NETWORK_MSG_T;
+
 namespace netcommon {
 
 // The platform's message thread: keeps the connection to the menu shell (also to one that comes
@@ -40,6 +46,12 @@ protected:
 
 private:
     IpcThread();
+    void waitForEvent();
+    void handlePackets();
+    void handleMessage(const _NETWORK_MSG_T &message);
+
+    std::shared_ptr<ShellLink> mLink;
+    std::atomic<bool> mStopped{false};
 };
 
 } // namespace netcommon

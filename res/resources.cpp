@@ -1,0 +1,8 @@
+#include "res/resources.h"
+
+#include <QtGlobal>
+
+void initResources()
+{
+    Q_INIT_RESOURCE(pictures);
+}

@@ -1,0 +1,21 @@
+#include "accountmanager/accounttexts.h"
+
+#include <QVector>
+
+namespace {
+
+const QVector<const char *> mAccountString = {
+    "No account is stored on this device yet. Choose New to add one.",
+    "This account is not stored any more. Please choose another one.",
+    "This account could not be signed in. Please try again, or choose another one.",
+    "The stored accounts cannot be read at the moment. Please try again later.",
+};
+
+} // namespace
+
+QString AccountTexts::text(int index)
+{
+    if (index < 0 || index >= mAccountString.size())
+        return QStringLiteral("Unknown");
+    return QString::fromLatin1(mAccountString.at(index));
+}

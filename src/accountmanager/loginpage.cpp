@@ -1,0 +1,243 @@
+#include "accountmanager/loginpage.h"
+
+#include "accountmanager/accountmanagerhelper.h"
+#include "accountmanager/accountswidget.h"
+#include "accountmanager/accounttexts.h"
+#include "base/i18n.h"
+#include "base/log.h"
+#include "common/ui/remotekeys.h"
+
+#include <QHBoxLayout>
+#include <QKeyEvent>
+#include <QLabel>
+#include <QPushButton>
+#include <QVBoxLayout>
+
+namespace {
+
+// The focus rules work on the focused widget alone: nothing is set again when the focus moves.
+const QString kStyle = QStringLiteral(
+    "QLabel {color: white; font-size: 22px;}"
+    "QLabel#title {font-size: 28px;}"
+    "QLabel#hint {color: #d5dfe6; margin-top: 12px;}"
+    "QLabel#message {color: #ffd27a; font-size: 20px;}"
+    "AccountItem {border-image: url(:/res/Button_Normal.png) 6; border-width: 6px;}"
+    "AccountItem:focus {border-image: url(:/res/Button_Focus.png) 6; border-width: 6px;}"
+    "QPushButton {border-image: url(:/res/Button_Normal.png) 6; border-width: 6px;"
+    " outline-width: 0px; color: white; font-size: 22px;}"
+    "QPushButton:focus {border-image: url(:/res/Button_Focus.png) 6; border-width: 6px;}"
+    "QScrollArea, QWidget#rows {background: transparent;}"
+    "QScrollBar:vertical {width: 10px; background: #1c2730; border-radius: 5px;}"
+    "QScrollBar::handle:vertical {min-height: 40px; background: #c9d5dd; border-radius: 5px;}"
+    "QScrollBar::add-line, QScrollBar::sub-line {height: 0px;}");
+
+// A button that leaves every key to the page.
+class PageButton : public QPushButton
+{
+public:
+    using QPushButton::QPushButton;
+
+protected:
+    void keyPressEvent(QKeyEvent *event) override { event->ignore(); }
+    void keyReleaseEvent(QKeyEvent *event) override { event->ignore(); }
+};
+
+QLabel *makeLabel(QWidget *parent, const char *name, const QString &text)
+{
+    auto *label = new QLabel(parent);
+    label->setObjectName(QLatin1String(name));
+    label->setTextFormat(Qt::PlainText);
+    label->setWordWrap(true);
+    label->setText(text);
+    return label;
+}
+
+// False when the database gave no answer; it may take a while, so it is not asked again.
+bool readAccounts(QVector<AccountsWidget::Account> *accounts)
+{
+    const AccountManagerHelper::Session session;
+    QStringList mails = AccountManagerHelper::getAccounts(true);
+    if (AccountManagerHelper::hasFailed())
+        return false;
+    const QString latest = AccountManagerHelper::getLatestLoginAccount();
+    if (mails.removeOne(latest))
+        mails.prepend(latest);
+    for (const QString &mail : qAsConst(mails)) {
+        accounts->append({mail, AccountManagerHelper::getDisplayName(mail)});
+        if (AccountManagerHelper::hasFailed())
+            return false;
+    }
+    return true;
+}
+
+} // namespace
+
+LoginPage::LoginPage(QWidget *parent)
+    : QWidget(parent)
+    , mAccounts(new AccountsWidget(this))
+    , mHint(makeLabel(this, "hint", AccountTexts::text(AccountTexts::NoAccounts)))
+    , mMessage(makeLabel(this, "message", QString()))
+{
+    setStyleSheet(kStyle);
+    buildLayout();
+    connect(mAccounts, &AccountsWidget::selectItem, this, &LoginPage::handleSelectIndex);
+    reload();
+}
+
+void LoginPage::buildLayout()
+{
+    auto *buttons = new QVBoxLayout;
+    buttons->setSpacing(12);
+    mNewButton = makeButton(buttons, I18n::button(8));
+    mExitButton = makeButton(buttons, I18n::button(9));
+    buttons->addStretch();
+    connect(mNewButton, &QAbstractButton::clicked, this, &LoginPage::startOauth);
+    connect(mExitButton, &QAbstractButton::clicked, this, &LoginPage::leave);
+
+    auto *row = new QHBoxLayout;
+    row->setSpacing(28);
+    row->addWidget(mAccounts, 1);
+    row->addWidget(mHint, 1, Qt::AlignTop);
+    row->addLayout(buttons);
+
+    mMessage->setFixedHeight(52);
+    mMessage->setAlignment(Qt::AlignLeft | Qt::AlignVCenter);
+    auto *column = new QVBoxLayout(this);
+    column->setContentsMargins(0, 0, 0, 0);
+    column->setSpacing(10);
+    column->addWidget(makeLabel(this, "title", I18n::prompt(3)));
+    column->addLayout(row, 1);
+    column->addWidget(mMessage);
+}
+
+QAbstractButton *LoginPage::makeButton(QVBoxLayout *column, const QString &text)
+{
+    auto *button = new PageButton(text, this);
+    button->setFixedSize(160, 52);
+    column->addWidget(button);
+    return button;
+}
+
+void LoginPage::reload()
+{
+    QVector<AccountsWidget::Account> accounts;
+    const bool readable = readAccounts(&accounts);
+    if (readable)
+        mAccounts->setAccounts(accounts);
+    const bool empty = mAccounts->count() == 0;
+    mAccounts->setVisible(!empty);
+    mHint->setVisible(empty);
+    mHint->setText(
+        AccountTexts::text(readable ? AccountTexts::NoAccounts : AccountTexts::AccountsUnreadable));
+    restoreFocus();
+}
+
+void LoginPage::restoreFocus()
+{
+    if (mAccounts->count() > 0)
+        mAccounts->focusCurrent();
+    else
+        mNewButton->setFocus();
+}
+
+bool LoginPage::hasAccount(const QString &mail) const
+{
+    return mAccounts->contains(mail);
+}
+
+void LoginPage::showMessage(const QString &text)
+{
+    mMessage->setText(text);
+}
+
+void LoginPage::showEvent(QShowEvent *event)
+{
+    QWidget::showEvent(event);
+    if (!mNewButton->hasFocus() && !mExitButton->hasFocus())
+        restoreFocus();
+}
+
+void LoginPage::keyPressEvent(QKeyEvent *event)
+{
+    logLine("enter LoginPage::keyPressEvent");
+    showMessage(QString());
+    switch (event->key()) {
+    case DEVICE_UP_KEY:
+        handleUpOrDown(-1);
+        break;
+    case DEVICE_DOWN_KEY:
+        logLine("enter DEVICE_DOWN_KEY");
+        handleUpOrDown(1);
+        break;
+    case DEVICE_LEFT_KEY:
+        logLine("enter DEVICE_LEFT_KEY");
+        mAccounts->focusCurrent();
+        break;
+    case DEVICE_RIGHT_KEY:
+        logLine("enter DEVICE_RIGHT_KEY");
+        if (mAccounts->hasRowFocus())
+            mNewButton->setFocus();
+        break;
+    case DEVICE_PAGEUP_KEY:
+    case DEVICE_PAGEDOWN_KEY:
+        mAccounts->movePage(event->key() == DEVICE_PAGEUP_KEY ? -1 : 1);
+        break;
+    case DEVICE_SELECT_KEY:
+        logLine("enter DEVICE_SELECT_KEY");
+        handleSelect();
+        break;
+    default:
+        event->ignore();
+    }
+}
+
+void LoginPage::handleUpOrDown(int rows)
+{
+    if (mAccounts->hasRowFocus())
+        mAccounts->moveFocus(rows);
+    else
+        (rows < 0 ? mNewButton : mExitButton)->setFocus();
+}
+
+void LoginPage::handleSelect()
+{
+    if (mNewButton->hasFocus())
+        startOauth();
+    else if (mExitButton->hasFocus())
+        leave();
+    else
+        handleSelectIndex();
+}
+
+void LoginPage::startOauth()
+{
+    logLine("has foucus New, emit oauthStarted()");
+    emit oauthStarted();
+}
+
+void LoginPage::leave()
+{
+    logLine("has foucus Exit, exitApp()");
+    emit exitApp();
+}
+
+bool LoginPage::signIn(const QString &mail)
+{
+    const AccountManagerHelper::Session session;
+    const QString pin = AccountManagerHelper::getPassword(mail);
+    return !AccountManagerHelper::hasFailed() && AccountManagerHelper::login(mail, pin);
+}
+
+void LoginPage::handleSelectIndex()
+{
+    const QString mail = mAccounts->currentAccount();
+    if (mail.isEmpty())
+        return;
+    if (signIn(mail)) {
+        emit loginSucessed();
+        return;
+    }
+    reload();
+    showMessage(AccountTexts::text(hasAccount(mail) ? AccountTexts::SignInFailed
+                                                    : AccountTexts::AccountGone));
+}

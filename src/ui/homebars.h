@@ -1,0 +1,29 @@
+#pragma once
+
+#include "ui/homestate.h"
+
+#include <QWidget>
+
+class InformationLine;
+class ShortcutBar;
+
+// The lower edge of the home screen: what is shown and where in it the focus is, and the hints of
+// the keys that do something now.
+class HomeBars : public QWidget
+{
+    Q_OBJECT
+
+public:
+    explicit HomeBars(QWidget *parent = nullptr);
+
+    // Title of the list and the position in it, "" for none; both plain text.
+    void setInformation(const QString &title, const QString &position);
+    QString information() const; // the line as rich text
+
+    void showKeys(const QList<int> &keys);
+    bool isKeyShown(int key) const;
+
+private:
+    InformationLine *mInformation;
+    ShortcutBar *mShortcuts;
+};

@@ -1,0 +1,162 @@
+#include "ui/homestate.h"
+
+#include "base/log.h"
+#include "ui/paging.h"
+
+namespace {
+
+// Lists of which the service tells the total; the others come whole.
+bool hasFeedTotal(int type)
+{
+    return type == TYPE_FEATURED_PHOTOS || type == TYPE_SEARCH_PHOTOS ||
+           type == TYPE_SEARCH_MORE_PHOTOS;
+}
+
+} // namespace
+
+bool HomeState::enterMenu(const PackageProperty &property)
+{
+    const bool changed = property.mType != mCurrentProperty.mType;
+    mSelectedAlbumIndex = 0;
+    mSelectedAlbumStart = 1;
+    if (changed) {
+        logLine("apackage type has changed");
+        mSelectedPersonIndex = 0;
+        mSelectedPersonStart = 1;
+    }
+    mCurrentProperty = property;
+    mInitIndex = -1;
+    mInitStart = 1;
+    mIsFromFavorites = property.mType == TYPE_FAVORITE_PEOPLE;
+    if (mIsFromFavorites) {
+        mSelectedPersonIndex = 0;
+        mSelectedPersonStart = 1;
+    }
+    return changed;
+}
+
+void HomeState::openAlbum(int cell, const Album &album)
+{
+    logLine("Back up the select album index");
+    mSelectedAlbumIndex = cell;
+    mSelectedAlbumStart = mCurrentProperty.mStartIndex;
+    mInitStart = 1;
+    mCurrentProperty.mStartIndex = 1;
+    mCurrentProperty.mType = TYPE_ALBUM_PHOTOS;
+    mCurrentProperty.mUserId = album.userId();
+    mCurrentProperty.mAlbumId = album.albumId();
+}
+
+void HomeState::openPerson(int cell, const FavoritePeople &person)
+{
+    mSelectedAlbumIndex = 0;
+    mSelectedAlbumStart = 1;
+    mSelectedPersonIndex = cell;
+    mSelectedPersonStart = mCurrentProperty.mStartIndex;
+    mInitStart = 1;
+    mCurrentProperty = PackageProperty();
+    mCurrentProperty.mType = TYPE_ALBUM_LIST;
+    mCurrentProperty.mUserId = person.user();
+}
+
+HomeState::Back HomeState::back() const
+{
+    const int type = mCurrentProperty.mType;
+    if (type == TYPE_ALBUM_PHOTOS)
+        return Back::Albums;
+    if (type == TYPE_ALBUM_LIST && mIsFromFavorites)
+        return Back::People;
+    const bool isSearch = type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
+    return isSearch && mIsSearchShown ? Back::SearchBar : Back::SignOut;
+}
+
+void HomeState::backToAlbums()
+{
+    mCurrentProperty.mType = TYPE_ALBUM_LIST;
+    mCurrentProperty.mStartIndex = 1;
+    mCurrentProperty.mAlbumId.clear();
+    mInitIndex = mSelectedAlbumIndex;
+    mInitStart = mSelectedAlbumStart;
+}
+
+void HomeState::backToPeople()
+{
+    mCurrentProperty = PackageProperty();
+    mCurrentProperty.mType = TYPE_FAVORITE_PEOPLE;
+    mCurrentProperty.mUserId = QStringLiteral("default");
+    mInitIndex = mSelectedPersonIndex;
+    mInitStart = mSelectedPersonStart;
+}
+
+bool HomeState::pageUp(int arg)
+{
+    const paging::Page page = paging::pageUp(mCurrentProperty.mStartIndex, arg);
+    if (!page.exists)
+        return false;
+    mIsPageDown = false;
+    mIndexInPage = page.indexInPage;
+    mCurrentProperty.mStartIndex = page.startIndex;
+    return true;
+}
+
+bool HomeState::pageDown(int arg, const Package *package)
+{
+    const paging::Page page = paging::pageDown(mCurrentProperty.mStartIndex, total(package), arg);
+    if (!page.exists)
+        return false;
+    mIsPageDown = true;
+    mIndexInPage = page.indexInPage;
+    mCurrentProperty.mStartIndex = page.startIndex;
+    return true;
+}
+
+void HomeState::packageArrived(const Package &package)
+{
+    if (hasFeedTotal(mCurrentProperty.mType))
+        mTotalPhotoNum = package.mTotalCount;
+    else if (mInitStart > 1 && mInitStart <= package.count())
+        mCurrentProperty.mStartIndex = mInitStart;
+    mInitStart = 1;
+}
+
+void HomeState::moveTo(int cell, const Package *package)
+{
+    mPhotoIndexInTotal = recordIndex(cell) + 1;
+    const bool isFeatured = mCurrentProperty.mType == TYPE_FEATURED_PHOTOS;
+    mPhotoDataCount = isFeatured ? mTotalPhotoNum : package ? package->count() : 0;
+    if (mPhotoDataCount == 0)
+        logLine("enter mPhotoDataCount is 0");
+}
+
+void HomeState::restart()
+{
+    if (hasFeedTotal(mCurrentProperty.mType))
+        return;
+    mInitStart = mCurrentProperty.mStartIndex;
+    mCurrentProperty.mStartIndex = 1;
+}
+
+int HomeState::recordIndex(int cell) const
+{
+    return paging::recordIndex(mCurrentProperty.mType, mCurrentProperty.mStartIndex, cell);
+}
+
+int HomeState::total(const Package *package) const
+{
+    if (hasFeedTotal(mCurrentProperty.mType))
+        return mTotalPhotoNum;
+    return package ? package->count() : 0;
+}
+
+bool HomeState::isPhotoList() const
+{
+    const int type = mCurrentProperty.mType;
+    return type == TYPE_ALBUM_PHOTOS || hasFeedTotal(type);
+}
+
+bool HomeState::isWholeList() const
+{
+    const int type = mCurrentProperty.mType;
+    return type == TYPE_ALBUM_LIST || type == TYPE_ALBUM_PHOTOS || type == TYPE_FAVORITE_PEOPLE ||
+           type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
+}

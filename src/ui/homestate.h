@@ -1,0 +1,58 @@
+#pragma once
+
+#include "data/orvaladata.h"
+#include "data/package.h"
+#include "data/packageproperty.h"
+
+// What the home screen shows and how it came there: one function for each event, no widgets.
+//
+//   menu entry -> featured photos
+//              -> albums of the user  -> photos of an album
+//              -> favourite people    -> albums of a person -> photos of an album
+struct HomeState
+{
+    // Where Return leads.
+    enum class Back { Albums, People, SearchBar, SignOut };
+
+    PackageProperty mCurrentProperty; // the list shown, and the page of it
+    int mTotalPhotoNum = 0;           // the feed's total, of featured photos and searches
+    int mPhotoDataCount = 0;          // the total in the information line
+    int mPhotoIndexInTotal = 0;       // the number in the information line
+    int mIndexInPage = 0;             // of the record jumped to
+    bool mIsPageDown = false;
+    bool mIsReturnFromDetail = false;
+    bool mCanPlay = false; // a list has been shown
+    int mInitIndex = -1;   // grid index to focus after a page change; -1: as it is
+    int mSelectedAlbumIndex = 0;
+    int mSelectedAlbumStart = 1; // of the page on which that album stood
+    int mSelectedPersonIndex = 0;
+    int mSelectedPersonStart = 1;
+    int mInitStart = 1; // page to show when the list has come
+    bool mIsFromFavorites = false;
+    bool mIsSearchShown = false;
+    int mBlock = 0; // of search results
+
+    // The menu asks for a list. True when it is of another kind than the last.
+    bool enterMenu(const PackageProperty &property);
+    void openAlbum(int cell, const Album &album);
+    void openPerson(int cell, const FavoritePeople &person);
+
+    Back back() const;
+    void backToAlbums();
+    void backToPeople();
+
+    // A page of the list shown; false, and unchanged, when there is none.
+    bool pageUp(int arg);
+    bool pageDown(int arg, const Package *package);
+
+    // The list wanted has come, or a cell of it takes the focus.
+    void packageArrived(const Package &package);
+    void moveTo(int cell, const Package *package);
+    // The list is to be fetched anew, to show the same page.
+    void restart();
+
+    int recordIndex(int cell) const;
+    int total(const Package *package) const;
+    bool isPhotoList() const;
+    bool isWholeList() const; // pages are cut from a list that is held
+};

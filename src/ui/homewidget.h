@@ -1,0 +1,122 @@
+#pragma once
+
+#include "data/package.h"
+#include "network/errorcode.h"
+#include "ui/cellfiller.h"
+#include "ui/gridowner.h"
+#include "ui/homestate.h"
+
+#include <QPixmap>
+#include <QTimer>
+#include <QWidget>
+
+#include <memory>
+
+class FailurePage;
+class FormScrollArea;
+class HomeBars;
+class LoadingPage;
+class NoPhotoAvailableWidget;
+class QStackedLayout;
+class UpWidget;
+
+extern bool isHomeMenu; // featured photos are shown
+
+// The screen that the user lives in after signing in: the menu, one page of one list, and the bar
+// of key hints. There is one instance, which the static call-back reaches.
+//
+//   menu or cell --> HomeState --> requestPage(): loading page, then
+//       in the cache: packageReady --> tryToShowCurrentPackage --> CellFiller
+//       else PackageManager --> downloadPackageCB --> packageReady, or the failure page
+//
+// A page that fails, or does not come within "Network/PageSeconds", ends in the failure page; an
+// answer to what is no longer wanted is left alone.
+class HomeWidget : public QWidget, public GridOwner
+{
+    Q_OBJECT
+
+public:
+    explicit HomeWidget(QWidget *parent = nullptr);
+    ~HomeWidget() override;
+
+    static HomeWidget *mWidgetInst;
+    // The list shown. The package manager owns it; null once it has been taken from the cache.
+    static Package *mCurrentPackageData;
+    static bool mIsSelfPhoto; // the user's own albums and photos are shown
+    static QString mAlbumStr; // title of the album opened last
+    static QString mFavoritePeopleName;
+    static bool mIsMainMenuHide;
+    static int allPhotoNum; // photos in the list shown
+
+    // Answer of the package manager.
+    static void downloadPackageCB(PackageProperty &property, ErrorCode code);
+
+    const HomeState &state() const { return mState; }
+
+    // What the focus grid needs.
+    void handleGridKey(QKeyEvent *event) override { keyPressEvent(event); }
+    bool isLoading() const override;
+    bool isMainMenuHidden() const override { return mIsMainMenuHide; }
+    int packageType() const override { return mState.mCurrentProperty.mType; }
+    int startIndex() const override { return mState.mCurrentProperty.mStartIndex; }
+    int recordCount() const override;
+    bool handlePageUp(int arg) override;
+    bool handlePageDown(int arg) override;
+    void changeBlock(bool next) override;
+
+public slots:
+    void handleUpWidgetEnter(PackageProperty &property);
+    void tryToShowCurrentPackage(PackageProperty &property);
+    void updatePhotoRatio(int index);
+    void handleCommentEnter(int itemIndex, bool isEnterPress);
+    void returnFromLogoutCancel();
+
+signals:
+    void packageReady(PackageProperty &property);
+    void slideShow(int index);
+    void slidePlay(int index);
+
+protected:
+    void keyPressEvent(QKeyEvent *event) override;
+    void paintEvent(QPaintEvent *event) override;
+    void showEvent(QShowEvent *event) override;
+
+private:
+    void buildPages(QWidget *frame);
+    void connectParts();
+
+    void requestPage();
+    void tryToDownload(PackageProperty property);
+    void showPage(QWidget *page);
+    void showFailure(ErrorCode code);
+    void leaveFailure();
+    Package *takeUsablePackage();
+    void pushPackageData();
+    void focusAfterPageDown();
+    void startAtFirstCell();
+    void showOtherPage(const char *otherType);
+    void reshow();
+    void refreshBars();
+    QList<int> usefulKeys(bool isList) const;
+    void focusContent();
+    bool openAlbum(int itemIndex);
+    bool openPerson(int itemIndex);
+    bool goBack();
+    void play();
+    void confirmSignOut();
+    void renderBackdrop(const QSize &pixels);
+
+    HomeState mState;
+    UpWidget *mTitleWidget;
+    FormScrollArea *mCommentArea;
+    std::unique_ptr<CellFiller> mCells;
+    QWidget *mFrame;
+    QStackedLayout *mPages;
+    LoadingPage *mLoadingPage;
+    NoPhotoAvailableWidget *mNoPhotoPage;
+    FailurePage *mFailurePage;
+    HomeBars *mBars;
+    QTimer mPageTimer;
+    QPixmap mBackdrop;    // background and content frame, in device pixels
+    QRect mBackdropFrame; // where the frame is in it
+};

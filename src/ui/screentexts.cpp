@@ -1,0 +1,43 @@
+#include "ui/screentexts.h"
+
+#include <QVector>
+
+namespace {
+
+const QVector<const char *> mFailureString = {
+    "Something went wrong while this page was loading.",
+    "The album service has no such page, or does not let you see it.",
+    "The album service takes too long to answer.",
+    "The album service refused this page. Signing in again may help.",
+    "The album service cannot be reached. Please check the network.",
+    "Press Select to try again, or Return to go back.",
+};
+
+const QVector<const char *> mHintString = {
+    "Open",
+    "Try again",
+};
+
+const QVector<const char *> *tableOf(int table)
+{
+    switch (table) {
+    case ScreenTexts::FailureTable:
+        return &mFailureString;
+    case ScreenTexts::HintTable:
+        return &mHintString;
+    default:
+        return nullptr;
+    }
+}
+
+} // namespace
+
+QString ScreenTexts::text(int table, int index)
+{
+    const QVector<const char *> *entries = tableOf(table);
+    if (!entries)
+        return QStringLiteral("Unkown");
+    if (index < 0 || index >= entries->size())
+        return QStringLiteral("Unknown");
+    return QString::fromLatin1(entries->at(index));
+}

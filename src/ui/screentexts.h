@@ -1,0 +1,30 @@
+#pragma once
+
+#include <QString>
+
+// The screens' own texts, by table and index: what they say beyond the wording of I18n.
+class ScreenTexts
+{
+public:
+    enum Table { FailureTable = 0, HintTable = 1 };
+
+    // Index in the table of failures.
+    enum Failure {
+        PageFailed = 0,
+        PageNotFound = 1,
+        PageTooSlow = 2,
+        PageRefused = 3,
+        NoConnection = 4,
+        HowToGoOn = 5
+    };
+
+    // Index in the table of key hints.
+    enum Hint { OpenHint = 0, RetryHint = 1 };
+
+    // The text, or "Unknown" for an index outside the table, "Unkown" for a table that does not
+    // exist.
+    static QString text(int table, int index);
+
+    static QString failure(int index) { return text(FailureTable, index); }
+    static QString hint(int index) { return text(HintTable, index); }
+};

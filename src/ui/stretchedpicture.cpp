@@ -1,0 +1,55 @@
+#include "ui/stretchedpicture.h"
+
+#include <QPainter>
+#include <QPixmapCache>
+#include <QWidget>
+#include <qdrawutil.h>
+
+namespace {
+
+QString keyOf(const QString &resource, const QSize &size, int margin)
+{
+    return QStringLiteral("%1 %2x%3 %4")
+        .arg(resource, QString::number(size.width()), QString::number(size.height()),
+             QString::number(margin));
+}
+
+} // namespace
+
+QPixmap stretchedPicture(const QString &resource, const QSize &size, int margin,
+                         const QWidget *target)
+{
+    const qreal ratio = target->devicePixelRatioF();
+    const QSize pixels = (QSizeF(size) * ratio).toSize();
+    const QString key = keyOf(resource, pixels, margin);
+    QPixmap stretched;
+    if (QPixmapCache::find(key, &stretched))
+        return stretched;
+    const QPixmap source(resource);
+    if (source.isNull() || pixels.isEmpty())
+        return QPixmap();
+    stretched = QPixmap(pixels);
+    stretched.fill(Qt::transparent);
+    stretched.setDevicePixelRatio(ratio);
+    QPainter painter(&stretched);
+    painter.setRenderHint(QPainter::SmoothPixmapTransform);
+    qDrawBorderPixmap(&painter, QRect(QPoint(0, 0), size), QMargins(margin, margin, margin, margin),
+                      source);
+    painter.end();
+    QPixmapCache::insert(key, stretched);
+    return stretched;
+}
+
+QPixmap fittedPicture(const QString &resource, const QSize &size)
+{
+    const QString key = keyOf(resource, size, -1);
+    QPixmap fitted;
+    if (QPixmapCache::find(key, &fitted))
+        return fitted;
+    const QPixmap source(resource);
+    if (source.isNull() || size.isEmpty())
+        return QPixmap();
+    fitted = source.scaled(size, Qt::KeepAspectRatio, Qt::SmoothTransformation);
+    QPixmapCache::insert(key, fitted);
+    return fitted;
+}

@@ -1,0 +1,300 @@
+#include "data/packagemanager.h"
+#include "heldanswers.h"
+#include "support/logcapture.h"
+#include "testconfig.h"
+
+#include <QtTest>
+
+namespace {
+
+const QByteArray featuredPath = "/data/feed/api/featured";
+
+struct Answer
+{
+    PackageProperty property;
+    ErrorCode code;
+};
+QList<Answer> answers, secondAnswers;
+
+void store(PackageProperty &property, ErrorCode code)
+{
+    answers.append({property, code});
+}
+
+void storeSecond(PackageProperty &property, ErrorCode code)
+{
+    secondAnswers.append({property, code});
+}
+
+void clearEverything(PackageProperty &property, ErrorCode code)
+{
+    PackageManager::clearAll();
+    store(property, code);
+}
+
+void askAgain(PackageProperty &property, ErrorCode code)
+{
+    store(property, code);
+    if (answers.size() == 1)
+        PackageManager::downloadPage(property, &store);
+}
+
+PackageProperty albumsOf(const QString &user)
+{
+    PackageProperty property;
+    property.mType = ALBUMS_LIST;
+    property.mUserId = user;
+    return property;
+}
+
+PackageProperty ofType(PackageType type, int start = 1)
+{
+    PackageProperty property = albumsOf("u");
+    property.mAlbumId = "a";
+    property.mPhotoId = "p";
+    property.mSearchedStr = "sea";
+    property.mType = type;
+    property.mStartIndex = start;
+    return property;
+}
+
+QByteArray feedOf(int entries, int total = 100)
+{
+    QByteArray text =
+        "{\"feed\":{\"openSearch$totalResults\":{\"$t\":" + QByteArray::number(total) +
+        "},\"entry\":[";
+    for (int i = 0; i < entries; ++i)
+        text += i ? ",{}" : "{}";
+    return text + "]}}";
+}
+
+} // namespace
+
+class TestPackageManager : public QObject
+{
+    Q_OBJECT
+
+private slots:
+    void init()
+    {
+        mServer = std::make_unique<MisbehavingServer>();
+        mHeld = HeldAnswers();
+        configure();
+        answers.clear();
+        secondAnswers.clear();
+    }
+    void cleanup()
+    {
+        PackageManager::clearAll();
+        mServer.reset();
+    }
+
+    void joinsRequestsForOneList()
+    {
+        mServer->on("/data/feed/api/user/u", mHeld.hold());
+        PackageProperty property = albumsOf("u");
+        QVERIFY(!PackageManager::getPackage(property));
+        QVERIFY(PackageManager::downloadPage(property, &store));
+        QVERIFY(PackageManager::downloadPage(property, &storeSecond));
+        QTRY_COMPARE(mHeld.count(), 1);
+        mHeld.answerFirst(MisbehavingServer::answer(feedOf(3)));
+        QTRY_COMPARE(secondAnswers.size(), 1);
+        QCOMPARE(secondAnswers.first().code, NET_SUCCESS);
+        QVERIFY(answers.isEmpty() && secondAnswers.first().property.mDownloadTime.isValid());
+        QCOMPARE(mServer->requests().size(), 1);
+        QCOMPARE(PackageManager::getPackage(property)->count(), 3);
+    }
+
+    // Lists whose addresses are the same although their keys differ do not disturb each other.
+    void keepsListsOfOneAddressApart()
+    {
+        mServer->on("/data/feed/api/user/u", MisbehavingServer::answer(feedOf(3)));
+        PackageProperty first = albumsOf("u"), second = first;
+        second.mAlbumId = "left over";
+        QVERIFY(PackageManager::downloadPage(first, &store));
+        QVERIFY(PackageManager::downloadPage(second, &store));
+        QTRY_COMPARE(answers.size(), 2);
+        QVERIFY(PackageManager::getPackage(first) && PackageManager::getPackage(second));
+    }
+
+    void fetchesFeaturedPagesAhead()
+    {
+        mServer->on(featuredPath, mHeld.hold());
+        PackageProperty first = ofType(FEATURED_PHOTOS_LIST);
+        QVERIFY(PackageManager::downloadPage(first, &store));
+        QTRY_COMPARE(mHeld.count(), 1);
+        mHeld.answerFirst(MisbehavingServer::answer(feedOf(8)));
+        QTRY_COMPARE(mHeld.count(), 1); // the second page is on its way by itself
+        QVERIFY(mServer->requests().last().path.contains("start-index=9&max-results=8"));
+        QCOMPARE(answers.size(), 1);
+        QCOMPARE(answers.first().property.mTotalCount, 100);
+
+        PackageProperty second = ofType(FEATURED_PHOTOS_LIST, 9);
+        QVERIFY(!PackageManager::getPackage(second));
+        QVERIFY(PackageManager::downloadPage(second, &storeSecond));
+        QVERIFY(PackageManager::getPackage(first)); // fetches ahead again, and joins
+        mHeld.answerFirst(MisbehavingServer::answer(feedOf(8)));
+        QTRY_COMPARE(secondAnswers.size(), 1);
+        QCOMPARE(PackageManager::getPackage(second)->count(), 16);
+        QTRY_COMPARE(mHeld.count(), 1); // start 17, asked for by the hit
+        LogCapture log;
+        PackageProperty third = ofType(FEATURED_PHOTOS_LIST, 17);
+        QVERIFY(!PackageManager::getPackage(third));
+        QVERIFY(log.contains("mStartIndex bigger than data count!17 > 16"));
+    }
+
+    void replacesFurtherSearchPages()
+    {
+        mServer->on("/data/feed/api/all", MisbehavingServer::answer(feedOf(5)));
+        for (int start : {101, 201, 201}) {
+            PackageProperty property = ofType(SEARCH_MORE_PHOTOS_LIST, start);
+            QVERIFY(PackageManager::downloadPage(property, &store));
+            const int before = answers.size();
+            QTRY_COMPARE(answers.size(), before + 1);
+            QCOMPARE(answers.last().property.mTotalCount, 100);
+            QVERIFY(PackageManager::getPackage(property));
+            QCOMPARE(PackageManager::getPackage(property)->count(), 5);
+        }
+    }
+
+    void dropsStaleFirstPagesOnly()
+    {
+        mServer->on("/data/feed/api/user/u", MisbehavingServer::answer(feedOf(12)));
+        PackageProperty property = albumsOf("u");
+        QVERIFY(PackageManager::downloadPage(property, &store));
+        QTRY_COMPARE(answers.size(), 1);
+        configure("PageCacheSeconds=0\n");
+        property.mStartIndex = 9;
+        QVERIFY(PackageManager::getPackage(property));
+        property.mStartIndex = 1;
+        LogCapture log;
+        QVERIFY(!PackageManager::getPackage(property));
+        QVERIFY(log.contains("package data timeout! mStartIndex =1"));
+        QVERIFY(log.contains("packagemanager.cpp removeCache! Type = 2"));
+    }
+
+    void evictsTheOldestButNotForDetails()
+    {
+        configure("PageCacheNumber=3\n");
+        for (const char *user : {"a", "b", "c"}) {
+            PackageProperty property = albumsOf(user);
+            PackageManager::addToCache(property, packageOf(property), false);
+        }
+        PackageProperty comments = ofType(PHOTO_COMMENTS_LIST);
+        PackageManager::addToCache(comments, packageOf(comments), false);
+        QCOMPARE(cachedUsers(), QString("abc"));
+        PackageProperty newest = albumsOf("d");
+        PackageManager::addToCache(newest, packageOf(newest), false);
+        QCOMPARE(cachedUsers(), QString("cd"));
+        QVERIFY(PackageManager::getPackage(comments));
+    }
+
+    void sweepsStaleListsOfTheSamePage()
+    {
+        PackageProperty old = albumsOf("a"), later = albumsOf("b");
+        later.mStartIndex = 9;
+        for (PackageProperty *property : {&old, &later}) {
+            property->mDownloadTime = QDateTime::currentDateTime().addSecs(-61);
+            PackageManager::addToCache(*property, packageOf(*property), false);
+        }
+        PackageProperty fresh = albumsOf("c");
+        LogCapture log;
+        PackageManager::addToCache(fresh, packageOf(fresh), false);
+        QVERIFY(log.contains("packageManager.cpp do not timeout"));
+        QVERIFY(!PackageManager::getPackage(old) && PackageManager::getPackage(later));
+    }
+
+    void tellsEachFailure_data()
+    {
+        QTest::addColumn<int>("kind");
+        QTest::addColumn<int>("code");
+        QTest::newRow("missing") << 0 << int(NET_CONTENT_ERROR);
+        QTest::newRow("closed") << 1 << int(NET_FAILED);
+        QTest::newRow("empty") << 2 << int(NET_NO_DATA);
+        QTest::newRow("bomb") << 3 << int(NET_CANCELED);
+        QTest::newRow("page") << 4 << int(NET_SUCCESS);
+        QTest::newRow("cut zip") << 5 << int(NET_SUCCESS);
+    }
+    void tellsEachFailure()
+    {
+        const QList<MisbehavingServer::Behaviour> kinds = {
+            MisbehavingServer::html(404),  MisbehavingServer::reset(),
+            MisbehavingServer::answer(""), MisbehavingServer::gzipBomb(40),
+            MisbehavingServer::html(),     MisbehavingServer::cutGzip(feedOf(500)),
+        };
+        QFETCH(int, kind);
+        QFETCH(int, code);
+        mServer->on("/data/feed/api/user/u", kinds.at(kind));
+        PackageProperty property = albumsOf("u");
+        QVERIFY(PackageManager::downloadPage(property, &askAgain)); // from inside the call-back
+        QTRY_COMPARE(answers.size(), 2);
+        for (const Answer &answer : qAsConst(answers)) {
+            if (kind == 5 && answer.code == NET_NO_DATA)
+                continue; // nothing could be unpacked
+            QCOMPARE(answer.code, code);
+        }
+        QVERIFY(answers.first().property == property);
+    }
+
+    void refusesRequestsWithoutAddress()
+    {
+        PackageProperty property = albumsOf(QString());
+        QVERIFY(!PackageManager::downloadPage(property, &store));
+        property.mType = INVALID_LIST;
+        QVERIFY(!PackageManager::downloadPage(property, &store));
+    }
+
+    void clearsInsideCallbackAndWhileRunning()
+    {
+        mServer->on(featuredPath, mHeld.hold());
+        PackageProperty property = ofType(FEATURED_PHOTOS_LIST);
+        QVERIFY(PackageManager::downloadPage(property, &clearEverything));
+        QTRY_COMPARE(mHeld.count(), 1);
+        mHeld.answerFirst(MisbehavingServer::answer(feedOf(8)));
+        QTRY_COMPARE(answers.size(), 1);
+        QVERIFY(!PackageManager::getPackage(property));
+
+        QVERIFY(PackageManager::downloadPage(property, &storeSecond));
+        QTRY_COMPARE(mHeld.count(), 1);
+        PackageManager::clearAll();
+        QVERIFY(PackageManager::downloadPage(property, &store)); // a request of its own
+        QTRY_COMPARE(mHeld.count(), 2);
+        QCOMPARE(mServer->requests().size(), 3); // and nothing was fetched ahead
+        while (mHeld.count() > 0)
+            mHeld.answerFirst(MisbehavingServer::answer(feedOf(8)));
+        QTRY_COMPARE(answers.size(), 2);
+        QVERIFY(secondAnswers.isEmpty());
+    }
+
+private:
+    void configure(const QByteArray &limits = QByteArray())
+    {
+        mConfig.write("[Service]\nFeedBase=" + mServer->url("").toLatin1() + "\n[Max]\n" + limits);
+    }
+    static Package *packageOf(PackageProperty &property)
+    {
+        if (!property.mDownloadTime.isValid())
+            property.mDownloadTime = QDateTime::currentDateTime();
+        auto *package = new Package;
+        package->mProperty = property;
+        package->mProperty.mDownloadTime = QDateTime::currentDateTime();
+        return package;
+    }
+    static QString cachedUsers()
+    {
+        QString users;
+        for (const char *user : {"a", "b", "c", "d"}) {
+            PackageProperty property = albumsOf(user);
+            if (PackageManager::getPackage(property))
+                users += user;
+        }
+        return users;
+    }
+
+    TestConfig mConfig;
+    std::unique_ptr<MisbehavingServer> mServer;
+    HeldAnswers mHeld;
+};
+
+QTEST_GUILESS_MAIN(TestPackageManager)
+#include "tst_packagemanager.moc"

@@ -1,0 +1,193 @@
+#include "app/timerequest.h"
+#include "platform/sntp.h"
+#include "platform/systemclock.h"
+#include "support/logcapture.h"
+
+#include <QNetworkProxy>
+#include <QRandomGenerator>
+#include <QSignalSpy>
+#include <QTest>
+#include <QUdpSocket>
+
+#include <cerrno>
+
+namespace {
+
+QList<qint64> clockSettings;
+int clockResult = 0;
+
+int noteClock(const time_t *seconds)
+{
+    clockSettings.append(*seconds);
+    return clockResult;
+}
+
+// A reply of the given size whose transmit time is so many seconds after 1900.
+QByteArray reply(quint32 seconds, int size = 48)
+{
+    QByteArray datagram(size, '\xFF');
+    for (int i = 0; i < 4; ++i)
+        datagram[size - 8 + i] = char(seconds >> (24 - 8 * i));
+    return datagram;
+}
+
+} // namespace
+
+class TestSntp : public QObject
+{
+    Q_OBJECT
+
+private slots:
+    void init();
+    void cleanup();
+    void buildsTheRequest();
+    void readsRepliesOfAnyLength();
+    void setsTheClock_data();
+    void setsTheClock();
+    void toleratesOddServers_data();
+    void toleratesOddServers();
+
+private:
+    QByteArray exchange(const QString &server, const QList<QByteArray> &replies);
+
+    QUdpSocket mServer;
+};
+
+void TestSntp::init()
+{
+    setClockSetter(noteClock);
+    clockSettings.clear();
+    clockResult = 0;
+    QVERIFY(mServer.bind(QHostAddress::LocalHost));
+}
+
+void TestSntp::cleanup()
+{
+    mServer.close();
+    setClockSetter(nullptr);
+}
+
+// Runs one exchange with the server and returns the request that it has seen.
+QByteArray TestSntp::exchange(const QString &server, const QList<QByteArray> &replies)
+{
+    TimeRequest request;
+    connect(&request, &TimeRequest::connected, &request, &TimeRequest::sendRequest);
+    // Read at last, when all the replies are waiting.
+    QSignalSpy answered(&request, &TimeRequest::readyRead);
+    request.start(server);
+    if (!QTest::qWaitFor([this] { return mServer.hasPendingDatagrams(); }))
+        return QByteArray();
+    QByteArray seen(200, '\0');
+    QHostAddress client;
+    quint16 port = 0;
+    seen.truncate(int(mServer.readDatagram(seen.data(), seen.size(), &client, &port)));
+    for (const QByteArray &datagram : replies)
+        mServer.writeDatagram(datagram, client, port);
+    if (!QTest::qWaitFor([&answered] { return !answered.isEmpty(); }))
+        return QByteArray();
+    request.readReply();
+    return seen;
+}
+
+void TestSntp::buildsTheRequest()
+{
+    const QDateTime local(QDate(2024, 2, 29), QTime(12, 30, 15), Qt::OffsetFromUTC, -5 * 3600);
+    QByteArray expected(48, '\0');
+    expected[0] = 0x1B;
+    expected[2] = 4;
+    expected[3] = char(250);
+    expected[5] = 1;
+    expected[9] = 1;
+    // 1709209815 is the same reading of the clock in UTC.
+    expected.replace(40, 4, reply(1709209815u + 2208988800u).mid(40, 4));
+    QCOMPARE(sntpRequest(local), expected);
+    // The counter starts anew in 2036.
+    const QDateTime late(QDate(2036, 2, 7), QTime(6, 28, 17), Qt::LocalTime);
+    QCOMPARE(sntpRequest(late).mid(40), QByteArray::fromHex("0000000100000000"));
+}
+
+void TestSntp::readsRepliesOfAnyLength()
+{
+    QRandomGenerator random(1);
+    for (int size = 0; size <= 100; ++size) {
+        QByteArray datagram(size, '\0');
+        for (char &byte : datagram)
+            byte = char(random.generate());
+        // A copy without spare room, so that a sanitizer sees any step outside.
+        const std::unique_ptr<char[]> exact(new char[size_t(size)]);
+        std::copy(datagram.cbegin(), datagram.cend(), exact.get());
+        const auto seconds = sntpSeconds(QByteArray::fromRawData(exact.get(), size));
+        QCOMPARE(seconds.has_value(), size >= 8);
+        if (seconds)
+            QCOMPARE(quint32(*seconds + 2208988800),
+                     datagram.mid(size - 8, 4).toHex().toUInt(nullptr, 16));
+    }
+}
+
+void TestSntp::setsTheClock_data()
+{
+    QTest::addColumn<QList<QByteArray>>("replies");
+    QTest::addColumn<qint64>("seconds");
+
+    const auto row = [](const char *name, const QList<QByteArray> &replies, qint64 seconds) {
+        QTest::newRow(name) << replies << seconds;
+    };
+    row("plain", {reply(3913056000u)}, 1704067200);
+    row("before 1970", {reply(5)}, 5 - 2208988800LL);
+    row("highest", {reply(0xFFFFFFFFu)}, 2085978495);
+    row("shortest", {reply(3913056000u, 8)}, 1704067200);
+    row("with an authenticator", {reply(3913056000u, 68)}, 1704067200);
+    row("the last one counts", {reply(1), QByteArray(), reply(3913056001u)}, 1704067201);
+}
+
+void TestSntp::setsTheClock()
+{
+    QFETCH(QList<QByteArray>, replies);
+    QFETCH(qint64, seconds);
+    QNetworkProxy::setApplicationProxy({QNetworkProxy::HttpProxy, "127.0.0.1", 1});
+    clockResult = -1;
+    const LogCapture log;
+    const QString server = QStringLiteral("127.0.0.1:%1").arg(mServer.localPort());
+    const QByteArray request = exchange(server, replies);
+    QNetworkProxy::setApplicationProxy(QNetworkProxy::NoProxy);
+    QCOMPARE(request.size(), 48);
+    QCOMPARE(clockSettings, QList<qint64>({seconds}));
+    QVERIFY(log.anyStartsWith("Get date time from Network :"));
+    QVERIFY(log.contains("stime r= :-1"));
+}
+
+void TestSntp::toleratesOddServers_data()
+{
+    QTest::addColumn<QString>("server");
+    QTest::addColumn<QList<QByteArray>>("replies");
+    QTest::addColumn<bool>("asked");
+
+    QTest::newRow("none") << QString() << QList<QByteArray>() << false;
+    QTest::newRow("nonsense") << QStringLiteral("a b:::[") << QList<QByteArray>() << false;
+    QTest::newRow("empty reply") << QStringLiteral("127.0.0.1:%1")
+                                 << QList<QByteArray>({QByteArray()}) << true;
+    QTest::newRow("short reply by name")
+        << QStringLiteral("localhost:%1") << QList<QByteArray>({QByteArray(7, 'x')}) << true;
+}
+
+void TestSntp::toleratesOddServers()
+{
+    QFETCH(QString, server);
+    QFETCH(QList<QByteArray>, replies);
+    QFETCH(bool, asked);
+    if (asked) {
+        const QByteArray request = exchange(server.arg(mServer.localPort()), replies);
+        QCOMPARE(request.size(), 48);
+    } else {
+        TimeRequest request;
+        QSignalSpy connectedSpy(&request, &TimeRequest::connected);
+        request.start(server);
+        request.sendRequest();
+        request.readReply();
+        QVERIFY(connectedSpy.isEmpty());
+    }
+    QVERIFY(clockSettings.isEmpty());
+}
+
+QTEST_GUILESS_MAIN(TestSntp)
+#include "tst_sntp.moc"
