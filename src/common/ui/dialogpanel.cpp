@@ -36,7 +36,9 @@ QLabel *makeLabel(QWidget *parent, int points)
     return label;
 }
 
-QLabel *makeTitle(QWidget *parent)
+} // namespace
+
+QLabel *makePopupTitle(QWidget *parent)
 {
     QLabel *title = makeLabel(parent, SystemConfig::menuFont());
     title->setStyleSheet(QStringLiteral("QLabel {border-image: url(%1); color: white;}")
@@ -45,12 +47,10 @@ QLabel *makeTitle(QWidget *parent)
     return title;
 }
 
-} // namespace
-
 DialogPanel::DialogPanel(const ButtonStyles &styles, QWidget *parent)
     : QFrame(parent)
     , mStyles(styles)
-    , mTitle(makeTitle(this))
+    , mTitle(makePopupTitle(this))
 {
     setFixedWidth(panelWidth());
     auto *content = new QContentFrame(this);

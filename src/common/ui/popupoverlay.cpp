@@ -2,7 +2,6 @@
 
 #include "network/systemconfig.h"
 
-#include <QApplication>
 #include <QGridLayout>
 #include <QKeyEvent>
 #include <QPainter>
@@ -81,17 +80,18 @@ void PopupOverlay::hideEvent(QHideEvent *event)
 
 void PopupOverlay::takeFocus()
 {
-    QWidget *before = QApplication::focusWidget();
-    if (focusPolicy() == Qt::NoFocus || (before && isAncestorOf(before)))
+    if (focusPolicy() == Qt::NoFocus || isNested())
         return;
-    mFocusBefore = before;
+    QWidget *before = window()->focusWidget();
+    if (before != this && !isAncestorOf(before))
+        mFocusBefore = before;
     focusReceiver()->setFocus();
 }
 
 void PopupOverlay::giveFocusBack()
 {
-    QWidget *focus = QApplication::focusWidget();
-    const bool isOurs = focus && (focus == this || isAncestorOf(focus));
+    const QWidget *focus = window()->focusWidget();
+    const bool isOurs = focus == this || isAncestorOf(focus);
     if (isOurs && mFocusBefore && mFocusBefore->isVisible())
         mFocusBefore->setFocus();
     mFocusBefore = nullptr;

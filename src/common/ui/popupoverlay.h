@@ -8,8 +8,8 @@
 // the focus when it is shown and gives it back to where it was when it goes; with the focus policy
 // Qt::NoFocus it leaves the focus alone, for a dialog that is handed its keys.
 //
-// An overlay inside an overlay covers that one and does not dim it again. In a parent whose layout
-// holds it, it keeps the place that the layout gives.
+// An overlay inside an overlay covers that one, neither dims it again nor takes the focus by
+// itself. In a parent whose layout holds it, it keeps the place that the layout gives.
 class PopupOverlay : public QWidget
 {
     Q_OBJECT
