@@ -1,6 +1,7 @@
 #include "common/ui/dialogpanel.h"
 
 #include "common/ui/frames.h"
+#include "common/ui/popupoverlay.h"
 #include "common/ui/textfit.h"
 #include "network/systemconfig.h"
 
@@ -30,6 +31,7 @@ QLabel *makeLabel(QWidget *parent, int points)
     auto *label = new QLabel(parent);
     label->setTextFormat(Qt::PlainText);
     label->setAlignment(Qt::AlignCenter);
+    setPopupColours(label);
     QFont font = label->font();
     font.setPointSize(points);
     label->setFont(font);
@@ -97,8 +99,10 @@ QPushButton *DialogPanel::addButton(const QString &text)
     font.setPointSize(SystemConfig::buttonFont());
     button->setFont(font);
     button->setText(buttonText(text, font, kButtonSize.width() - 2 * kBorder));
+    button->setLayoutDirection(text.isRightToLeft() ? Qt::RightToLeft : Qt::LeftToRight);
     button->setFixedSize(kButtonSize);
     button->setFocusPolicy(Qt::NoFocus);
+    setPopupColours(button);
     button->setStyleSheet(mButtons.isEmpty() ? mStyles.focused : mStyles.normal);
     mButtonRow->insertWidget(mButtonRow->count() - 1, button);
     mButtons.append(button);

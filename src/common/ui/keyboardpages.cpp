@@ -1,18 +1,31 @@
 #include "common/ui/keyboardpages.h"
 
-#include <QGridLayout>
+#include <QHBoxLayout>
 #include <QLabel>
 
 namespace {
 
 constexpr int kTextHeight = 20; // pixels of the font
+constexpr int kPairGap = 24;
 
 QString nameStyle(bool isUp)
 {
-    return isUp ? QStringLiteral("color:#12202b;background-color:#c5d2db;border:2px solid #f2f6f9;"
-                                 "border-radius:8px;font-weight:bold;")
-                : QStringLiteral("color:#c5d2db;background-color:transparent;"
-                                 "border:2px solid #3e4c58;border-radius:8px;");
+    return isUp ? QStringLiteral("color:#12202b;background-color:#c5d2db;border-radius:8px;")
+                : QStringLiteral("color:#a9b9c4;background-color:transparent;");
+}
+
+QLabel *makeName(QWidget *parent, KeyboardPage page)
+{
+    auto *name = new QLabel(parent);
+    name->setTextFormat(Qt::PlainText);
+    name->setText(pageName(page));
+    name->setAlignment(Qt::AlignCenter);
+    QFont font = name->font();
+    font.setPixelSize(kTextHeight);
+    font.setBold(true);
+    name->setFont(font);
+    name->setStyleSheet(nameStyle(false));
+    return name;
 }
 
 } // namespace
@@ -20,20 +33,14 @@ QString nameStyle(bool isUp)
 KeyboardPages::KeyboardPages(QWidget *parent)
     : QWidget(parent)
 {
-    auto *grid = new QGridLayout(this);
-    grid->setContentsMargins(0, 0, 0, 0);
-    grid->setSpacing(8);
+    auto *row = new QHBoxLayout(this);
+    row->setContentsMargins(0, 0, 0, 0);
+    row->setSpacing(4);
     for (int i = 0; i < kPageCount; ++i) {
-        auto *name = new QLabel(this);
-        name->setTextFormat(Qt::PlainText);
-        name->setText(pageName(KeyboardPage(i)));
-        name->setAlignment(Qt::AlignCenter);
-        QFont font = name->font();
-        font.setPixelSize(kTextHeight);
-        name->setFont(font);
-        name->setFixedSize(104, 38);
-        name->setStyleSheet(nameStyle(false));
-        grid->addWidget(name, i / 2, i % 2);
+        if (i > 0 && i % 2 == 0)
+            row->addSpacing(kPairGap);
+        QLabel *name = makeName(this, KeyboardPage(i));
+        row->addWidget(name, 1);
         mNames << name;
     }
 }

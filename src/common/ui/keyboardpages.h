@@ -7,7 +7,7 @@
 
 class QLabel;
 
-// Shows the pages of the on-screen keyboard, one pair in each row, and which one is up.
+// The names of the on-screen keyboard's pages, in a row of pairs, which tell the one that is up.
 class KeyboardPages : public QWidget
 {
     Q_OBJECT

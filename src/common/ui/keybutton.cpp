@@ -1,5 +1,7 @@
 #include "common/ui/keybutton.h"
 
+#include "common/ui/popupoverlay.h"
+
 #include <QStyleOptionButton>
 #include <QStylePainter>
 
@@ -7,7 +9,8 @@ namespace {
 
 constexpr int kTextHeight = 20; // pixels of the font
 constexpr int kSmallestText = 14;
-constexpr int kMargin = 4;
+constexpr int kMargin = 6;
+constexpr qreal kDimmed = 0.35;
 
 QString markedStyle()
 {
@@ -27,6 +30,7 @@ KeyButton::KeyButton(QWidget *parent)
     : QPushButton(parent)
 {
     setFocusPolicy(Qt::NoFocus);
+    setPopupColours(this);
     setIconSize({28, 28});
     setSizePolicy(QSizePolicy::Ignored, QSizePolicy::Expanding);
     setMarked(false);
@@ -59,10 +63,13 @@ void KeyButton::paintEvent(QPaintEvent *)
     QStyleOptionButton option;
     initStyleOption(&option);
     option.text.clear();
+    option.icon = QIcon();
     painter.drawControl(QStyle::CE_PushButton, option);
-    if (text().isEmpty())
-        return;
+    painter.setOpacity(isEnabled() ? 1 : kDimmed); // not the frame, which may show the focus
+    QRect picture(QPoint(), iconSize());
+    picture.moveCenter(rect().center());
+    icon().paint(&painter, picture);
     painter.setFont(fittingFont());
-    painter.drawItemText(rect(), Qt::AlignCenter | Qt::TextHideMnemonic, palette(), isEnabled(),
-                         text(), QPalette::ButtonText);
+    painter.drawItemText(rect(), Qt::AlignCenter | Qt::TextHideMnemonic, palette(), true, text(),
+                         QPalette::ButtonText);
 }

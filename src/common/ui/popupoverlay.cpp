@@ -16,7 +16,6 @@ PopupOverlay::PopupOverlay(QWidget *parent)
     : QWidget(parent)
 {
     setFocusPolicy(Qt::StrongFocus);
-    setPalette(popupPalette(palette()));
     auto *rows = new QGridLayout(this);
     rows->setContentsMargins(0, 0, 0, 0);
     if (parent)
@@ -109,10 +108,14 @@ void PopupOverlay::keyPressEvent(QKeyEvent *event)
     event->accept();
 }
 
-QPalette popupPalette(QPalette palette)
+void setPopupColours(QWidget *widget)
 {
     const QColor text(0xf2, 0xf6, 0xf9);
-    for (QPalette::ColorRole role : {QPalette::WindowText, QPalette::Text, QPalette::ButtonText})
+    const QColor dimmed(0x75, 0x84, 0x8f);
+    QPalette palette = widget->palette();
+    for (QPalette::ColorRole role : {QPalette::WindowText, QPalette::Text, QPalette::ButtonText}) {
         palette.setColor(role, text);
-    return palette;
+        palette.setColor(QPalette::Disabled, role, dimmed);
+    }
+    widget->setPalette(palette);
 }

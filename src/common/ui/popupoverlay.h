@@ -42,5 +42,6 @@ private:
     QPointer<QWidget> mFocusBefore;
 };
 
-// Light text, for what lies on the dark panels of pop-ups.
-QPalette popupPalette(QPalette palette);
+// Gives a widget on the dark panel of a pop-up its light text. Palettes are not inherited below a
+// widget with a style sheet: each one that shows text needs its own.
+void setPopupColours(QWidget *widget);

@@ -1,7 +1,7 @@
 #include "common/ui/qkeyboard.h"
 
+#include "common/ui/keyboardpages.h"
 #include "common/ui/keybutton.h"
-#include "common/ui/popupoverlay.h"
 #include "common/ui/remotekeys.h"
 #include "network/systemconfig.h"
 
@@ -69,12 +69,14 @@ QHBoxLayout *makeGroup()
 
 QKeyBoard::QKeyBoard(QWidget *parent)
     : QFrame(parent)
+    , mPages(new KeyboardPages(this))
 {
-    setPalette(popupPalette(palette()));
     setFixedSize(fieldSize());
     auto *rows = new QVBoxLayout(this);
     rows->setContentsMargins(0, 0, 0, 0);
     rows->setSpacing(0);
+    mPages->setFixedHeight(rowHeight());
+    rows->addWidget(mPages);
     for (int row = 0; row < kKeyRows; ++row)
         addRow(rows, row);
     initInvariableStr();
@@ -105,8 +107,7 @@ void QKeyBoard::addRow(QBoxLayout *rows, int row)
             static_cast<QBoxLayout *>(digits->layout())->addWidget(makeKey(i), 1);
         line->addWidget(digits);
     }
-    if (row > 0)
-        rows->addStretch();
+    rows->addStretch();
     rows->addLayout(line);
 }
 
@@ -139,7 +140,7 @@ void QKeyBoard::setPage(KeyboardPage page)
         if (isPageKey(i))
             mKeys.at(i)->setLabel(keyLabel(page, i));
     }
-    emit pageChanged(page);
+    mPages->setPage(page);
 }
 
 void QKeyBoard::setNewLineEnabled(bool enabled)

@@ -6,12 +6,13 @@
 #include <QList>
 
 class KeyButton;
+class KeyboardPages;
 class QBoxLayout;
 
 // The field of 55 keys, one of which has the focus. The remote's arrow keys move the focus and its
 // select key types. Page keys turn to capitals, signs and accents, as Page Up, Page Down and Red do
-// from anywhere. The keys' buttons never take the keyboard's focus: whoever has it hands its keys
-// to handleKey().
+// from anywhere; a row above the keys tells which page is up. The keys' buttons never take the
+// keyboard's focus: whoever has it hands its keys to handleKey().
 class QKeyBoard : public QFrame
 {
     Q_OBJECT
@@ -35,7 +36,6 @@ signals:
     void textTyped(const QString &text);
     // One of the keys from CursorLeftKey on, but for SpaceKey, which types.
     void functionPressed(int key);
-    void pageChanged(KeyboardPage page);
 
 protected:
     void keyPressEvent(QKeyEvent *event) override;
@@ -49,6 +49,7 @@ private:
     KeyButton *makeKey(int index);
     void press(int index);
 
+    KeyboardPages *mPages;
     QList<KeyButton *> mKeys;
     int mFocusIndex = 0;
     KeyboardPage mPage = KeyboardPage::Small;

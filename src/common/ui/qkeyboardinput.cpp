@@ -1,9 +1,7 @@
 #include "common/ui/qkeyboardinput.h"
 
 #include "base/i18n.h"
-#include "common/ui/keyboardpages.h"
 #include "common/ui/keymap.h"
-#include "common/ui/popupoverlay.h"
 #include "common/ui/qkeyboard.h"
 #include "common/ui/remotekeys.h"
 #include "common/ui/shortcutbar.h"
@@ -11,10 +9,10 @@
 
 #include <QClipboard>
 #include <QGuiApplication>
-#include <QHBoxLayout>
 #include <QInputMethodEvent>
 #include <QKeyEvent>
 #include <QPlainTextEdit>
+#include <QVBoxLayout>
 
 namespace {
 
@@ -44,11 +42,11 @@ QKeyBoardInput::QKeyBoardInput(QWidget *parent)
     , mBox(new QPlainTextEdit(this))
     , mKeyBoard(new QKeyBoard(this))
 {
-    setPalette(popupPalette(palette()));
-    setFixedSize(SystemConfig::mScreen_Width * 5 / 6, SystemConfig::mScreen_Height * 5 / 7);
+    setFixedWidth(SystemConfig::mScreen_Width * 5 / 6);
     setFocusProxy(mBox);
     buildBox();
     build();
+    setMultiLine(true);
     connect(mKeyBoard, &QKeyBoard::textTyped, this, &QKeyBoardInput::insert);
     connect(mKeyBoard, &QKeyBoard::functionPressed, this, &QKeyBoardInput::handleFunction);
 }
@@ -68,52 +66,30 @@ void QKeyBoardInput::buildBox()
     mBox->setVerticalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
     mBox->installEventFilter(this);
     KeyMap::setTakesText(mBox);
-    connect(mBox->document(), &QTextDocument::contentsChange, this,
-            [this](int place, int removed, int added) {
-                if (!mIsDisplaying)
-                    mChange = {place, removed, added};
-            });
+    connect(mBox->document(), &QTextDocument::contentsChange, this, &QKeyBoardInput::takeOver);
     connect(mBox, &QPlainTextEdit::textChanged, this, &QKeyBoardInput::handleTextChanged);
 }
 
 void QKeyBoardInput::build()
 {
+    auto *hints = new ShortcutBar(this);
+    hints->addEntry(DEVICE_RED_KEY, I18n::shortCut(5));
+    hints->addEntry(DEVICE_PAGEUP_KEY, I18n::shortCut(0));
+    hints->addEntry(DEVICE_PAGEDOWN_KEY, I18n::shortCut(1));
+    hints->addEntry(DEVICE_RETURN_KEY, I18n::shortCut(2));
     auto *rows = new QVBoxLayout(this);
-    rows->setContentsMargins(kMargin, kMargin, kMargin, kMargin);
-    rows->setSpacing(kMargin);
+    rows->setContentsMargins(kMargin, kMargin, kMargin, kMargin / 2);
+    rows->setSpacing(kMargin * 2 / 3);
     rows->addWidget(mBox);
-    auto *row = new QHBoxLayout;
-    row->setSpacing(kMargin);
-    row->addWidget(mKeyBoard);
-    row->addLayout(makeSide());
-    rows->addLayout(row);
-}
-
-QLayout *QKeyBoardInput::makeSide()
-{
-    auto *pages = new KeyboardPages(this);
-    pages->setPage(mKeyBoard->page());
-    connect(mKeyBoard, &QKeyBoard::pageChanged, pages, &KeyboardPages::setPage);
-    auto *turning = new ShortcutBar(this);
-    turning->addEntry(DEVICE_PAGEUP_KEY, I18n::shortCut(0));
-    turning->addEntry(DEVICE_PAGEDOWN_KEY, I18n::shortCut(1));
-    auto *others = new ShortcutBar(this);
-    others->addEntry(DEVICE_RED_KEY, I18n::shortCut(5));
-    others->addEntry(DEVICE_RETURN_KEY, I18n::shortCut(2));
-    auto *side = new QVBoxLayout;
-    side->setSpacing(kMargin / 2);
-    side->addWidget(pages, 0, Qt::AlignLeft);
-    side->addStretch();
-    side->addWidget(turning, 0, Qt::AlignLeft);
-    side->addWidget(others, 0, Qt::AlignLeft);
-    return side;
+    rows->addWidget(mKeyBoard, 0, Qt::AlignHCenter);
+    rows->addWidget(hints, 0, Qt::AlignHCenter);
 }
 
 void QKeyBoardInput::setText(const QString &text)
 {
-    const int end = mRealText.replace(0, mRealText.text().size(), allowed(text, kLongestText));
+    edit({0, mRealText.text().size()}, text);
     mRealText.hideLast();
-    display(end);
+    display(mCursor);
 }
 
 void QKeyBoardInput::setInputMode(bool isPassword)
@@ -125,22 +101,28 @@ void QKeyBoardInput::setInputMode(bool isPassword)
 
 void QKeyBoardInput::setMultiLine(bool multiLine)
 {
+    const int height = SystemConfig::mScreen_Height;
+    setFixedHeight(multiLine ? height * 4 / 5 : height * 5 / 7);
     mMultiLine = multiLine;
     mKeyBoard->setNewLineEnabled(multiLine);
 }
 
 // Whatever else changes the box's text (pasting, dropping) changes the real text in the same place.
+void QKeyBoardInput::takeOver(int place, int removed, int added)
+{
+    if (mIsDisplaying)
+        return;
+    // Counts may include the last paragraph's end, which is no character.
+    const QString text = mBox->toPlainText().mid(place, added);
+    if (text == mRealText.shown().mid(place, removed))
+        return;
+    edit({mRealText.placeInText(place), mRealText.placeInText(place + removed)}, text);
+}
+
 void QKeyBoardInput::handleTextChanged()
 {
-    if (mIsDisplaying || (mChange.removed == 0 && mChange.added == 0))
-        return;
-    const QString shown = mBox->toPlainText();
-    // Counts that reach to the end include the last paragraph's own, which is no character.
-    const Range range{mRealText.placeInText(mChange.place),
-                      mRealText.placeInText(mChange.place + mChange.removed)};
-    const QString added = shown.mid(mChange.place, mChange.added);
-    mChange = {0, 0, 0};
-    replace(range, added);
+    if (!mIsDisplaying)
+        display(mCursor);
 }
 
 bool QKeyBoardInput::eventFilter(QObject *watched, QEvent *event)
@@ -256,9 +238,14 @@ void QKeyBoardInput::moveCursor(int step)
 
 void QKeyBoardInput::replace(Range range, const QString &text)
 {
+    edit(range, text);
+    display(mCursor);
+}
+
+void QKeyBoardInput::edit(Range range, const QString &text)
+{
     const int room = kLongestText - mRealText.text().size() + (range.end - range.start);
-    const int cursor = mRealText.replace(range.start, range.end, allowed(text, room));
-    display(cursor);
+    mCursor = mRealText.replace(range.start, range.end, allowed(text, room));
     if (mRealText.isMasked())
         mHideTimer.start(kLastShownFor, this);
 }
@@ -277,12 +264,12 @@ void QKeyBoardInput::display(int cursor)
            before.at(before.size() - 1 - tail) == after.at(after.size() - 1 - tail))
         ++tail;
     mIsDisplaying = true;
-    QTextCursor edit(mBox->document());
-    edit.setPosition(head);
-    edit.setPosition(before.size() - tail, QTextCursor::KeepAnchor);
-    edit.insertText(after.mid(head, after.size() - tail - head));
-    edit.setPosition(mRealText.placeShown(cursor));
-    mBox->setTextCursor(edit);
+    QTextCursor place(mBox->document());
+    place.setPosition(head);
+    place.setPosition(before.size() - tail, QTextCursor::KeepAnchor);
+    place.insertText(after.mid(head, after.size() - tail - head));
+    place.setPosition(mRealText.placeShown(cursor));
+    mBox->setTextCursor(place);
     mIsDisplaying = false;
     mBox->ensureCursorVisible();
 }

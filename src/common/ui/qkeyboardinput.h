@@ -6,7 +6,6 @@
 #include <QWidget>
 
 class QKeyBoard;
-class QLayout;
 class QPlainTextEdit;
 
 // A text box above the on-screen keyboard. The box holds the cursor and the keyboard's focus: the
@@ -48,17 +47,8 @@ private:
         int start;
         int end;
     };
-    // What somebody else did to the box's text.
-    struct Change
-    {
-        int place;
-        int removed;
-        int added;
-    };
-
     void buildBox();
     void build();
-    QLayout *makeSide();
     bool handleKey(QKeyEvent *event);
     bool handleTyping(QKeyEvent *event);
     void handleFunction(int key);
@@ -68,13 +58,15 @@ private:
     void erase(int step);
     void moveCursor(int step);
     void replace(Range range, const QString &text);
+    void edit(Range range, const QString &text);
+    void takeOver(int place, int removed, int added);
     void display(int cursor);
     QString allowed(const QString &text, int room) const;
 
     QPlainTextEdit *mBox;
     QKeyBoard *mKeyBoard;
     MaskedText mRealText;
-    Change mChange{0, 0, 0};
+    int mCursor = 0;            // behind what was edited last, in the real text
     bool mIsDisplaying = false; // the box changes because the real text did
     bool mMultiLine = true;
     QBasicTimer mHideTimer;

@@ -59,6 +59,7 @@ QString titleOf(int kind)
 QPopUpForm::QPopUpForm(QWidget *parent)
     : PopupOverlay(parent)
 {
+    qRegisterMetaType<int32_t>("int32_t"); // as the signals name it
 }
 
 void QPopUpForm::initForm(int kind, const QString &text, int confirmType)
