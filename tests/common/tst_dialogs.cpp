@@ -224,6 +224,7 @@ private slots:
         QConfirm question(&screen);
         question.init(QConfirm::SignOut);
         question.show();
+        pressKey(&question, Qt::Key_Tab);
         QCOMPARE(QApplication::focusWidget(), &question);
         screen.setFixedSize(1000, 500);
         QTRY_COMPARE(question.size(), QSize(1000, 500));
