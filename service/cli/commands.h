@@ -19,5 +19,3 @@ int runUserRemove(const std::string &data, const std::string &mail);
 int runUserToken(const std::string &data, const std::string &mail);
 int runImport(const std::string &data, const std::string &file);
 int runUnreadable(const std::string &data);
-// The absolute form of a folder, as the index keeps it: without a slash at its end.
-std::string absoluteFolder(const std::string &folder);
