@@ -154,43 +154,29 @@ private slots:
         QVERIFY(database.getPwdByUser("anna").isNull());
     }
 
-    void brokenFiles_data()
-    {
-        QTest::addColumn<QByteArray>("content");
-        QTest::newRow("no table") << QByteArray();
-        QTest::newRow("no database") << QByteArray(5000, 'x');
-        QTest::newRow("cut header") << QByteArray("SQLite format 3\0\x10", 17);
-    }
-
     void brokenFiles()
     {
-        QFETCH(QByteArray, content);
-        mFile->write("", content);
-        LogCapture log;
-        DataBase database;
-        QVERIFY(!database.insertAccount(kAnna));
-        QVERIFY(log.anyStartsWith("mQuery.exec error"));
-        QVERIFY(!database.updateLatestUser("a") && !database.updateToken("a", "b", "c") &&
-                !database.removeAccount("a"));
-        QVERIFY(database.getAccounts(true).isEmpty() && database.getUserInfo("a").isEmpty());
-        QVERIFY(database.getLoginUser().isNull() && database.getPwdByUser("a").isNull());
-        QFile file(mFile->path());
-        QVERIFY(file.open(QIODevice::ReadOnly));
-        QCOMPARE(file.readAll(), content);
-    }
-
-    void unwritableFileKeepsItsAccounts_data()
-    {
-        QTest::addColumn<QString>("reason");
-        for (const char *reason : {"read-only", "locked", "full disk"})
-            QTest::newRow(reason) << reason;
+        const QByteArrayList contents = {"", QByteArray(5000, 'x'), "SQLite format 3"};
+        for (const QByteArray &content : contents) {
+            mFile->write("", content);
+            LogCapture log;
+            DataBase database;
+            QVERIFY(!database.insertAccount(kAnna));
+            QVERIFY(log.anyStartsWith("mQuery.exec error"));
+            QVERIFY(!database.updateLatestUser("a") && !database.updateToken("a", "b", "c") &&
+                    !database.removeAccount("a"));
+            QVERIFY(database.getAccounts(true).isEmpty() && database.getUserInfo("a").isEmpty());
+            QVERIFY(database.getLoginUser().isNull() && database.getPwdByUser("a").isNull());
+            QFile file(mFile->path());
+            QVERIFY(file.open(QIODevice::ReadOnly));
+            QCOMPARE(file.readAll(), content);
+        }
     }
 
     void unwritableFileKeepsItsAccounts()
     {
-        QFETCH(QString, reason);
         QVERIFY(DataBase().insertAccount(kAnna));
-        {
+        for (const QString reason : {"read-only", "locked", "full disk"}) {
             const auto readOnly =
                 reason == "read-only" ? std::make_unique<ReadOnly>(*mFile) : nullptr;
             const auto full = reason == "full disk" ? std::make_unique<FullDisk>(100) : nullptr;

@@ -28,7 +28,7 @@ public:
         for (int round = 0; round < rounds; ++round) {
             if (round % 3 == 0)
                 startAfresh();
-            writeUntilKilled(round % 6 == 0 ? 0 : upTo(20) + 1);
+            writeUntilKilled(round % 6 == 0 ? 0 : upTo(8) + 1);
             check();
         }
     }
