@@ -1,6 +1,7 @@
 // Saves the home screen's states as pictures, to be looked at: gallery FOLDER. The size is that of
 // the layout, 1280 x 720, times QT_SCALE_FACTOR.
 
+#include "accountmanager/accountmanagerhelper.h"
 #include "common/ui/remotekeys.h"
 #include "data/photomanager.h"
 #include "network/systemconfig.h"
@@ -146,6 +147,7 @@ int main(int argc, char **argv)
     configure(folder.filePath("config.ini"), server.url(QString()));
     serveLists(server);
     PhotoManager::init();
+    AccountManagerHelper::setUserName("Maria Sundqvist");
 
     Widget page;
     page.resize(1280, 720);

@@ -88,7 +88,8 @@ FailurePage::FailurePage(QWidget *parent)
 {
     QVBoxLayout *column = makeColumn(this);
     auto *picture = new QLabel(this);
-    picture->setPixmap(loadPicture(QStringLiteral(":/res/icon_offline.png"), QSize(72, 72)));
+    // Much larger than it is drawn for: from its largest file.
+    picture->setPixmap(loadPicture(QStringLiteral(":/res/icon_offline@3x.png"), QSize(72, 72)));
     column->addWidget(picture, 0, Qt::AlignCenter);
     mReason = addLine(column, QString(), 28, QStringLiteral("#e6edf2"));
     addLine(column, ScreenTexts::failure(ScreenTexts::HowToGoOn), 22, QStringLiteral("#a2bbc9"));

@@ -16,6 +16,7 @@ HomeBars::HomeBars(QWidget *parent)
     auto *row = new QHBoxLayout(this);
     row->setContentsMargins(10, 0, 10, 0);
     row->setSpacing(24);
+    setFixedHeight(32);
     row->addWidget(mInformation, 1);
     row->addWidget(mShortcuts);
     mShortcuts->addEntry(DEVICE_SELECT_KEY, ScreenTexts::hint(ScreenTexts::OpenHint));

@@ -80,7 +80,8 @@ HomeWidget::HomeWidget(QWidget *parent)
     auto *column = new QVBoxLayout(this);
     column->setContentsMargins(SystemConfig::borderLeft(), SystemConfig::borderTop(),
                                SystemConfig::borderRight(), SystemConfig::borderBottom());
-    column->setSpacing(6);
+    column->setSpacing(4);
+    column->setSizeConstraint(QLayout::SetNoConstraint); // the screen's size is given
     column->addWidget(mTitleWidget);
     column->addWidget(mFrame, 1);
     column->addWidget(mBars);
@@ -280,6 +281,7 @@ void HomeWidget::focusContent()
         mCommentArea->initFocus();
     else if (mPages->currentWidget() != mNoPhotoPage)
         mPages->currentWidget()->setFocus();
+    mTitleWidget->updateFocusMark();
 }
 
 void HomeWidget::handleUpWidgetEnter(PackageProperty &property)

@@ -40,7 +40,7 @@ QString InformationLine::text() const
 
 QSize InformationLine::sizeHint() const
 {
-    return {200, fontMetrics().height() + 8};
+    return {200, fontMetrics().height()};
 }
 
 void InformationLine::paintEvent(QPaintEvent *)

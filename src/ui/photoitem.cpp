@@ -12,6 +12,7 @@ namespace {
 
 constexpr int kLongestCaption = 10000; // characters that are laid out at most
 constexpr int kBorder = 2;
+constexpr int kSpaceBelow = 6; // between the caption and the edge of the focus bar
 
 const char *const kUnfocusedStyle =
     "QFrame{border-style: solid; border-width: 2px; border-color: transparent}QLabel{border-width: "
@@ -44,7 +45,7 @@ PhotoItem::PhotoItem(QWidget *parent)
     column->setContentsMargins(0, 0, 0, 0);
     column->setSpacing(0);
     column->addWidget(mArea);
-    column->addWidget(mCaption, 0, Qt::AlignCenter);
+    column->addWidget(mCaption, 1, Qt::AlignHCenter | Qt::AlignTop);
 
     auto *row = new QHBoxLayout(mArea);
     row->setContentsMargins(0, 0, 0, 0);
@@ -82,6 +83,7 @@ void PhotoItem::setHeights(int picture, int caption, const QSize &cell)
 {
     mPicture->setFixedHeight(picture);
     mCaption->setFixedHeight(caption);
+    mArea->setFixedHeight(cell.height() - caption - kSpaceBelow);
     setFixedSize(cell);
 }
 

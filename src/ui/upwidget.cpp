@@ -14,6 +14,7 @@
 namespace {
 
 constexpr int kLongestName = 10000; // characters that are laid out at most
+constexpr QSize kLogo(192, 52);     // leaves room for the widest name between usual borders
 
 void addSpacer(QHBoxLayout *row)
 {
@@ -37,7 +38,7 @@ UpWidget::UpWidget(QWidget *parent)
     QHBoxLayout *row = makeRow();
     setLayout(row);
     auto *logo = new QLabel(this);
-    logo->setPixmap(loadPicture(QStringLiteral(":/res/orvala_icon_big.png")));
+    logo->setPixmap(loadPicture(QStringLiteral(":/res/orvala_icon_big.png"), kLogo));
     row->addWidget(logo);
     addSpacer(row);
 
@@ -126,6 +127,12 @@ void UpWidget::takeSelectionBack()
 {
     mPreviousFocus = mFocus;
     mFocus = mSelected = mPreviousSelected;
+    restyle();
+}
+
+void UpWidget::updateFocusMark()
+{
+    mHasFocus = hasFocus();
     restyle();
 }
 

@@ -10,6 +10,7 @@ Widget::Widget(QWidget *parent)
     , mPages(new QStackedLayout(this))
 {
     mPages->setContentsMargins(0, 0, 0, 0);
+    mPages->setSizeConstraint(QLayout::SetNoConstraint); // the screen's size is given
     mPages->addWidget(mHomeWidget);
     setFocusProxy(mHomeWidget);
 }
