@@ -106,7 +106,7 @@ void HomeWidget::buildPages(QWidget *frame)
     auto *content = new FormScrollWidget(mCommentArea);
     mCommentArea->setWidget(content);
     content->setColumn(SystemConfig::scrollAreaMaxColumn());
-    mCells = std::make_unique<CellFiller>(content);
+    mCells = std::make_unique<CellFiller>(content, this);
 
     mLoadingPage = new LoadingPage(frame);
     mNoPhotoPage = new NoPhotoAvailableWidget(frame);
