@@ -535,12 +535,9 @@ void HomeWidget::paintEvent(QPaintEvent *event)
     const QSize pixels = (QSizeF(size()) * devicePixelRatioF()).toSize();
     if (mBackdrop.size() != pixels || mBackdropFrame != mFrame->geometry())
         renderBackdrop(pixels);
-    const QRect area = event->rect();
-    const qreal ratio = devicePixelRatioF();
     QPainter painter(this);
-    painter.drawPixmap(
-        area.topLeft(), mBackdrop,
-        QRectF(QPointF(area.topLeft()) * ratio, QSizeF(area.size()) * ratio).toRect());
+    for (const QRect &area : event->region())
+        copyPixels(painter, mBackdrop, area);
 }
 
 void HomeWidget::renderBackdrop(const QSize &pixels)

@@ -5,6 +5,7 @@
 #include "network/systemconfig.h"
 #include "ui/stretchedpicture.h"
 
+#include <QPaintEvent>
 #include <QPainter>
 
 namespace {
@@ -184,11 +185,11 @@ void PhotoItem::focusOutEvent(QFocusEvent *event)
     update();
 }
 
-void PhotoItem::paintEvent(QPaintEvent *)
+void PhotoItem::paintEvent(QPaintEvent *event)
 {
     QPainter painter(this);
     if (mBackdrop)
-        painter.drawPixmap(0, 0, face(hasFocus()));
+        copyPixels(painter, face(hasFocus()), event->rect());
     else
         paintFace(painter, hasFocus());
 }

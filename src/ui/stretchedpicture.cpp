@@ -53,3 +53,17 @@ QPixmap fittedPicture(const QString &resource, const QSize &size)
     QPixmapCache::insert(key, fitted);
     return fitted;
 }
+
+void copyPixels(QPainter &painter, const QPixmap &picture, const QRect &area)
+{
+    const qreal ratio = picture.devicePixelRatio();
+    QPixmap pixels = picture;
+    pixels.setDevicePixelRatio(1);
+    painter.save();
+    painter.scale(1 / ratio, 1 / ratio);
+    const QRect part = QRectF(QPointF(area.topLeft()) * ratio, QSizeF(area.size()) * ratio)
+                           .toAlignedRect()
+                           .intersected(pixels.rect());
+    painter.drawPixmap(part.topLeft(), pixels, part);
+    painter.restore();
+}
