@@ -1,6 +1,7 @@
 #include "network/connection.h"
 
 #include "base/log.h"
+#include "network/inflater.h"
 #include "network/managerpark.h"
 #include "network/replyerror.h"
 #include "network/systemconfig.h"
@@ -28,6 +29,8 @@ QUrl urlOf(const QString &text)
 QNetworkRequest requestFor(const QUrl &url)
 {
     QNetworkRequest request(url);
+    // What the toolkit would ask for too; asked for here, it leaves the bytes as they come.
+    request.setRawHeader("Accept-Encoding", "gzip, deflate");
     TlsSessions::offer(request);
     return request;
 }
@@ -58,6 +61,25 @@ Connection::Connection()
 {
     mNextHop.setSingleShot(true);
     init();
+}
+
+Connection::~Connection()
+{
+    leavePool();
+    dropReply();
+    if (!mManager)
+        return;
+    disconnect(mManager, nullptr, this, nullptr);
+    ManagerPark::park(mManager);
+}
+
+// Deletion is deferred, silence is not: nothing is reported from here on.
+void Connection::release()
+{
+    mIsRemoved = true;
+    mNextHop.stop();
+    dropReply();
+    deleteLater();
 }
 
 void Connection::init()
@@ -133,6 +155,8 @@ ErrorCode Connection::startGet(const QUrl &url)
 void Connection::adopt(QNetworkReply *reply)
 {
     mReply = reply;
+    mInflater.reset();
+    mBody.clear();
     mTaken = 0;
 }
 
@@ -149,14 +173,20 @@ void Connection::dropReply()
 
 void Connection::handleReadyRead()
 {
-    if (enforceMaximumSize())
+    if (takeArrived())
         returnCallback(CALLBACK_READY_READ, 0);
 }
 
-// False if the answer was too large and has been aborted.
-bool Connection::enforceMaximumSize()
+// False if the answer has become too large and was aborted.
+bool Connection::takeArrived()
 {
-    if (!mReply || mTaken + mReply->bytesAvailable() <= mMaximumSize)
+    if (!mReply)
+        return true;
+    if (!mInflater)
+        mInflater = Inflater::create(mReply->rawHeader("Content-Encoding"));
+    if (mInflater)
+        mInflater->feed(mReply->readAll(), mBody, mMaximumSize);
+    if (mTaken + getAvailable() <= mMaximumSize)
         return true;
     mReply->abort();
     return false;
@@ -216,10 +246,18 @@ void Connection::follow(const QUrl &target)
     if (!target.isEmpty() && isWebAddress(next)) {
         dropReply();
         mNextHop.disconnect();
-        connect(&mNextHop, &QTimer::timeout, this, [this, next] { startGet(next); });
+        connect(&mNextHop, &QTimer::timeout, this, [this, next] {
+            if (startGet(next) != NET_SUCCESS)
+                failRedirect();
+        });
         mNextHop.start(mHops++ < promptHops ? 0 : lateHopMilliseconds);
         return;
     }
+    failRedirect();
+}
+
+void Connection::failRedirect()
+{
     const QPointer<Connection> self(this);
     fail(QNetworkReply::ProtocolInvalidOperationError, QStringLiteral("Redirect to nowhere"));
     if (self && !mIsRemoved)
@@ -275,7 +313,7 @@ ErrorCode Connection::wait(QNetworkReply *reply)
     dropReply();
     adopt(reply);
     if (reply)
-        connect(reply, &QNetworkReply::readyRead, this, &Connection::enforceMaximumSize);
+        connect(reply, &QNetworkReply::readyRead, this, &Connection::takeArrived);
     return syncRequest();
 }
 
@@ -313,7 +351,9 @@ ErrorCode Connection::syncRequest()
 
 qint64 Connection::getAvailable() const
 {
-    return mReply ? mReply->bytesAvailable() : -1;
+    if (!mReply)
+        return -1;
+    return mInflater ? mBody.size() - mTaken : mReply->bytesAvailable();
 }
 
 qint64 Connection::readData(char *buffer, qint64 length)
@@ -323,7 +363,11 @@ qint64 Connection::readData(char *buffer, qint64 length)
     if (available <= 0 || !buffer || length < 0)
         return -1;
     const qint64 wanted = qMin(available, length);
-    const qint64 count = mReply->read(buffer, wanted);
+    qint64 count = wanted;
+    if (mInflater)
+        std::copy_n(mBody.constData() + mTaken, wanted, buffer);
+    else
+        count = mReply->read(buffer, wanted);
     mTaken += qMax(Q_INT64_C(0), count);
     if (length >= available)
         logLine("read data from buffer to byteArray, lenght=", count);

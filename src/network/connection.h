@@ -13,6 +13,9 @@
 #include <QTimer>
 #include <QUrl>
 
+#include <memory>
+
+class Inflater;
 class QNetworkAccessManager;
 
 // One HTTP(S) request object. An asynchronous GET reports to a plain function, keyed by the URL
@@ -100,13 +103,15 @@ public slots:
 private:
     Connection();
 
+    void leavePool();
     void release();
     ErrorCode startGet(const QUrl &url);
     ErrorCode wait(QNetworkReply *reply);
     void adopt(QNetworkReply *reply);
     void dropReply();
-    bool enforceMaximumSize();
+    bool takeArrived();
     void follow(const QUrl &target);
+    void failRedirect();
     void fail(QNetworkReply::NetworkError code, const QString &text);
 
     QPointer<QNetworkAccessManager> mManager;
@@ -119,8 +124,10 @@ private:
     int mTimeout = 40000;
     Callback mCallback = nullptr;
     qint64 mMaximumSize = 32 * 1024 * 1024;
-    qint64 mTaken = 0; // bytes of the current reply that the owner has read
-    int mHops = 0;     // redirects of the current request
+    std::unique_ptr<Inflater> mInflater; // of a compressed reply
+    QByteArray mBody;                    // of a compressed reply, as far as it has come
+    qint64 mTaken = 0;                   // bytes of the current reply that the owner has read
+    int mHops = 0;                       // redirects of the current request
     QTimer mNextHop;
     bool mIsRemoved = false;
 };

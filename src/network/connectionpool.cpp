@@ -66,6 +66,11 @@ Connection *Connection::findConnection(const QString &url)
     return nullptr;
 }
 
+void Connection::leavePool()
+{
+    pool().removeOne(this);
+}
+
 bool Connection::removeConnection(Connection *connection)
 {
     if (!pool().removeOne(connection))
@@ -90,23 +95,4 @@ void Connection::clearConnections()
 void Connection::closeIdleSockets()
 {
     ManagerPark::clear();
-}
-
-Connection::~Connection()
-{
-    pool().removeOne(this);
-    dropReply();
-    if (!mManager)
-        return;
-    disconnect(mManager, nullptr, this, nullptr);
-    ManagerPark::park(mManager);
-}
-
-// Deletion is deferred, silence is not: nothing is reported from here on.
-void Connection::release()
-{
-    mIsRemoved = true;
-    mNextHop.stop();
-    dropReply();
-    deleteLater();
 }

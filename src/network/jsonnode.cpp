@@ -1,5 +1,7 @@
 #include "network/jsonnode.h"
 
+#include <cmath>
+
 namespace {
 
 class Reader
@@ -158,8 +160,9 @@ bool Reader::number(QVariant &out)
         if (!digits())
             return false;
     }
-    // Infinity or zero when the number is out of range.
-    out = QString(start, int(mAt - start)).toLatin1().toDouble();
+    // Infinity or zero when the number is out of range; the conversion forgets the sign of zero.
+    const double result = QString(start, int(mAt - start)).toLatin1().toDouble();
+    out = *start == QLatin1Char('-') ? -std::fabs(result) : result;
     return true;
 }
 

@@ -1,0 +1,115 @@
+#include "common/ui/dialogpanel.h"
+
+#include "common/ui/frames.h"
+#include "common/ui/textfit.h"
+#include "network/systemconfig.h"
+
+#include <QHBoxLayout>
+#include <QLabel>
+#include <QPushButton>
+
+namespace {
+
+constexpr QSize kButtonSize(120, 40);
+constexpr int kButtonGap = 32;
+constexpr int kMargin = 32;
+constexpr int kBorder = 6; // of a button's picture
+
+int panelWidth()
+{
+    return SystemConfig::mScreen_Width * 3 / 5;
+}
+
+QSize messageBox()
+{
+    return {panelWidth() - 2 * kMargin, SystemConfig::mScreen_Height * 2 / 5};
+}
+
+QLabel *makeLabel(QWidget *parent, int points)
+{
+    auto *label = new QLabel(parent);
+    label->setTextFormat(Qt::PlainText);
+    label->setAlignment(Qt::AlignCenter);
+    QFont font = label->font();
+    font.setPointSize(points);
+    label->setFont(font);
+    return label;
+}
+
+QLabel *makeTitle(QWidget *parent)
+{
+    QLabel *title = makeLabel(parent, SystemConfig::menuFont());
+    title->setStyleSheet(QStringLiteral("QLabel {border-image: url(%1); color: white;}")
+                             .arg(QStringLiteral(":/res/PopUpMenu_Title_Bg.png")));
+    title->setFixedHeight(qMax(52, title->fontMetrics().height() * 2));
+    return title;
+}
+
+} // namespace
+
+DialogPanel::DialogPanel(const ButtonStyles &styles, QWidget *parent)
+    : QFrame(parent)
+    , mStyles(styles)
+    , mTitle(makeTitle(this))
+{
+    setFixedWidth(panelWidth());
+    auto *content = new QContentFrame(this);
+    mMessage = makeLabel(content, SystemConfig::messageFont());
+    auto *rows = new QVBoxLayout(content);
+    rows->setContentsMargins(kMargin, kMargin, kMargin, kMargin);
+    rows->setSpacing(kMargin);
+    rows->addWidget(mMessage);
+    mButtonRow = new QHBoxLayout;
+    mButtonRow->setSpacing(kButtonGap);
+    mButtonRow->addStretch();
+    mButtonRow->addStretch();
+    rows->addLayout(mButtonRow);
+
+    auto *panel = new QVBoxLayout(this);
+    panel->setContentsMargins(0, 0, 0, 0);
+    panel->setSpacing(0);
+    panel->addWidget(mTitle);
+    panel->addWidget(content);
+}
+
+void DialogPanel::setTitle(const QString &title)
+{
+    const int height = mTitle->fontMetrics().lineSpacing();
+    mTitle->setText(fitText(title, mTitle->font(), {panelWidth() - 2 * kMargin, height}));
+}
+
+void DialogPanel::setMessage(const QString &message)
+{
+    const int atLeast = 3 * mMessage->fontMetrics().lineSpacing();
+    mMessage->setText(fitText(message, mMessage->font(), messageBox()));
+    mMessage->setFixedHeight(qMax(atLeast, mMessage->sizeHint().height()));
+}
+
+QFont DialogPanel::messageFont() const
+{
+    return mMessage->font();
+}
+
+QPushButton *DialogPanel::addButton(const QString &text)
+{
+    auto *button = new QPushButton(this);
+    QFont font = button->font();
+    font.setPointSize(SystemConfig::buttonFont());
+    button->setFont(font);
+    button->setText(buttonText(text, font, kButtonSize.width() - 2 * kBorder));
+    button->setFixedSize(kButtonSize);
+    button->setFocusPolicy(Qt::NoFocus);
+    button->setStyleSheet(mButtons.isEmpty() ? mStyles.focused : mStyles.normal);
+    mButtonRow->insertWidget(mButtonRow->count() - 1, button);
+    mButtons.append(button);
+    return button;
+}
+
+void DialogPanel::focusButton(int index)
+{
+    if (index < 0 || index >= mButtons.size() || index == mFocusedButton)
+        return;
+    mButtons.at(mFocusedButton)->setStyleSheet(mStyles.normal);
+    mButtons.at(index)->setStyleSheet(mStyles.focused);
+    mFocusedButton = index;
+}

@@ -1,0 +1,118 @@
+#include "common/ui/popupoverlay.h"
+
+#include "network/systemconfig.h"
+
+#include <QApplication>
+#include <QGridLayout>
+#include <QKeyEvent>
+#include <QPainter>
+
+namespace {
+
+const QColor kDim(5, 9, 13, 170);
+
+} // namespace
+
+PopupOverlay::PopupOverlay(QWidget *parent)
+    : QWidget(parent)
+{
+    setFocusPolicy(Qt::StrongFocus);
+    setPalette(popupPalette(palette()));
+    auto *rows = new QGridLayout(this);
+    rows->setContentsMargins(0, 0, 0, 0);
+    if (parent)
+        parent->installEventFilter(this);
+    cover();
+}
+
+PopupOverlay::~PopupOverlay()
+{
+    giveFocusBack();
+}
+
+void PopupOverlay::setPanel(QWidget *panel)
+{
+    if (mPanel) {
+        mPanel->hide();
+        mPanel->deleteLater();
+    }
+    mPanel = panel;
+    static_cast<QGridLayout *>(layout())->addWidget(panel, 0, 0, Qt::AlignCenter);
+}
+
+bool PopupOverlay::eventFilter(QObject *watched, QEvent *event)
+{
+    if (watched == parent() && event->type() == QEvent::Resize)
+        cover();
+    return QWidget::eventFilter(watched, event);
+}
+
+void PopupOverlay::cover()
+{
+    const QWidget *below = parentWidget();
+    if (!below)
+        resize(SystemConfig::mScreen_Width, SystemConfig::mScreen_Height);
+    else if (!below->layout() || below->layout()->indexOf(this) < 0)
+        setGeometry(below->rect());
+}
+
+bool PopupOverlay::isNested() const
+{
+    for (const QWidget *above = parentWidget(); above; above = above->parentWidget()) {
+        if (qobject_cast<const PopupOverlay *>(above))
+            return true;
+    }
+    return false;
+}
+
+void PopupOverlay::showEvent(QShowEvent *event)
+{
+    cover();
+    raise();
+    takeFocus();
+    QWidget::showEvent(event);
+}
+
+void PopupOverlay::hideEvent(QHideEvent *event)
+{
+    giveFocusBack();
+    QWidget::hideEvent(event);
+}
+
+void PopupOverlay::takeFocus()
+{
+    QWidget *before = QApplication::focusWidget();
+    if (focusPolicy() == Qt::NoFocus || (before && isAncestorOf(before)))
+        return;
+    mFocusBefore = before;
+    focusReceiver()->setFocus();
+}
+
+void PopupOverlay::giveFocusBack()
+{
+    QWidget *focus = QApplication::focusWidget();
+    const bool isOurs = focus && (focus == this || isAncestorOf(focus));
+    if (isOurs && mFocusBefore && mFocusBefore->isVisible())
+        mFocusBefore->setFocus();
+    mFocusBefore = nullptr;
+}
+
+void PopupOverlay::paintEvent(QPaintEvent *)
+{
+    if (isNested() || !mPanel)
+        return;
+    QPainter(this).fillRect(rect(), kDim);
+}
+
+void PopupOverlay::keyPressEvent(QKeyEvent *event)
+{
+    event->accept();
+}
+
+QPalette popupPalette(QPalette palette)
+{
+    const QColor text(0xf2, 0xf6, 0xf9);
+    for (QPalette::ColorRole role : {QPalette::WindowText, QPalette::Text, QPalette::ButtonText})
+        palette.setColor(role, text);
+    return palette;
+}
