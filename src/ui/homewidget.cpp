@@ -537,7 +537,7 @@ void HomeWidget::paintEvent(QPaintEvent *event)
         renderBackdrop(pixels);
     QPainter painter(this);
     for (const QRect &area : event->region())
-        copyPixels(painter, mBackdrop, area);
+        copyPixels(painter, mBackdrop, area, devicePixelRatioF());
 }
 
 void HomeWidget::renderBackdrop(const QSize &pixels)
@@ -545,8 +545,8 @@ void HomeWidget::renderBackdrop(const QSize &pixels)
     mBackdropFrame = mFrame->geometry();
     mBackdrop = QPixmap(pixels);
     mBackdrop.fill(Qt::black);
-    mBackdrop.setDevicePixelRatio(devicePixelRatioF());
     QPainter painter(&mBackdrop);
+    painter.scale(devicePixelRatioF(), devicePixelRatioF());
     painter.setRenderHint(QPainter::SmoothPixmapTransform);
     painter.drawPixmap(rect(), QPixmap(QStringLiteral(":/res/orvala_background.png")));
     painter.drawPixmap(mBackdropFrame, QPixmap(QStringLiteral(":/res/Content_Bg.png")));

@@ -189,7 +189,7 @@ void PhotoItem::paintEvent(QPaintEvent *event)
 {
     QPainter painter(this);
     if (mBackdrop)
-        copyPixels(painter, face(hasFocus()), event->rect());
+        copyPixels(painter, face(hasFocus()), event->rect(), devicePixelRatioF());
     else
         paintFace(painter, hasFocus());
 }
@@ -218,6 +218,8 @@ QPixmap PhotoItem::renderFace(bool focused) const
     mBackdrop->render(&painter, QPoint(0, 0), QRect(mFacesGround.topLeft(), size()),
                       QWidget::RenderFlags());
     paintFace(painter, focused);
+    painter.end();
+    face.setDevicePixelRatio(1);
     return face;
 }
 

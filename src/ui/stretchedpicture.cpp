@@ -54,16 +54,13 @@ QPixmap fittedPicture(const QString &resource, const QSize &size)
     return fitted;
 }
 
-void copyPixels(QPainter &painter, const QPixmap &picture, const QRect &area)
+void copyPixels(QPainter &painter, const QPixmap &pixels, const QRect &area, qreal ratio)
 {
-    const qreal ratio = picture.devicePixelRatio();
-    QPixmap pixels = picture;
-    pixels.setDevicePixelRatio(1);
-    painter.save();
-    painter.scale(1 / ratio, 1 / ratio);
     const QRect part = QRectF(QPointF(area.topLeft()) * ratio, QSizeF(area.size()) * ratio)
                            .toAlignedRect()
                            .intersected(pixels.rect());
+    painter.save();
+    painter.scale(1 / ratio, 1 / ratio);
     painter.drawPixmap(part.topLeft(), pixels, part);
     painter.restore();
 }

@@ -19,7 +19,7 @@ QPixmap stretchedPicture(const QString &resource, const QSize &size, int margin,
 // The picture as large as fits the size (in device pixels), with its proportions.
 QPixmap fittedPicture(const QString &resource, const QSize &size);
 
-// Copies part of a picture made for the screen's pixels (area in layout pixels, of a painter that
-// starts at the picture's corner). Qt itself would scale such a picture, be it by 1, pixel by
-// pixel.
-void copyPixels(QPainter &painter, const QPixmap &picture, const QRect &area);
+// Copies part of a picture that holds the screen's own pixels (with a device pixel ratio of 1): the
+// area is in layout pixels, the painter starts at the picture's corner, the ratio is the screen's.
+// Left to itself, Qt scales such a picture pixel by pixel, be it by 1.
+void copyPixels(QPainter &painter, const QPixmap &pixels, const QRect &area, qreal ratio);
