@@ -21,8 +21,8 @@ struct HomeState
     int mIndexInPage = 0;             // of the record jumped to
     bool mIsPageDown = false;
     bool mIsReturnFromDetail = false;
-    bool mCanPlay = false; // a list has been shown
-    int mInitIndex = -1;   // grid index to focus after a page change; -1: as it is
+    bool mCanPlay = false;      // a list has been shown
+    int mInitIndex = -1;        // grid index to focus after a page change; -1: as it is
     PackageProperty mAlbumList; // in which the album opened last stood, and the page of it
     int mSelectedAlbumIndex = 0;
     int mSelectedPersonIndex = 0;
