@@ -2,11 +2,10 @@
 #include "common/ui/qprogressindicator.h"
 #include "common/ui/remotekeys.h"
 #include "common/ui/shortcutbar.h"
-#include "ui/screentexts.h"
 
 #include <QtTest>
 
-// The small widgets around the screens, and their texts.
+// The small widgets around the screens.
 class TestHints : public QObject
 {
     Q_OBJECT
@@ -15,7 +14,6 @@ private slots:
     void theIndicatorTicksOnlyWhenSeen();
     void theIndicatorTurns();
     void hintsFollowTheState();
-    void textsOutsideTheTables();
 };
 
 void TestHints::theIndicatorTicksOnlyWhenSeen()
@@ -67,13 +65,6 @@ void TestHints::hintsFollowTheState()
     QVERIFY(bar.isShown(DEVICE_PAGEUP_KEY));
     bar.setText(DEVICE_PAGEUP_KEY, "Back");
     QCOMPARE(bar.text(DEVICE_PAGEUP_KEY), QString("Back"));
-}
-
-void TestHints::textsOutsideTheTables()
-{
-    QVERIFY(!ScreenTexts::failure(ScreenTexts::HowToGoOn).isEmpty());
-    QCOMPARE(ScreenTexts::failure(ScreenTexts::HowToGoOn + 1), QString("Unknown"));
-    QCOMPARE(ScreenTexts::text(99, 0), QString("Unkown"));
 }
 
 QTEST_MAIN(TestHints)

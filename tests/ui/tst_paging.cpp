@@ -1,5 +1,4 @@
 #include "data/packageproperty.h"
-#include "ui/homestate.h"
 #include "ui/paging.h"
 
 #include <QtTest>
@@ -16,7 +15,6 @@ private slots:
     void aCellsRecord_data();
     void aCellsRecord();
     void blocksOfResults();
-    void theWayThereAndBack();
 };
 
 void TestPaging::aPageBackOrOn_data()
@@ -79,37 +77,6 @@ void TestPaging::blocksOfResults()
     QCOMPARE(paging::neighbourBlock(2, false, 300), 1);
     QCOMPARE(paging::neighbourBlock(0, false, 300), 0);
     QCOMPARE(paging::blockStart(2), 201);
-}
-
-// People, albums of one, photos of an album, and back to where the focus was.
-void TestPaging::theWayThereAndBack()
-{
-    HomeState state;
-    PackageProperty people;
-    people.mType = TYPE_FAVORITE_PEOPLE;
-    people.mUserId = "default";
-    QVERIFY(state.enterMenu(people));
-    QCOMPARE(state.back(), HomeState::Back::SignOut);
-
-    state.mCurrentProperty.mStartIndex = 9;
-    state.openPerson(3, FavoritePeople());
-    QCOMPARE(state.mCurrentProperty.mType, int(TYPE_ALBUM_LIST));
-    QCOMPARE(state.mCurrentProperty.mStartIndex, 1);
-    QCOMPARE(state.back(), HomeState::Back::People);
-    state.openAlbum(5, Album());
-    QCOMPARE(state.back(), HomeState::Back::Albums);
-
-    state.backToAlbums();
-    QCOMPARE(state.mCurrentProperty.mType, int(TYPE_ALBUM_LIST));
-    QCOMPARE(state.mInitIndex, 5);
-    state.backToPeople();
-    QCOMPARE(state.mCurrentProperty, people);
-    QCOMPARE(state.mInitIndex, 3);
-    Package list;
-    for (int i = 0; i < 12; ++i)
-        list.mDataList << new FavoritePeople;
-    state.packageArrived(list);
-    QCOMPARE(state.mCurrentProperty.mStartIndex, 9);
 }
 
 QTEST_APPLESS_MAIN(TestPaging)

@@ -20,7 +20,6 @@ private slots:
     void entriesAreStyled();
     void theMarkReturnsToTheSelection();
     void signingOutCanBeCancelled();
-    void redReturnsToHome();
     void someKeysArePassedOn();
     void longNamesAreCut();
 
@@ -138,16 +137,6 @@ void TestUpWidget::signingOutCanBeCancelled()
     QVERIFY(looks(4, Look::Normal));
     mBar->cancelSignOut();
     QCOMPARE(mBar->selectedIndex(), 1);
-}
-
-void TestUpWidget::redReturnsToHome()
-{
-    press(DEVICE_RIGHT_KEY);
-    press(DEVICE_SELECT_KEY);
-    mBar->returnToHome();
-    QCOMPARE(mAsked.last().mType, int(TYPE_FEATURED_PHOTOS));
-    QVERIFY(looks(0, Look::FocusedSelected));
-    QVERIFY(looks(1, Look::Normal));
 }
 
 void TestUpWidget::someKeysArePassedOn()
