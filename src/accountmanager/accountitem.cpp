@@ -8,8 +8,7 @@
 
 namespace {
 
-constexpr int kHeight = 76;
-constexpr int kDisc = 52;
+constexpr int kDisc = 46;
 constexpr int kPadding = 14;
 constexpr int kNameHeight = 24; // pixels of the font
 constexpr int kMailHeight = 20;
@@ -27,7 +26,7 @@ void drawLine(QPainter *painter, const QRect &line, const QFont &font, Qt::TextE
 {
     const QString shown = QFontMetrics(font).elidedText(text, mode, line.width());
     painter->setFont(font);
-    painter->drawText(line, Qt::AlignLeft | Qt::AlignVCenter | Qt::TextSingleLine, shown);
+    painter->drawText(line, Qt::AlignLeft | Qt::AlignVCenter | Qt::TextDontClip, shown);
 }
 
 } // namespace
@@ -38,13 +37,13 @@ AccountItem::AccountItem(const QString &mail, const QString &name, QWidget *pare
     , mName(name)
 {
     setFocusPolicy(Qt::StrongFocus);
-    setFixedHeight(kHeight);
+    setFixedHeight(rowHeight);
     setAccessibleName(mail);
 }
 
 QSize AccountItem::sizeHint() const
 {
-    return {400, kHeight};
+    return {400, rowHeight};
 }
 
 QString AccountItem::initialOf(const QString &text)
@@ -91,17 +90,17 @@ void AccountItem::paintDisc(QPainter *painter) const
 void AccountItem::paintTexts(QPainter *painter) const
 {
     const int left = 2 * kPadding + kDisc;
-    const QRect texts(left, 8, width() - left - kPadding, height() - 16);
+    const QRect row(left, 0, width() - left - kPadding, height());
     const QString mail = mMail.left(kLongest);
-    painter->setPen(QColor(0xff, 0xff, 0xff));
+    painter->setPen(Qt::white);
     if (mName.trimmed().isEmpty()) {
-        drawLine(painter, texts, fontOf(this, kNameHeight), Qt::ElideMiddle, mail);
+        drawLine(painter, row, fontOf(this, kNameHeight), Qt::ElideMiddle, mail);
         return;
     }
-    const QRect upper(texts.left(), texts.top(), texts.width(), texts.height() / 2);
-    drawLine(painter, upper, fontOf(this, kNameHeight), Qt::ElideRight, mName.left(kLongest));
+    drawLine(painter, row.adjusted(0, 11, 0, -height() / 2 + 2), fontOf(this, kNameHeight),
+             Qt::ElideRight, mName.left(kLongest));
     painter->setPen(QColor(0xd5, 0xdf, 0xe6));
-    drawLine(painter, upper.translated(0, upper.height()), fontOf(this, kMailHeight),
+    drawLine(painter, row.adjusted(0, height() / 2 + 2, 0, -7), fontOf(this, kMailHeight),
              Qt::ElideMiddle, mail);
 }
 

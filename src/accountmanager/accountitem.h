@@ -12,6 +12,8 @@ class AccountItem : public QWidget
     Q_OBJECT
 
 public:
+    static constexpr int rowHeight = 66; // pixels
+
     AccountItem(const QString &mail, const QString &name, QWidget *parent = nullptr);
 
     QString mail() const { return mMail; }

@@ -19,7 +19,7 @@
 namespace {
 
 constexpr int kSideSpace = 180;
-constexpr int kLogoSize = 48;
+constexpr int kLogoHeight = 46;
 
 } // namespace
 
@@ -40,7 +40,7 @@ AccountManager::AccountManager(QWidget *parent)
                                SystemConfig::borderRight(), SystemConfig::borderBottom());
     column->addWidget(makeTitle(), 1);
     column->addLayout(middle, 8);
-    column->addWidget(mShortcutBar, 2);
+    column->addWidget(mShortcutBar, 2, Qt::AlignBottom);
 
     connect(mLoginPage, &LoginPage::oauthStarted, this, &AccountManager::startAuthorize);
     connect(mLoginPage, &LoginPage::loginSucessed, this, &AccountManager::startLoading);
@@ -58,9 +58,11 @@ QWidget *AccountManager::makeTitle()
 {
     auto *title = new QWidget(this);
     auto *logo = new QLabel(title);
-    logo->setPixmap(QPixmap(QStringLiteral(":/res/orvala_icon_big.png")));
+    const QPixmap picture(QStringLiteral(":/res/orvala_icon_big.png"));
+    logo->setPixmap(picture);
     logo->setScaledContents(true);
-    logo->setFixedSize(kLogoSize, kLogoSize);
+    logo->setFixedSize(
+        picture.size().scaled(QSize(kLogoHeight * 4, kLogoHeight), Qt::KeepAspectRatio));
     auto *text = new QLabel(title);
     text->setTextFormat(Qt::PlainText);
     text->setText(I18n::login(0));
@@ -68,10 +70,9 @@ QWidget *AccountManager::makeTitle()
 
     auto *row = new QHBoxLayout(title);
     row->setContentsMargins(0, 0, 0, 0);
-    row->setSpacing(16);
-    row->addWidget(logo);
     row->addWidget(text);
     row->addStretch();
+    row->addWidget(logo);
     return title;
 }
 

@@ -9,7 +9,14 @@
 
 namespace {
 
-constexpr int kSpacing = 8;
+constexpr int kSpacing = 7;
+constexpr int kPitch = AccountItem::rowHeight + kSpacing;
+
+// As many whole rows as fit into the height; at least one.
+int rowsIn(int height)
+{
+    return std::max(1, (height + kSpacing) / kPitch);
+}
 
 } // namespace
 
@@ -23,7 +30,7 @@ AccountsWidget::AccountsWidget(QWidget *parent)
     auto *content = new QWidget;
     content->setObjectName(QStringLiteral("rows"));
     mRows = new QVBoxLayout(content);
-    mRows->setContentsMargins(0, 0, 8, 0);
+    mRows->setContentsMargins(0, 0, kSpacing, 0);
     mRows->setSpacing(kSpacing);
     mRows->addStretch();
     setWidget(content);
@@ -40,6 +47,7 @@ void AccountsWidget::setAccounts(const QVector<Account> &accounts)
             mCurrent = mItems.size();
         addRow(account);
     }
+    mRows->activate(); // the rows have their places at once, for the focus to scroll to
 }
 
 void AccountsWidget::addRow(const Account &account)
@@ -51,6 +59,7 @@ void AccountsWidget::addRow(const Account &account)
         emit selectItem();
     });
     mRows->insertWidget(row, item);
+    item->show(); // at once: a hidden row takes no focus
     mItems << item;
 }
 
@@ -83,10 +92,7 @@ void AccountsWidget::moveFocus(int rows)
 
 void AccountsWidget::movePage(int pages)
 {
-    if (mItems.isEmpty())
-        return;
-    const int rowHeight = mItems.first()->height() + kSpacing;
-    moveFocus(pages * std::max(1, viewport()->height() / rowHeight));
+    moveFocus(pages * rowsIn(viewport()->height()));
 }
 
 bool AccountsWidget::hasRowFocus() const
@@ -97,4 +103,17 @@ bool AccountsWidget::hasRowFocus() const
 void AccountsWidget::keyPressEvent(QKeyEvent *event)
 {
     event->ignore(); // a scroll area would take the arrows for itself
+}
+
+QSize AccountsWidget::sizeHint() const
+{
+    // The same for any number of rows: the page must not move with it.
+    return {400, kPitch};
+}
+
+void AccountsWidget::resizeEvent(QResizeEvent *event)
+{
+    const int rows = rowsIn(height()) * kPitch - kSpacing;
+    setViewportMargins(0, 0, 0, std::max(0, height() - rows));
+    QScrollArea::resizeEvent(event);
 }

@@ -7,8 +7,8 @@
 class AccountItem;
 class QVBoxLayout;
 
-// The list of stored accounts, one row each, scrolled so that the focused row is in view. The page
-// that owns it handles the keys.
+// The list of stored accounts, one row each, scrolled by whole rows so that the focused one is in
+// view. The page that owns it handles the keys.
 class AccountsWidget : public QScrollArea
 {
     Q_OBJECT
@@ -36,12 +36,15 @@ public:
     void movePage(int pages);
     bool hasRowFocus() const;
 
+    QSize sizeHint() const override;
+
 signals:
     // The current row was chosen with the pointer.
     void selectItem();
 
 protected:
     void keyPressEvent(QKeyEvent *event) override;
+    void resizeEvent(QResizeEvent *event) override;
 
 private:
     void addRow(const Account &account);

@@ -19,8 +19,8 @@ namespace {
 const QString kStyle = QStringLiteral(
     "QLabel {color: white; font-size: 22px;}"
     "QLabel#title {font-size: 28px;}"
-    "QLabel#hint {color: #d5dfe6;}"
-    "QLabel#message {color: #ffd27a;}"
+    "QLabel#hint {color: #d5dfe6; margin-top: 12px;}"
+    "QLabel#message {color: #ffd27a; font-size: 20px;}"
     "AccountItem {border-image: url(:/res/Button_Normal.png) 6; border-width: 6px;}"
     "AccountItem:focus {border-image: url(:/res/Button_Focus.png) 6; border-width: 6px;}"
     "QPushButton {border-image: url(:/res/Button_Normal.png) 6; border-width: 6px;"
@@ -100,11 +100,11 @@ void LoginPage::buildLayout()
     row->addWidget(mHint, 1, Qt::AlignTop);
     row->addLayout(buttons);
 
-    mMessage->setFixedHeight(64);
+    mMessage->setFixedHeight(52);
     mMessage->setAlignment(Qt::AlignLeft | Qt::AlignVCenter);
     auto *column = new QVBoxLayout(this);
     column->setContentsMargins(0, 0, 0, 0);
-    column->setSpacing(12);
+    column->setSpacing(10);
     column->addWidget(makeLabel(this, "title", I18n::prompt(3)));
     column->addLayout(row, 1);
     column->addWidget(mMessage);
@@ -153,7 +153,10 @@ void LoginPage::showMessage(const QString &text)
 void LoginPage::showEvent(QShowEvent *event)
 {
     QWidget::showEvent(event);
-    if (!mNewButton->hasFocus() && !mExitButton->hasFocus())
+    // Where it was before, also when another page or window has it at the moment.
+    if (QWidget *last = focusWidget())
+        last->setFocus();
+    else
         restoreFocus();
 }
 

@@ -1,5 +1,6 @@
 #include "data/picturereader.h"
 
+#include "data/jpegdecoder.h"
 #include "data/picturecheck.h"
 #include "network/systemconfig.h"
 
@@ -12,6 +13,11 @@ namespace {
 
 const qint64 mostPixels = 64 * 1000 * 1000;
 const qint64 mostWorkBytes = 272 * 1000 * 1000;
+
+bool isJpeg(const QImageReader &reader)
+{
+    return reader.format() == "jpeg";
+}
 
 qint64 pixelsOf(const QSize &size)
 {
@@ -33,21 +39,22 @@ QSize decodeSize(const QImageReader &reader)
 {
     const QSize size = reader.size();
     const QSize screen = screenFor(reader);
-    if (reader.format() != "jpeg" || screen.isEmpty())
+    if (!isJpeg(reader) || screen.isEmpty())
         return size;
     const QSize fitting = size.scaled(screen, Qt::KeepAspectRatio).expandedTo(QSize(1, 1));
     return size.width() >= 2 * fitting.width() && size.height() >= 2 * fitting.height() ? fitting
                                                                                         : size;
 }
 
-// A pixmap has 32 bits a pixel; a picture of another depth exists twice while it is converted, and
-// one that has to be turned while it is turned.
+// A pixmap has 32 bits a pixel; a picture of another depth exists twice while it is converted, one
+// that has to be turned while it is turned, and of a moving one the decoder keeps a copy.
 qint64 decodedBytes(const QImageReader &reader, const QSize &size)
 {
     const int depth = QImage::toPixelFormat(reader.imageFormat()).bitsPerPixel();
     const bool isConverted = reader.imageFormat() != QImage::Format_Invalid && depth != 32;
     const bool isTurned = reader.transformation() != QImageIOHandler::TransformationNone;
-    const int bits = 32 + (isConverted ? depth : 0) + (isTurned ? 32 : 0);
+    const bool isCopied = reader.format() == "gif";
+    const int bits = 32 + (isConverted ? depth : 0) + (isTurned ? 32 : 0) + (isCopied ? 32 : 0);
     return pixelsOf(size) * bits / 8;
 }
 
@@ -58,14 +65,26 @@ bool isDecodable(const QImageReader &reader, const QSize &scaled, qint64 workByt
            workBytes + decodedBytes(reader, scaled) <= mostWorkBytes;
 }
 
+// Decodes at the size, or at its own for one that the reader need not scale or turn.
+QImage decode(QImageReader &reader, const QByteArray &data, const QSize &size)
+{
+    const bool isPlain =
+        size == reader.size() && reader.transformation() == QImageIOHandler::TransformationNone;
+    const QImage image = isJpeg(reader) && isPlain ? decodeJpeg(data) : QImage();
+    if (!image.isNull())
+        return image;
+    if (size != reader.size())
+        reader.setScaledSize(size);
+    return reader.read();
+}
+
 } // namespace
 
 QPixmap readPicture(const QByteArray &data)
 {
-    const char *format = pictureFormat(data);
-    const bool isPng = qstrcmp(format, "png") == 0;
-    QByteArray checked = isPng ? withoutTextChunks(data) : data;
-    if (!format || checked.isEmpty())
+    const QByteArray format = pictureFormat(data);
+    QByteArray checked = format == "png" ? withoutTextChunks(data) : data;
+    if (format.isEmpty() || checked.isEmpty())
         return QPixmap();
 
     QBuffer buffer(&checked);
@@ -73,11 +92,9 @@ QPixmap readPicture(const QByteArray &data)
     QImageReader reader(&buffer, format);
     reader.setAutoTransform(true);
     const QSize size = decodeSize(reader);
-    const qint64 workBytes = qstrcmp(format, "jpeg") == 0 ? jpegWorkBytes(checked) : 0;
+    const qint64 workBytes = isJpeg(reader) ? jpegWorkBytes(checked) : 0;
     if (!isDecodable(reader, size, workBytes))
         return QPixmap();
-    if (size != reader.size())
-        reader.setScaledSize(size);
-    QImage image = reader.read();
+    QImage image = decode(reader, checked, size);
     return image.isNull() ? QPixmap() : QPixmap::fromImage(std::move(image));
 }

@@ -6,8 +6,8 @@
 
 #include <simdjson.h>
 
+#include <array>
 #include <cmath>
-#include <cstring>
 #include <string_view>
 
 namespace {
@@ -19,19 +19,46 @@ QString toText(std::string_view utf8)
     return utf8.substr(0, 3) == "\xEF\xBB\xBF" ? QChar(QChar::ByteOrderMark) + text : text;
 }
 
-// The usual source: the tree of the fast parser.
-struct FastSource
+// One shared text for what a feed repeats many times: its keys, and values such as types.
+class RepeatedTexts
 {
+public:
+    QString text(std::string_view utf8)
+    {
+        if (utf8.empty() || utf8.size() > longest)
+            return toText(utf8);
+        const std::size_t ends = std::size_t(utf8.front() & 0xFF) * 3 + (utf8.back() & 0xFF);
+        Entry &entry = mEntries[(utf8.size() * 7 + ends) % mEntries.size()];
+        if (entry.utf8 != utf8)
+            entry = {utf8, toText(utf8)};
+        return entry.text;
+    }
+
+private:
+    static constexpr std::size_t longest = 64;
+
+    struct Entry
+    {
+        std::string_view utf8; // lives in the fast parser
+        QString text;
+    };
+    std::array<Entry, 64> mEntries;
+};
+
+// The usual source: the tree of the fast parser.
+class FastSource
+{
+public:
     using Value = simdjson::dom::element;
 
     bool isArray(const Value &value) const { return value.is_array(); }
     bool isObject(const Value &value) const { return value.is_object(); }
 
-    QVariant scalar(const Value &value) const
+    QVariant scalar(const Value &value)
     {
         switch (value.type()) {
         case simdjson::dom::element_type::STRING:
-            return toText(value.get_string().value_unsafe());
+            return mValues.text(value.get_string().value_unsafe());
         case simdjson::dom::element_type::BOOL:
             return value.get_bool().value_unsafe();
         case simdjson::dom::element_type::NULL_VALUE:
@@ -50,12 +77,16 @@ struct FastSource
     }
 
     template <typename Each>
-    void eachMember(const Value &value, Each each) const
+    void eachMember(const Value &value, Each each)
     {
         const simdjson::dom::object members = value.get_object().value_unsafe();
         for (const auto field : members)
-            each(toText(field.key), field.value);
+            each(mKeys.text(field.key), field.value);
     }
+
+private:
+    RepeatedTexts mKeys;
+    RepeatedTexts mValues;
 };
 
 // The source for what the fast parser refuses, rightly or not.
@@ -117,15 +148,21 @@ bool mayHoldNegativeZero(std::string_view text)
     return false;
 }
 
+constexpr std::size_t pageSize = 64 * 1024;
+
 // False if the fast parser cannot be relied on for this text.
 bool parseFast(const QByteArray &utf8, JsonObject &result)
 {
     if (mayHoldNegativeZero({utf8.constData(), std::size_t(utf8.size())}))
         return false;
-    simdjson::dom::parser parser;
+    // The buffers of a usual page stay for the next one.
+    static simdjson::dom::parser pageParser;
+    simdjson::dom::parser largeParser;
+    const auto size = std::size_t(utf8.size());
+    simdjson::dom::parser &parser = size <= pageSize ? pageParser : largeParser;
     simdjson::dom::element root;
-    if (parser.allocate(std::size_t(utf8.size()), deepestJson) != simdjson::SUCCESS ||
-        parser.parse(utf8.constData(), std::size_t(utf8.size())).get(root) != simdjson::SUCCESS)
+    if (parser.allocate(std::max(size, pageSize), deepestJson) != simdjson::SUCCESS ||
+        parser.parse(utf8.constData(), size).get(root) != simdjson::SUCCESS)
         return false;
     result = walk(FastSource(), root);
     return true;

@@ -3,6 +3,8 @@
 #include "base/log.h"
 #include "network/jsonparser.h"
 
+#include <QLoggingCategory>
+
 // The rules by which parsed values become variants, for any source of values. A source has
 //   bool isArray(v), bool isObject(v), QVariant scalar(v),
 //   void eachItem(v, f(item)), void eachMember(v, f(key, value)).
@@ -63,9 +65,18 @@ private:
             else
                 items.append(variant(item));
         });
-        logLine("-Skip! This is a QScriptValue lenght");
+        logSkippedLength();
         if (items.size() == sizeBefore)
             logLine("ERROR : canver Array fail, the QVariantList is Empty !");
+    }
+
+    // A feed has thousands of arrays: the line is made once and goes straight to the handler.
+    static void logSkippedLength()
+    {
+        static const QString line = QStringLiteral("-Skip! This is a QScriptValue lenght");
+        const QLoggingCategory *category = QLoggingCategory::defaultCategory();
+        if (category->isDebugEnabled())
+            qt_message_output(QtDebugMsg, {nullptr, 0, nullptr, category->categoryName()}, line);
     }
 
     Source &mSource;

@@ -45,7 +45,7 @@ void FormScrollWidget::addItem(QFrame *cell, int position)
     else
         logLine("ScrollWidget not has parentWidget()");
     const int row = position / mColumn;
-    mLayout->addWidget(cell, row, position % mColumn);
+    mLayout->addWidget(cell, row, position % mColumn, Qt::AlignHCenter);
     // Columns keep their places while cells are hidden, and rows stay at the top.
     mLayout->setColumnStretch(position % mColumn, 1);
     mLayout->setRowStretch(row, 0);

@@ -130,6 +130,12 @@ void UpWidget::takeSelectionBack()
     restyle();
 }
 
+void UpWidget::updateFocusMark()
+{
+    mHasFocus = hasFocus();
+    restyle();
+}
+
 void UpWidget::ask(int type, const QString &userId)
 {
     PackageProperty property;

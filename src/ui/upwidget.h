@@ -35,6 +35,9 @@ public:
     // home screen did not follow it.
     void takeSelectionBack();
 
+    // Shows whether the bar has the focus, which it counts as having until it first loses it.
+    void updateFocusMark();
+
     int focusIndex() const { return mFocus; }
     int selectedIndex() const { return mSelected; }
     const TitleIcon *entry(int index) const { return mEntries.at(index); }

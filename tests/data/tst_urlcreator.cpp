@@ -53,29 +53,21 @@ private slots:
         QCOMPARE(UrlCreator::getUrl(property), start + path);
     }
 
-    void refusesIncompleteRequests_data()
-    {
-        QTest::addColumn<int>("type");
-        QTest::addColumn<QString>("line");
-        const QString start = "Invalid parameters in UrlCreator::getUrlOf";
-        QTest::newRow("none") << 0 << "Invalid Type!";
-        QTest::newRow("unknown") << 9 << "Error: Unknow Type!";
-        QTest::newRow("negative") << -1 << "Error: Unknow Type!";
-        QTest::newRow("albums") << 2 << start + "AlbumsList";
-        QTest::newRow("album") << 3 << start + "AlbumPhotosList!";
-        QTest::newRow("comments") << 5 << start + "PhotoCommentsList!";
-        QTest::newRow("tags") << 6 << start + "PhotoTagsList!";
-        QTest::newRow("people") << 7 << start + "FavoritePeopleList";
-    }
     void refusesIncompleteRequests()
     {
-        QFETCH(int, type);
-        QFETCH(QString, line);
-        LogCapture log;
-        PackageProperty property;
-        property.mType = type;
-        QCOMPARE(UrlCreator::getUrl(property), QString());
-        QCOMPARE(log.lines(), QStringList(line));
+        const QString start = "Invalid parameters in UrlCreator::getUrlOf";
+        const QMap<int, QString> lines = {
+            {-1, "Error: Unknow Type!"},       {0, "Invalid Type!"},
+            {2, start + "AlbumsList"},         {3, start + "AlbumPhotosList!"},
+            {5, start + "PhotoCommentsList!"}, {6, start + "PhotoTagsList!"},
+            {7, start + "FavoritePeopleList"}, {9, "Error: Unknow Type!"}};
+        for (auto line = lines.begin(); line != lines.end(); ++line) {
+            LogCapture log;
+            PackageProperty property;
+            property.mType = line.key();
+            QCOMPARE(UrlCreator::getUrl(property), QString());
+            QCOMPARE(log.lines(), QStringList(*line));
+        }
     }
 
 private:

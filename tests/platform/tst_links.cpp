@@ -1,20 +1,16 @@
 #include "platform/linknotify.h"
-#include "platform/linktable.h"
 
 #include <QElapsedTimer>
 #include <QProcess>
-#include <QRandomGenerator>
 #include <QSemaphore>
 #include <QTest>
 
-#include <linux/netlink.h>
 #include <net/if.h>
 #include <sched.h>
 #include <sys/ioctl.h>
 #include <sys/socket.h>
 #include <unistd.h>
 
-#include <array>
 #include <atomic>
 #include <cstring>
 #include <fstream>
@@ -141,10 +137,7 @@ private slots:
     void tellsOfEveryFlap();
     void tellsOfTwoInterfacesAtOnce();
     void tellsOfInterfacesThatComeAndGo();
-    void leavesLoopbackOut();
-    void isSilentAfterUnregistering();
     void recoversFromLostNotices();
-    void survivesBrokenMessages();
 };
 
 void TestLinks::initTestCase()
@@ -188,8 +181,10 @@ void TestLinks::tellsOfEveryFlap()
     for (int i = 0; i < 50; ++i) {
         setUp("first", false);
         setUp("first", true);
+        setUp("lo", i % 2 == 0);
     }
     QTRY_COMPARE(carriersOf("first").size(), 100);
+    QVERIFY(carriersOf("lo").isEmpty());
     QCOMPARE(carriersOf("first").first(), false);
     QVERIFY(alternates(carriersOf("first")));
     // The kernel may merge what the other end sees, but it ends where it began.
@@ -218,30 +213,6 @@ void TestLinks::tellsOfInterfacesThatComeAndGo()
     QTRY_COMPARE(carriersOf("visitorEnd"), QList<bool>({true, false}));
 }
 
-void TestLinks::leavesLoopbackOut()
-{
-    setUp("lo", true);
-    setUp("lo", false);
-    setUp("first", false);
-    setUp("first", true);
-    QTRY_COMPARE(carriersOf("first"), QList<bool>({false, true}));
-    QVERIFY(carriersOf("lo").isEmpty());
-}
-
-void TestLinks::isSilentAfterUnregistering()
-{
-    QCOMPARE(i4_reg_network_notify_cb(nullptr), 0);
-    setUp("first", false);
-    QCOMPARE(i4_reg_network_notify_cb(note), 0);
-    setUp("second", false);
-    QTRY_COMPARE(carriersOf("second"), QList<bool>({false}));
-    QVERIFY(carriersOf("first").isEmpty());
-    setUp("first", true);
-    setUp("second", true);
-    QTRY_COMPARE(carriersOf("first"), QList<bool>({true}));
-    QTRY_COMPARE(carriersOf("second"), QList<bool>({false, true}));
-}
-
 void TestLinks::recoversFromLostNotices()
 {
     gateClosed = true;
@@ -258,27 +229,6 @@ void TestLinks::recoversFromLostNotices()
     QTRY_COMPARE(carriersOf("second"), QList<bool>({false, true}));
     setUp("first", true);
     QTRY_COMPARE(carriersOf("first"), QList<bool>({false, true}));
-}
-
-void TestLinks::survivesBrokenMessages()
-{
-    QRandomGenerator random(1);
-    alignas(nlmsghdr) std::array<char, 256> buffer;
-    LinkTable table;
-    std::vector<LinkChange> changes;
-    for (int round = 0; round < 20000; ++round) {
-        for (char &byte : buffer)
-            byte = char(random.generate());
-        auto *header = reinterpret_cast<nlmsghdr *>(buffer.data());
-        const quint32 size = random.bounded(int(buffer.size()) + 1);
-        header->nlmsg_len = round % 3 ? size : random.generate();
-        header->nlmsg_type = quint16(random.bounded(20));
-        buffer[sizeof(nlmsghdr)] = 0; // the family of plain interfaces
-        table.read(buffer.data(), size, &changes);
-        for (const LinkChange &linkChange : changes)
-            QVERIFY(linkChange.name.size() < buffer.size());
-        changes.clear();
-    }
 }
 
 int main(int argc, char *argv[])

@@ -5,6 +5,7 @@
 
 #include <QDir>
 #include <QElapsedTimer>
+#include <QFileInfo>
 #include <QRandomGenerator>
 #include <QTemporaryDir>
 #include <QTest>
@@ -29,15 +30,14 @@ private slots:
     void ignoresEverythingElse();
     void hearsTheLastWordsOfAShell();
     void saysGoodbyeInOrder();
-    void sendsWithoutAThread();
     void neverWaitsForABusyShell();
-    void takesALongPath();
 
 private:
     using Exit = QPair<bool, bool>;
 
     void startThread();
-    QString path(const QString &name = QStringLiteral("shell")) const;
+    // Longer than a socket address has room for.
+    QString path() const { return mFolder->filePath(QString(120, QLatin1Char('d')) + "/shell"); }
 
     std::unique_ptr<QTemporaryDir> mFolder;
     std::unique_ptr<QObject> mContext; // its thread is the test's: signals arrive queued
@@ -45,14 +45,10 @@ private:
     QList<int> mZones;
 };
 
-QString TestPlatform::path(const QString &name) const
-{
-    return mFolder->filePath(name);
-}
-
 void TestPlatform::init()
 {
     mFolder = std::make_unique<QTemporaryDir>();
+    QVERIFY(QDir().mkpath(QFileInfo(path()).path()));
     mContext = std::make_unique<QObject>();
     mExits.clear();
     mZones.clear();
@@ -215,20 +211,6 @@ void TestPlatform::saysGoodbyeInOrder()
     QVERIFY(shell.programHasGone());
 }
 
-void TestPlatform::sendsWithoutAThread()
-{
-    QVERIFY(!Ipc::getInstance()->sendIpcMsg({netcommon::MSG_EXIT_REQUEST, {}}));
-    FakeShell shell(path());
-    QVERIFY(Ipc::getInstance()->sendIpcMsg({netcommon::MSG_EXIT_REQUEST, {}}));
-    QVERIFY(shell.accept());
-    QVERIFY(shell.next());
-    // The connection has died meanwhile; the next message opens another.
-    shell.hangUp();
-    QVERIFY(Ipc::getInstance()->sendIpcMsg({netcommon::MSG_EXIT_REQUEST, {}}));
-    QVERIFY(shell.accept());
-    QVERIFY(shell.next());
-}
-
 void TestPlatform::neverWaitsForABusyShell()
 {
     FakeShell shell(path());
@@ -243,17 +225,6 @@ void TestPlatform::neverWaitsForABusyShell()
     Ipc::getInstance()->requestExit(false);
     QTRY_COMPARE(mExits.size(), 1);
     QVERIFY(timer.elapsed() < 900);
-}
-
-void TestPlatform::takesALongPath()
-{
-    const QString folder = path(QString(120, QLatin1Char('d')));
-    QVERIFY(QDir().mkpath(folder));
-    const QString longPath = folder + QStringLiteral("/shell");
-    Ipc::setSocketPath(longPath.toStdString());
-    FakeShell shell(longPath);
-    startThread();
-    QVERIFY(shell.accept());
 }
 
 QTEST_GUILESS_MAIN(TestPlatform)

@@ -21,13 +21,14 @@ public:
     int lost = 0;         // acknowledged writes that are not in the file
     int damaged = 0;      // files that are not whole
 
-    // Every third round starts without a file.
+    // Every third round starts without a file, and every other one of these is killed before it has
+    // told of anything.
     void run(int rounds)
     {
         for (int round = 0; round < rounds; ++round) {
             if (round % 3 == 0)
                 startAfresh();
-            writeUntilKilled(round % 3 == 0 ? 12000 : 25000);
+            writeUntilKilled(round % 6 == 0 ? 0 : upTo(8) + 1);
             check();
         }
     }
@@ -44,7 +45,10 @@ private:
         }
     }
 
-    void writeUntilKilled(int longestMicroseconds)
+    int upTo(int most) { return std::uniform_int_distribution<int>(0, most)(mRandom); }
+
+    // The kill falls into the few milliseconds after so many acknowledgements.
+    void writeUntilKilled(int acknowledgements)
     {
         int ends[2];
         if (::pipe(ends) != 0)
@@ -55,11 +59,25 @@ private:
             writeForEver(ends[1]);
         }
         ::close(ends[1]);
-        ::usleep(std::uniform_int_distribution<useconds_t>(0, longestMicroseconds)(mRandom));
+        QByteArray told;
+        while (told.count('\n') < acknowledgements && readSome(ends[0], &told))
+            continue;
+        ::usleep(upTo(acknowledgements == 0 ? 12000 : 2500));
         ::kill(writer, SIGKILL);
         ::waitpid(writer, nullptr, 0);
-        readAcknowledgements(ends[0]);
+        while (readSome(ends[0], &told))
+            continue;
         ::close(ends[0]);
+        noteAcknowledgements(told);
+    }
+
+    static bool readSome(int pipe, QByteArray *told)
+    {
+        char buffer[4096];
+        const ssize_t length = ::read(pipe, buffer, sizeof buffer);
+        if (length > 0)
+            told->append(buffer, int(length));
+        return length > 0;
     }
 
     // Each account is inserted with the token "1" and then updated to the token "2".
@@ -75,18 +93,17 @@ private:
             tell("open\n");
         for (int i = mAcknowledged.size();; ++i) {
             const QByteArray user = "user" + QByteArray::number(i);
-            if (database.insertAccount({user, "7305", "1", "r", "false", "n"}))
-                tell(user + " 1\n");
+            if (!database.insertAccount({user, "7305", "1", "r", "false", "n"}))
+                ::_exit(1); // a broken file: the parent finds out
+            tell(user + " 1\n");
             if (database.updateToken(user, "2", "r"))
                 tell(user + " 2\n");
         }
     }
 
-    void readAcknowledgements(int pipe)
+    void noteAcknowledgements(const QByteArray &told)
     {
-        QFile end;
-        end.open(pipe, QIODevice::ReadOnly);
-        const QByteArrayList lines = end.readAll().split('\n');
+        const QByteArrayList lines = told.split('\n');
         mOpened = lines.first() == "open";
         for (const QByteArray &line : lines) {
             const QByteArrayList words = line.split(' ');

@@ -1,0 +1,140 @@
+#include "cli/commands.h"
+
+#include "base/texts.h"
+#include "index/catalogue.h"
+#include "index/database.h"
+#include "index/imports.h"
+#include "index/tokens.h"
+#include "index/users.h"
+#include "service.h"
+
+#include <nlohmann/json.hpp>
+
+#include <filesystem>
+#include <fstream>
+#include <functional>
+#include <iostream>
+
+using nlohmann::json;
+
+namespace {
+
+constexpr std::int64_t tokenSeconds = 90 * 24 * 3600;
+
+int fail(const std::string &message)
+{
+    std::cerr << "orvala-service: " << message << "\n";
+    return 1;
+}
+
+// Opens the index for one piece of work and turns what goes wrong in it into a message.
+int withIndex(const std::string &data, const std::function<int(Database &)> &work)
+{
+    std::string error;
+    const auto database = openIndex(data, &error);
+    if (!database)
+        return fail(error);
+    try {
+        return work(*database);
+    } catch (const SQLite::Exception &exception) {
+        return fail(exception.what());
+    }
+}
+
+bool isMail(const std::string &mail)
+{
+    const std::size_t at = mail.find('@');
+    return at != std::string::npos && at > 0 && at + 1 < mail.size() &&
+           mail.find_first_of(" \t\r\n/?#&") == std::string::npos;
+}
+
+bool isFolder(const std::string &path)
+{
+    std::error_code code;
+    return std::filesystem::is_directory(path, code);
+}
+
+} // namespace
+
+int runUserAdd(const UserOptions &options)
+{
+    if (!isMail(options.mail))
+        return fail("\"" + options.mail + "\" is no mail address");
+    if (!options.photos.empty() && !isFolder(options.photos))
+        return fail("there is no folder " + options.photos);
+    return withIndex(options.data, [&](Database &database) {
+        const std::string photos = options.photos.empty() ? "" : absoluteFolder(options.photos);
+        saveUser(database, {0, options.mail, options.name, photos});
+        return 0;
+    });
+}
+
+int runUserList(const std::string &data)
+{
+    return withIndex(data, [](Database &database) {
+        auto reader = database.read();
+        for (const UserRecord &user : allUsers(reader))
+            std::cout << user.id << "\t" << user.mail << "\t" << user.name << "\t" << user.photos
+                      << "\n";
+        return 0;
+    });
+}
+
+int runUserRemove(const std::string &data, const std::string &mail)
+{
+    return withIndex(data, [&](Database &database) {
+        return removeUser(database, mail) ? 0 : fail("there is no user " + mail);
+    });
+}
+
+int runUserToken(const std::string &data, const std::string &mail)
+{
+    return withIndex(data, [&](Database &database) {
+        std::optional<UserRecord> user;
+        {
+            auto reader = database.read();
+            user = userWithMail(reader, mail);
+        }
+        if (!user)
+            return fail("there is no user " + mail);
+        const Tokens tokens = issueTokens(database, user->id, tokenSeconds);
+        std::cout << json({{"access_token", tokens.access},
+                           {"refresh_token", tokens.refresh},
+                           {"expires_in", tokens.expiresIn}})
+                         .dump()
+                  << "\n";
+        return 0;
+    });
+}
+
+int runImport(const std::string &data, const std::string &file, const std::string &folder)
+{
+    std::ifstream stream(file);
+    if (!stream)
+        return fail("cannot read " + file);
+    json document = json::parse(stream, nullptr, false);
+    if (document.is_discarded())
+        return fail(file + " is no JSON");
+    if (!folder.empty())
+        resolvePaths(document, folder);
+    return withIndex(data, [&](Database &database) {
+        ImportResult result;
+        std::string error;
+        if (!importDocument(database, document, &result, &error))
+            return fail(error);
+        std::cout << result.users << " users, " << result.comments << " new comments, "
+                  << result.tags << " new tags, " << result.waiting
+                  << " waiting for photos not yet found\n";
+        return 0;
+    });
+}
+
+int runUnreadable(const std::string &data)
+{
+    return withIndex(data, [](Database &database) {
+        auto reader = database.read();
+        for (const UnreadablePhoto &photo : unreadablePhotos(reader))
+            std::cout << photo.path << "\t" << photo.error << "\n";
+        return 0;
+    });
+}

@@ -1,0 +1,54 @@
+#pragma once
+
+#include "http/certificate.h"
+#include "http/parking.h"
+#include "http/router.h"
+
+#include <httplib.h>
+
+#include <atomic>
+
+// The HTTP library's server on connections of our own: a client that keeps its connection open
+// costs no thread while it is silent, and stopping waits for nobody.
+//
+//   listener --> Parking --(has something to say)--> worker: handshake, requests, answers
+//                   ^                                   |
+//                   '------------(nothing more)---------'
+class HttpServer : private httplib::Server
+{
+public:
+    struct Settings
+    {
+        std::string address;
+        int port = 0; // 0: a free one
+        int threads = 16;
+        std::size_t bodyBytes = 1024 * 1024;
+        SSL_CTX *context = nullptr; // no TLS without one
+    };
+
+    HttpServer(const Router &router, const Settings &settings);
+    ~HttpServer() override;
+
+    // Starts to answer; false when the address is taken or not ours.
+    bool start();
+    int port() const { return mPort; }
+    void stop();
+
+private:
+    using Client = Parking::Client;
+
+    bool process_and_close_socket(socket_t socket) override;
+    void setUp();
+    void serve(const Client &client);
+    bool serveRequest(ClientStream &client);
+    void answerRequest(const httplib::Request &request, httplib::Response &response);
+
+    const Router &mRouter;
+    const Settings mSettings;
+    const int mStopEvent;
+    int mPort = 0;
+    httplib::TaskQueue *mWorkers = nullptr; // owned by the library while it listens
+    std::atomic<bool> mStopping{false};
+    std::unique_ptr<Parking> mParking;
+    std::thread mListener;
+};

@@ -1,0 +1,149 @@
+#include "index/albumwriter.h"
+
+#include "base/secrets.h"
+#include "base/texts.h"
+#include "index/database.h"
+#include "index/photosearch.h"
+#include "index/revisions.h"
+
+namespace {
+
+constexpr std::size_t keyBytes = 16;
+constexpr std::int64_t nanoseconds = 1'000'000'000;
+
+// The album's row, made or changed to the state.
+std::int64_t writeAlbum(Session &session, const FolderState &state)
+{
+    Query(session,
+          "INSERT INTO albums (user, folder, title, private) VALUES (?1, ?2, ?3, ?4) "
+          "ON CONFLICT (user, folder) DO UPDATE SET title = ?3, private = ?4",
+          state.userId, state.folder, state.title, int(state.isPrivate))
+        .run();
+    Query query(session, "SELECT id FROM albums WHERE user = ? AND folder = ?", state.userId,
+                state.folder);
+    return query.next() ? query.number(0) : 0;
+}
+
+std::string titleOf(const FoundFile &file)
+{
+    return file.metadata.title.empty() ? validUtf8(withoutExtension(file.name))
+                                       : file.metadata.title;
+}
+
+std::string timeOf(const FoundFile &file)
+{
+    return file.metadata.taken.empty() ? localTime(file.changed / nanoseconds)
+                                       : file.metadata.taken;
+}
+
+// A file that changed keeps its id, its key, its comments and what people tagged it with.
+std::int64_t writePhoto(Session &session, std::int64_t albumId, const FoundFile &file)
+{
+    const PhotoMetadata &metadata = file.metadata;
+    Query(session,
+          "INSERT INTO photos (album, name, key, size, changed, present, error, mimeType, width, "
+          "height, title, caption, published, latitude, longitude) "
+          "VALUES (?1, ?2, ?3, ?4, ?5, 1, ?6, ?7, ?8, ?9, ?10, ?11, ?12, ?13, ?14) "
+          "ON CONFLICT (album, name) DO UPDATE SET size = ?4, changed = ?5, present = 1, "
+          "error = ?6, mimeType = ?7, width = ?8, height = ?9, title = ?10, caption = ?11, "
+          "published = ?12, latitude = ?13, longitude = ?14",
+          albumId, file.name, randomText(keyBytes), file.size, file.changed, file.error,
+          metadata.mimeType, metadata.width, metadata.height, titleOf(file), metadata.caption,
+          timeOf(file), metadata.latitude, metadata.longitude)
+        .run();
+    Query query(session, "SELECT id FROM photos WHERE album = ? AND name = ?", albumId, file.name);
+    return query.next() ? query.number(0) : 0;
+}
+
+void writeKeywords(Session &session, std::int64_t photoId, const std::vector<std::string> &keywords)
+{
+    Query(session, "DELETE FROM tags WHERE photo = ? AND author IS NULL", photoId).run();
+    for (const std::string &keyword : keywords)
+        Query(session, "INSERT OR IGNORE INTO tags (photo, tag) VALUES (?, ?)", photoId, keyword)
+            .run();
+}
+
+void setPresent(Session &session, std::int64_t photoId, bool present)
+{
+    Query(session, "UPDATE photos SET present = ? WHERE id = ?", int(present), photoId).run();
+    refreshPhotoSearch(session, photoId);
+}
+
+void refreshAlbum(Session &session, std::int64_t albumId)
+{
+    Query(session,
+          "UPDATE albums SET "
+          "photoCount = (SELECT count(*) FROM photos WHERE album = ?1 AND present = 1), "
+          "published = coalesce((SELECT max(published) FROM photos "
+          "WHERE album = ?1 AND present = 1), ''), "
+          "cover = coalesce((SELECT id FROM photos WHERE album = ?1 AND present = 1 "
+          "AND error = '' ORDER BY published, name LIMIT 1), "
+          "(SELECT id FROM photos WHERE album = ?1 AND present = 1 LIMIT 1)) WHERE id = ?1",
+          albumId)
+        .run();
+}
+
+bool isPrivacyChanged(Session &session, const FolderState &state)
+{
+    Query query(session, "SELECT private FROM albums WHERE user = ? AND folder = ?", state.userId,
+                state.folder);
+    return query.next() && (query.number(0) != 0) != state.isPrivate;
+}
+
+void writeFolder(Session &session, const FolderChanges &changes)
+{
+    const bool privacyChanged = isPrivacyChanged(session, changes.state);
+    const std::int64_t albumId = writeAlbum(session, changes.state);
+    for (const FoundFile &file : changes.found) {
+        const std::int64_t photoId = writePhoto(session, albumId, file);
+        writeKeywords(session, photoId, file.metadata.keywords);
+        refreshPhotoSearch(session, photoId);
+    }
+    for (const std::int64_t photoId : changes.gone)
+        setPresent(session, photoId, false);
+    for (const std::int64_t photoId : changes.back)
+        setPresent(session, photoId, true);
+    if (privacyChanged)
+        refreshAlbumSearch(session, albumId);
+    refreshAlbum(session, albumId);
+}
+
+} // namespace
+
+std::map<std::string, KnownAlbum> knownAlbums(Session &session, std::int64_t userId)
+{
+    std::map<std::string, KnownAlbum> albums;
+    Query query(session, "SELECT folder, id, private FROM albums WHERE user = ?", userId);
+    while (query.next())
+        albums[query.text(0)] = {query.number(1), query.number(2) != 0};
+    return albums;
+}
+
+std::map<std::string, KnownFile> knownFiles(Session &session, std::int64_t albumId)
+{
+    std::map<std::string, KnownFile> files;
+    Query query(session, "SELECT name, id, size, changed, present FROM photos WHERE album = ?",
+                albumId);
+    while (query.next())
+        files[query.text(0)] = {query.number(1), query.number(2), query.number(3),
+                                query.number(4) != 0};
+    return files;
+}
+
+std::int64_t presentPhotos(Session &session, std::int64_t userId)
+{
+    Query query(session, "SELECT coalesce(sum(photoCount), 0) FROM albums WHERE user = ?", userId);
+    return query.next() ? query.number(0) : 0;
+}
+
+void writeChanges(Database &database, const std::vector<FolderChanges> &changes)
+{
+    Database::Writer writer(database);
+    for (const FolderChanges &folder : changes) {
+        // The user may have been removed while the folder was read.
+        if (Query(writer, "SELECT 1 FROM users WHERE id = ?", folder.state.userId).next())
+            writeFolder(writer, folder);
+    }
+    raiseRevision(writer, Revision::Photos);
+    writer.commit();
+}

@@ -1,0 +1,59 @@
+#pragma once
+
+#include "index/records.h"
+#include "pictures/photometadata.h"
+
+#include <map>
+#include <vector>
+
+class Database;
+class Session;
+
+// The scan's side of the index: what is known of a folder, and batches of what was found.
+struct KnownFile
+{
+    std::int64_t id = 0;
+    std::int64_t size = 0;
+    std::int64_t changed = 0; // nanoseconds since 1970
+    bool isPresent = false;
+};
+
+struct KnownAlbum
+{
+    std::int64_t id = 0;
+    bool isPrivate = false;
+};
+
+struct FolderState
+{
+    std::int64_t userId = 0;
+    std::string folder; // below the user's folder, without slashes at its ends
+    std::string title;
+    bool isPrivate = false;
+};
+
+struct FoundFile
+{
+    std::string name;
+    std::int64_t size = 0;
+    std::int64_t changed = 0;
+    PhotoMetadata metadata; // empty with an error
+    std::string error;      // why the file is no photo; empty when it is one
+};
+
+// All that changed in one folder since the last scan.
+struct FolderChanges
+{
+    FolderState state;
+    std::vector<FoundFile> found;   // new, changed or back
+    std::vector<std::int64_t> gone; // photo ids
+    std::vector<std::int64_t> back; // photo ids: as before, after having been gone
+    bool isEmpty() const { return found.empty() && gone.empty() && back.empty(); }
+};
+
+std::map<std::string, KnownAlbum> knownAlbums(Session &session, std::int64_t userId);
+std::map<std::string, KnownFile> knownFiles(Session &session, std::int64_t albumId);
+std::int64_t presentPhotos(Session &session, std::int64_t userId);
+
+// Writes the changes in one transaction.
+void writeChanges(Database &database, const std::vector<FolderChanges> &changes);

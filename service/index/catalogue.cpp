@@ -1,0 +1,234 @@
+#include "index/catalogue.h"
+
+#include "index/database.h"
+
+#include <cctype>
+
+namespace {
+
+// One text for every list of photos: what follows it picks and orders.
+#define PHOTO_COLUMNS                                                                              \
+    "SELECT p.id, p.album, a.user, u.name, p.key, p.name, p.size, p.width, p.height, p.title, "    \
+    "p.caption, p.published, p.mimeType, "                                                         \
+    "(SELECT group_concat(tag, ', ') FROM (SELECT tag FROM tags WHERE photo = p.id ORDER BY "      \
+    "id)), "                                                                                       \
+    "(SELECT count(*) FROM comments WHERE photo = p.id), p.latitude, p.longitude "                 \
+    "FROM photos p JOIN albums a ON a.id = p.album JOIN users u ON u.id = a.user "
+
+#define ALBUM_COLUMNS                                                                              \
+    "SELECT a.id, a.user, u.name, a.title, a.private, a.photoCount, a.published, a.cover "         \
+    "FROM albums a JOIN users u ON u.id = a.user "
+
+#define PATH_OF_PHOTO                                                                              \
+    "u.photos || '/' || CASE a.folder WHEN '' THEN '' ELSE a.folder || '/' END || p.name"
+
+PhotoRecord photoAt(const Query &query)
+{
+    PhotoRecord photo;
+    photo.id = query.number(0);
+    photo.albumId = query.number(1);
+    photo.userId = query.number(2);
+    photo.userName = query.text(3);
+    photo.key = query.text(4);
+    photo.fileName = query.text(5);
+    photo.fileSize = query.number(6);
+    photo.width = static_cast<int>(query.number(7));
+    photo.height = static_cast<int>(query.number(8));
+    photo.title = query.text(9);
+    photo.caption = query.text(10);
+    photo.published = query.text(11);
+    photo.mimeType = query.text(12);
+    photo.keywords = query.text(13);
+    photo.commentCount = static_cast<int>(query.number(14));
+    if (!query.isNull(15) && !query.isNull(16)) {
+        photo.latitude = query.real(15);
+        photo.longitude = query.real(16);
+    }
+    return photo;
+}
+
+AlbumRecord albumAt(const Query &query)
+{
+    AlbumRecord album;
+    album.id = query.number(0);
+    album.userId = query.number(1);
+    album.userName = query.text(2);
+    album.title = query.text(3);
+    album.isPrivate = query.number(4) != 0;
+    album.photoCount = static_cast<int>(query.number(5));
+    album.published = query.text(6);
+    if (!query.isNull(7))
+        album.cover = query.number(7);
+    return album;
+}
+
+std::vector<std::int64_t> numbersOf(Query &&query)
+{
+    std::vector<std::int64_t> numbers;
+    while (query.next())
+        numbers.push_back(query.number(0));
+    return numbers;
+}
+
+bool isWordByte(unsigned char byte)
+{
+    return byte >= 0x80 || std::isalnum(byte);
+}
+
+} // namespace
+
+std::vector<AlbumRecord> albumsOf(Session &session, const AlbumFilter &filter, const Page &page)
+{
+    std::vector<AlbumRecord> albums;
+    Query query(session,
+                ALBUM_COLUMNS "WHERE a.user = ? AND a.photoCount > 0 AND (NOT a.private OR ?) "
+                              "ORDER BY a.published DESC, a.title, a.id LIMIT ? OFFSET ?",
+                filter.userId, int(filter.withPrivate), page.count, page.start - 1);
+    while (query.next())
+        albums.push_back(albumAt(query));
+    return albums;
+}
+
+std::int64_t albumCount(Session &session, const AlbumFilter &filter)
+{
+    Query query(session,
+                "SELECT count(*) FROM albums "
+                "WHERE user = ? AND photoCount > 0 AND (NOT private OR ?)",
+                filter.userId, int(filter.withPrivate));
+    return query.next() ? query.number(0) : 0;
+}
+
+std::optional<AlbumRecord> albumWithId(Session &session, std::int64_t userId, std::int64_t albumId)
+{
+    Query query(session, ALBUM_COLUMNS "WHERE a.user = ? AND a.id = ?", userId, albumId);
+    if (!query.next())
+        return std::nullopt;
+    return albumAt(query);
+}
+
+std::vector<PhotoRecord> photosOf(Session &session, std::int64_t albumId, const Page &page)
+{
+    std::vector<PhotoRecord> photos;
+    Query query(session,
+                PHOTO_COLUMNS "WHERE p.album = ? AND p.present = 1 "
+                              "ORDER BY p.published, p.name LIMIT ? OFFSET ?",
+                albumId, page.count, page.start - 1);
+    while (query.next())
+        photos.push_back(photoAt(query));
+    return photos;
+}
+
+std::optional<PhotoRecord> photoWithId(Session &session, std::int64_t photoId)
+{
+    Query query(session, PHOTO_COLUMNS "WHERE p.id = ? AND p.present = 1", photoId);
+    if (!query.next())
+        return std::nullopt;
+    return photoAt(query);
+}
+
+std::vector<PhotoRecord> photosWithIds(Session &session, const std::vector<std::int64_t> &ids)
+{
+    std::vector<PhotoRecord> photos;
+    for (const std::int64_t id : ids) {
+        if (auto photo = photoWithId(session, id))
+            photos.push_back(std::move(*photo));
+    }
+    return photos;
+}
+
+std::vector<std::int64_t> featuredOrder(Session &session)
+{
+    // Keys are random and stay: their order is a shuffle that every page agrees on.
+    return numbersOf(Query(session, "SELECT p.id FROM photos p JOIN albums a ON a.id = p.album "
+                                    "WHERE p.present = 1 AND p.error = '' AND NOT a.private "
+                                    "ORDER BY p.key"));
+}
+
+std::string searchExpression(const std::string &text)
+{
+    std::string expression, word;
+    const auto finishWord = [&] {
+        if (!word.empty())
+            expression += (expression.empty() ? "\"" : " \"") + word + "\"*";
+        word.clear();
+    };
+    for (const char c : text) {
+        if (isWordByte(static_cast<unsigned char>(c)))
+            word += c;
+        else
+            finishWord();
+    }
+    finishWord();
+    return expression;
+}
+
+std::int64_t searchCount(Session &session, const std::string &expression)
+{
+    Query query(session, "SELECT count(*) FROM photoSearch WHERE photoSearch MATCH ?", expression);
+    return query.next() ? query.number(0) : 0;
+}
+
+std::vector<std::int64_t> searchPhotos(Session &session, const std::string &expression,
+                                       const Page &page)
+{
+    return numbersOf(Query(session,
+                           "SELECT rowid FROM photoSearch WHERE photoSearch MATCH ? "
+                           "ORDER BY rowid DESC LIMIT ? OFFSET ?",
+                           expression, page.count, page.start - 1));
+}
+
+std::vector<CommentRecord> commentsOf(Session &session, std::int64_t photoId)
+{
+    std::vector<CommentRecord> comments;
+    Query query(session,
+                "SELECT c.id, c.author, u.name, c.content, c.published FROM comments c "
+                "JOIN users u ON u.id = c.author WHERE c.photo = ? ORDER BY c.published, c.id",
+                photoId);
+    while (query.next())
+        comments.push_back(
+            {query.number(0), query.number(1), query.text(2), query.text(3), query.text(4)});
+    return comments;
+}
+
+std::vector<std::string> tagsOf(Session &session, std::int64_t photoId)
+{
+    std::vector<std::string> tags;
+    Query query(session, "SELECT tag FROM tags WHERE photo = ? ORDER BY id", photoId);
+    while (query.next())
+        tags.push_back(query.text(0));
+    return tags;
+}
+
+std::optional<PhotoRecord> portraitOf(Session &session, std::int64_t userId)
+{
+    Query query(session,
+                "SELECT cover FROM albums WHERE user = ? AND NOT private AND cover IS NOT NULL "
+                "ORDER BY published DESC, id LIMIT 1",
+                userId);
+    if (!query.next())
+        return std::nullopt;
+    return photoWithId(session, query.number(0));
+}
+
+std::optional<PhotoFile> fileWithKey(Session &session, const std::string &key)
+{
+    Query query(session,
+                "SELECT " PATH_OF_PHOTO ", p.id, p.size, p.changed FROM photos p "
+                "JOIN albums a ON a.id = p.album JOIN users u ON u.id = a.user "
+                "WHERE p.key = ? AND p.present = 1",
+                key);
+    if (!query.next())
+        return std::nullopt;
+    return PhotoFile{query.text(0), query.text(1) + "-" + query.text(2) + "-" + query.text(3)};
+}
+
+std::vector<UnreadablePhoto> unreadablePhotos(Session &session)
+{
+    std::vector<UnreadablePhoto> photos;
+    Query query(session, "SELECT " PATH_OF_PHOTO ", p.error FROM photos p "
+                         "JOIN albums a ON a.id = p.album JOIN users u ON u.id = a.user "
+                         "WHERE p.error <> '' AND p.present = 1 ORDER BY 1");
+    while (query.next())
+        photos.push_back({query.text(0), query.text(1)});
+    return photos;
+}

@@ -1,0 +1,48 @@
+#pragma once
+
+#include "index/records.h"
+
+#include <vector>
+
+class Session;
+
+// What the feeds read from the index. Lists hold present photos only; a list for everybody
+// (featured, search) leaves out private albums and unreadable files.
+struct AlbumFilter
+{
+    std::int64_t userId;
+    bool withPrivate;
+};
+
+std::vector<AlbumRecord> albumsOf(Session &session, const AlbumFilter &filter, const Page &page);
+std::int64_t albumCount(Session &session, const AlbumFilter &filter);
+std::optional<AlbumRecord> albumWithId(Session &session, std::int64_t userId, std::int64_t albumId);
+
+// In the order in which they were taken.
+std::vector<PhotoRecord> photosOf(Session &session, std::int64_t albumId, const Page &page);
+std::optional<PhotoRecord> photoWithId(Session &session, std::int64_t photoId);
+std::vector<PhotoRecord> photosWithIds(Session &session, const std::vector<std::int64_t> &ids);
+
+// All photos for everybody, in an order that mixes people and albums and stays as it is.
+std::vector<std::int64_t> featuredOrder(Session &session);
+
+// A MATCH expression for photos that hold a word beginning with each word of the text; empty for a
+// text without a word.
+std::string searchExpression(const std::string &text);
+std::int64_t searchCount(Session &session, const std::string &expression);
+std::vector<std::int64_t> searchPhotos(Session &session, const std::string &expression,
+                                       const Page &page);
+
+std::vector<CommentRecord> commentsOf(Session &session, std::int64_t photoId);
+std::vector<std::string> tagsOf(Session &session, std::int64_t photoId);
+// A public photo that may stand for the user.
+std::optional<PhotoRecord> portraitOf(Session &session, std::int64_t userId);
+
+std::optional<PhotoFile> fileWithKey(Session &session, const std::string &key);
+
+struct UnreadablePhoto
+{
+    std::string path;
+    std::string error;
+};
+std::vector<UnreadablePhoto> unreadablePhotos(Session &session);

@@ -1,0 +1,113 @@
+#include "index/schema.h"
+
+#include "index/database.h"
+
+namespace {
+
+// Times are ISO texts: those of photos in local time as written by the camera, those of comments in
+// UTC. File and folder names are the bytes that the file system gives. A photo that is gone keeps
+// its row (present = 0) with its comments and tags, for disks that are away for a while.
+const char firstVersion[] = R"sql(
+CREATE TABLE users (
+    id INTEGER PRIMARY KEY AUTOINCREMENT,
+    mail TEXT NOT NULL UNIQUE COLLATE NOCASE,
+    name TEXT NOT NULL,
+    photos TEXT NOT NULL,
+    password TEXT NOT NULL DEFAULT ''
+);
+CREATE TABLE tokens (
+    hash TEXT PRIMARY KEY,
+    user INTEGER NOT NULL REFERENCES users (id) ON DELETE CASCADE,
+    kind INTEGER NOT NULL,
+    expires INTEGER NOT NULL
+) WITHOUT ROWID;
+CREATE INDEX tokensOfUser ON tokens (user);
+CREATE TABLE albums (
+    id INTEGER PRIMARY KEY AUTOINCREMENT,
+    user INTEGER NOT NULL REFERENCES users (id) ON DELETE CASCADE,
+    folder TEXT NOT NULL,
+    title TEXT NOT NULL,
+    private INTEGER NOT NULL,
+    photoCount INTEGER NOT NULL DEFAULT 0,
+    published TEXT NOT NULL DEFAULT '',
+    cover INTEGER,
+    UNIQUE (user, folder)
+);
+CREATE TABLE photos (
+    id INTEGER PRIMARY KEY AUTOINCREMENT,
+    album INTEGER NOT NULL REFERENCES albums (id) ON DELETE CASCADE,
+    name TEXT NOT NULL,
+    key TEXT NOT NULL UNIQUE,
+    size INTEGER NOT NULL,
+    changed INTEGER NOT NULL,
+    present INTEGER NOT NULL DEFAULT 1,
+    error TEXT NOT NULL,
+    mimeType TEXT NOT NULL,
+    width INTEGER NOT NULL,
+    height INTEGER NOT NULL,
+    title TEXT NOT NULL,
+    caption TEXT NOT NULL,
+    published TEXT NOT NULL,
+    latitude REAL,
+    longitude REAL,
+    UNIQUE (album, name)
+);
+CREATE INDEX photosInOrder ON photos (album, present, published, name);
+CREATE INDEX showablePhotos ON photos (key, album, present, error)
+    WHERE present = 1 AND error = '';
+CREATE INDEX unreadablePhotos ON photos (album) WHERE error <> '';
+CREATE TABLE tags (
+    id INTEGER PRIMARY KEY,
+    photo INTEGER NOT NULL REFERENCES photos (id) ON DELETE CASCADE,
+    tag TEXT NOT NULL,
+    author INTEGER REFERENCES users (id) ON DELETE CASCADE,
+    UNIQUE (photo, tag)
+);
+CREATE INDEX tagsOfAuthor ON tags (author);
+CREATE TABLE comments (
+    id INTEGER PRIMARY KEY AUTOINCREMENT,
+    photo INTEGER NOT NULL REFERENCES photos (id) ON DELETE CASCADE,
+    author INTEGER NOT NULL REFERENCES users (id) ON DELETE CASCADE,
+    content TEXT NOT NULL,
+    published TEXT NOT NULL
+);
+CREATE INDEX commentsOfPhoto ON comments (photo, published, id);
+CREATE INDEX commentsOfAuthor ON comments (author);
+CREATE TABLE imports (
+    id INTEGER PRIMARY KEY,
+    kind TEXT NOT NULL,
+    path TEXT NOT NULL,
+    author INTEGER NOT NULL REFERENCES users (id) ON DELETE CASCADE,
+    content TEXT NOT NULL,
+    published TEXT NOT NULL,
+    done INTEGER NOT NULL DEFAULT 0,
+    UNIQUE (kind, path, author, content, published)
+);
+CREATE INDEX waitingImports ON imports (id) WHERE done = 0;
+CREATE TABLE revisions (name TEXT PRIMARY KEY, value INTEGER NOT NULL) WITHOUT ROWID;
+INSERT INTO revisions VALUES ('photos', 1), ('users', 1);
+CREATE VIRTUAL TABLE photoSearch USING fts5 (
+    title, caption, tags, album,
+    tokenize = "unicode61 remove_diacritics 2", prefix = '2 3'
+);
+)sql";
+
+const char *const steps[] = {firstVersion};
+constexpr int newestVersion = sizeof steps / sizeof steps[0];
+
+} // namespace
+
+bool upgradeSchema(Session &session, std::string *error)
+{
+    SQLite::Database &database = session.database();
+    const int version = database.execAndGet("PRAGMA user_version").getInt();
+    if (version > newestVersion) {
+        *error = "the index was written by a newer version of this program";
+        return false;
+    }
+    for (int step = version; step < newestVersion; ++step)
+        database.exec(steps[step]);
+    if (version < newestVersion)
+        database.exec("PRAGMA user_version = " + std::to_string(newestVersion));
+    return true;
+}

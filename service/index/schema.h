@@ -1,0 +1,9 @@
+#pragma once
+
+#include <string>
+
+class Session;
+
+// Brings the index from whatever version it has to the newest, one step per version, inside the
+// caller's transaction. False for a file that a newer version of the service has written.
+bool upgradeSchema(Session &session, std::string *error);

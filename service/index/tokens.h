@@ -1,0 +1,24 @@
+#pragma once
+
+#include "index/records.h"
+
+class Database;
+class Session;
+
+// Tokens: random texts of which only the fingerprint is kept. An access token opens the feeds until
+// it expires; a refresh token buys new access tokens until its user is removed.
+struct Tokens
+{
+    std::string access;
+    std::string refresh;
+    std::int64_t expiresIn = 0; // seconds
+};
+
+Tokens issueTokens(Database &database, std::int64_t userId, std::int64_t seconds);
+
+// An access token for the owner of the refresh token; nothing if it is not known.
+std::optional<std::string> refreshAccess(Database &database, const std::string &refreshToken,
+                                         std::int64_t seconds);
+
+// The user whom the access token stands for; nothing if it is unknown or has expired.
+std::optional<UserRecord> userOfToken(Session &session, const std::string &accessToken);

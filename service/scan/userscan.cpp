@@ -1,0 +1,192 @@
+#include "scan/userscan.h"
+
+#include "base/texts.h"
+#include "index/database.h"
+
+#include <spdlog/spdlog.h>
+
+#include <sys/stat.h>
+
+namespace {
+
+constexpr std::size_t filesPerBatch = 500;
+constexpr std::chrono::milliseconds batchTime{1000};
+
+std::string lastPiece(const std::string &path)
+{
+    return path.substr(path.rfind('/') + 1); // the whole text without a slash
+}
+
+} // namespace
+
+UserScan::UserScan(Database &database, const UserRecord &user, const std::atomic<bool> &stop)
+    : mDatabase(database)
+    , mUser(user)
+    , mStop(stop)
+    , mLastWrite(std::chrono::steady_clock::now())
+{
+}
+
+bool UserScan::run()
+{
+    const auto root = listFolder(mUser.photos);
+    if (!root || isLost(*root))
+        return false;
+    {
+        auto reader = mDatabase.read();
+        mKnownAlbums = knownAlbums(reader, mUser.id);
+    }
+    struct stat status
+    {
+    };
+    if (::stat(mUser.photos.c_str(), &status) == 0)
+        mEntered.emplace(status.st_dev, status.st_ino);
+    walk({"", root->isMarkedPrivate}, *root);
+    if (!mStop)
+        dropUnseenAlbums();
+    write();
+    return true;
+}
+
+bool UserScan::isLost(const FolderListing &root)
+{
+    if (!root.files.empty() || !root.folders.empty())
+        return false;
+    auto reader = mDatabase.read();
+    return presentPhotos(reader, mUser.id) > 0;
+}
+
+void UserScan::walk(const Place &place, const FolderListing &listing)
+{
+    ++mTotals.folders;
+    mSeenFolders.insert(place.folder);
+    compare(place, listing);
+    for (const ListedFolder &folder : listing.folders) {
+        if (mStop)
+            return;
+        enter(place, folder);
+    }
+}
+
+// Links may lead in circles: each folder is entered once.
+void UserScan::enter(const Place &parent, const ListedFolder &folder)
+{
+    if (!mEntered.emplace(folder.device, folder.number).second)
+        return;
+    const std::string path =
+        parent.folder.empty() ? folder.name : parent.folder + "/" + folder.name;
+    const auto listing = listFolder(pathOf(path));
+    if (listing) {
+        walk({path, parent.isPrivate || listing->isMarkedPrivate}, *listing);
+        return;
+    }
+    spdlog::warn("the folder {} cannot be read", validUtf8(pathOf(path)));
+    mUnreadableFolders.insert(path);
+}
+
+void UserScan::compare(const Place &place, const FolderListing &listing)
+{
+    const auto album = mKnownAlbums.find(place.folder);
+    const bool isKnown = album != mKnownAlbums.end();
+    if (!isKnown && listing.files.empty())
+        return;
+    std::map<std::string, KnownFile> known;
+    if (isKnown) {
+        auto reader = mDatabase.read();
+        known = knownFiles(reader, album->second.id);
+    }
+    FolderChanges changes{stateOf(place), {}, {}, {}};
+    for (const ListedFile &file : listing.files) {
+        if (mStop)
+            return;
+        const auto entry = known.find(file.name);
+        compareFile(changes, place.folder, file, entry == known.end() ? nullptr : &entry->second);
+        if (entry != known.end())
+            known.erase(entry);
+        if (changes.found.size() >= filesPerBatch)
+            add(std::exchange(changes, {stateOf(place), {}, {}, {}}), true);
+    }
+    for (const auto &[name, file] : known) {
+        if (file.isPresent)
+            changes.gone.push_back(file.id);
+    }
+    add(std::move(changes), isKnown && album->second.isPrivate != place.isPrivate);
+}
+
+void UserScan::compareFile(FolderChanges &changes, const std::string &folder,
+                           const ListedFile &file, const KnownFile *known)
+{
+    ++mTotals.files;
+    if (!known || known->size != file.size || known->changed != file.changed)
+        readFile(changes, folder, file);
+    else if (!known->isPresent)
+        changes.back.push_back(known->id);
+}
+
+void UserScan::readFile(FolderChanges &changes, const std::string &folder, const ListedFile &file)
+{
+    FoundFile found{file.name, file.size, file.changed, {}, {}};
+    auto metadata = readPhotoMetadata(pathOf(folder) + "/" + file.name, &found.error);
+    if (metadata)
+        found.metadata = std::move(*metadata);
+    else if (found.error.empty())
+        found.error = "not a photo that can be read";
+    ++mTotals.read;
+    mTotals.unreadable += metadata ? 0 : 1;
+    changes.found.push_back(std::move(found));
+}
+
+void UserScan::dropUnseenAlbums()
+{
+    for (const auto &[folder, album] : mKnownAlbums) {
+        if (mSeenFolders.count(folder) > 0 || isBelowUnreadable(folder))
+            continue;
+        FolderChanges changes{stateOf({folder, album.isPrivate}), {}, {}, {}};
+        auto reader = mDatabase.read();
+        for (const auto &[name, file] : knownFiles(reader, album.id)) {
+            if (file.isPresent)
+                changes.gone.push_back(file.id);
+        }
+        add(std::move(changes), false);
+    }
+}
+
+bool UserScan::isBelowUnreadable(const std::string &folder) const
+{
+    for (const std::string &unreadable : mUnreadableFolders) {
+        if (folder == unreadable || folder.rfind(unreadable + "/", 0) == 0)
+            return true;
+    }
+    return false;
+}
+
+FolderState UserScan::stateOf(const Place &place) const
+{
+    const std::string &named = place.folder.empty() ? mUser.photos : place.folder;
+    return {mUser.id, place.folder, validUtf8(lastPiece(named)), place.isPrivate};
+}
+
+std::string UserScan::pathOf(const std::string &folder) const
+{
+    return folder.empty() ? mUser.photos : mUser.photos + "/" + folder;
+}
+
+void UserScan::add(FolderChanges changes, bool isChanged)
+{
+    if (changes.isEmpty() && !isChanged)
+        return;
+    mTotals.gone += changes.gone.size();
+    mBatchFiles += changes.found.size() + changes.gone.size() + changes.back.size();
+    mBatch.push_back(std::move(changes));
+    if (mBatchFiles >= filesPerBatch || std::chrono::steady_clock::now() - mLastWrite > batchTime)
+        write();
+}
+
+void UserScan::write()
+{
+    if (!mBatch.empty())
+        writeChanges(mDatabase, mBatch);
+    mBatch.clear();
+    mBatchFiles = 0;
+    mLastWrite = std::chrono::steady_clock::now();
+}

@@ -1,0 +1,149 @@
+#include "service.h"
+
+#include "base/secrets.h"
+#include "feeds/feeds.h"
+#include "feeds/photopictures.h"
+#include "feeds/tokenendpoint.h"
+#include "http/httpserver.h"
+#include "index/database.h"
+#include "pictures/thumbnailstore.h"
+#include "scan/scanner.h"
+
+#include <fcntl.h>
+#include <sys/file.h>
+#include <unistd.h>
+
+#include <filesystem>
+
+namespace {
+
+bool makeDataFolder(const std::string &folder, std::string *error)
+{
+    std::error_code code;
+    const bool isNew = std::filesystem::create_directories(folder, code);
+    if (code || !std::filesystem::is_directory(folder, code)) {
+        *error = "cannot make the folder " + folder;
+        return false;
+    }
+    if (isNew)
+        std::filesystem::permissions(folder, std::filesystem::perms::owner_all, code);
+    return true;
+}
+
+} // namespace
+
+// In the order in which they are made; they go the other way round.
+struct Service::Parts
+{
+    ~Parts()
+    {
+        server.reset(); // before what its requests use
+        if (lock >= 0)
+            ::close(lock);
+    }
+
+    bool takeLock(const ServiceSettings &settings, std::string *error);
+    bool prepareTls(const ServiceSettings &settings, std::string *error);
+    bool startServer(const ServiceSettings &settings, std::string *error);
+
+    int lock = -1;
+    std::unique_ptr<Database> database;
+    SslContext context;
+    std::unique_ptr<ThumbnailStore> thumbnails;
+    std::unique_ptr<Feeds> feeds;
+    std::unique_ptr<PhotoPictures> pictures;
+    std::unique_ptr<TokenEndpoint> tokens;
+    Router router;
+    std::unique_ptr<HttpServer> server;
+    std::unique_ptr<Scanner> scanner;
+};
+
+// Two services on one data folder would scan and drop thumbnails against each other.
+bool Service::Parts::takeLock(const ServiceSettings &settings, std::string *error)
+{
+    const std::string file = settings.data + "/service.lock";
+    lock = ::open(file.c_str(), O_RDWR | O_CREAT | O_CLOEXEC, 0600);
+    if (lock >= 0 && ::flock(lock, LOCK_EX | LOCK_NB) == 0)
+        return true;
+    *error = "another service is running with the data folder " + settings.data;
+    return false;
+}
+
+bool Service::Parts::prepareTls(const ServiceSettings &settings, std::string *error)
+{
+    if (!settings.withTls)
+        return true;
+    const std::string own = settings.data + "/certificate.pem";
+    if (settings.certificate.empty() && !ensureSelfSignedCertificate(own, error))
+        return false;
+    const std::string &certificate = settings.certificate.empty() ? own : settings.certificate;
+    context = makeSslContext(certificate, settings.key.empty() ? certificate : settings.key, error);
+    return context != nullptr;
+}
+
+bool Service::Parts::startServer(const ServiceSettings &settings, std::string *error)
+{
+    thumbnails =
+        std::make_unique<ThumbnailStore>(settings.data + "/thumbnails", settings.thumbnailBytes);
+    feeds = std::make_unique<Feeds>(*database, settings.withTls ? "https" : "http");
+    pictures = std::make_unique<PhotoPictures>(*database, *thumbnails);
+    tokens = std::make_unique<TokenEndpoint>(*database);
+    feeds->addRoutes(router);
+    pictures->addRoutes(router);
+    tokens->addRoutes(router);
+    HttpServer::Settings http;
+    http.address = settings.listen;
+    http.port = settings.port;
+    http.threads = settings.threads;
+    http.context = context.get();
+    server = std::make_unique<HttpServer>(router, http);
+    if (server->start())
+        return true;
+    *error = "cannot listen on " + settings.listen + ", port " + std::to_string(settings.port);
+    return false;
+}
+
+std::unique_ptr<Service> Service::start(const ServiceSettings &settings, std::string *error)
+{
+    auto parts = std::make_unique<Parts>();
+    parts->database = openIndex(settings.data, error);
+    if (!parts->database || !parts->takeLock(settings, error) ||
+        !parts->prepareTls(settings, error) || !parts->startServer(settings, error))
+        return nullptr;
+    parts->scanner = std::make_unique<Scanner>(*parts->database, settings.scanPause);
+    parts->scanner->start();
+    return std::unique_ptr<Service>(new Service(std::move(parts)));
+}
+
+Service::Service(std::unique_ptr<Parts> parts)
+    : mParts(std::move(parts))
+{
+}
+
+Service::~Service() = default;
+
+int Service::port() const
+{
+    return mParts->server->port();
+}
+
+Database &Service::database()
+{
+    return *mParts->database;
+}
+
+Scanner &Service::scanner()
+{
+    return *mParts->scanner;
+}
+
+std::unique_ptr<Database> openIndex(const std::string &dataFolder, std::string *error)
+{
+    if (!initialiseSecrets()) {
+        *error = "there is no source of randomness";
+        return nullptr;
+    }
+    if (!makeDataFolder(dataFolder, error))
+        return nullptr;
+    return Database::open(dataFolder + "/index.db", error);
+}

@@ -1,0 +1,46 @@
+#pragma once
+
+#include <chrono>
+#include <cstdint>
+#include <memory>
+#include <string>
+
+class Database;
+class Scanner;
+
+// The running service: index, scan and server. Everything it keeps is in its data folder.
+struct ServiceSettings
+{
+    std::string data;
+    std::string listen = "127.0.0.1";
+    int port = 0; // 0: a free one
+    bool withTls = true;
+    std::string certificate; // empty: self-signed, made once
+    std::string key;         // empty: in the certificate's file
+    int threads = 16;
+    std::chrono::seconds scanPause{300};
+    std::int64_t thumbnailBytes = std::int64_t(8) << 30;
+};
+
+class Service
+{
+public:
+    // Starts everything; null and the reason in `error` when that is not possible.
+    static std::unique_ptr<Service> start(const ServiceSettings &settings, std::string *error);
+    // Stops everything.
+    ~Service();
+
+    int port() const;
+    Database &database();
+    Scanner &scanner();
+
+private:
+    struct Parts;
+    explicit Service(std::unique_ptr<Parts> parts);
+
+    std::unique_ptr<Parts> mParts;
+};
+
+// The index below a data folder, which is made when missing; null and the reason in `error` when it
+// cannot be opened.
+std::unique_ptr<Database> openIndex(const std::string &dataFolder, std::string *error);

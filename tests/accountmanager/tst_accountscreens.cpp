@@ -1,0 +1,216 @@
+#include "accountmanager/accountfile.h"
+#include "accountmanager/accountitem.h"
+#include "accountmanager/accountmanager.h"
+#include "accountmanager/accountmanagerhelper.h"
+#include "accountmanager/accountswidget.h"
+#include "accountmanager/accounttexts.h"
+#include "accountmanager/loginpage.h"
+#include "accountmanager/waitwidget.h"
+#include "common/ui/remotekeys.h"
+#include "res/resources.h"
+#include "support/logcapture.h"
+
+#include <QAbstractButton>
+#include <QLabel>
+#include <QtTest>
+
+#include <memory>
+
+using Keys = QList<int>;
+
+namespace {
+
+void press(const Keys &keys)
+{
+    for (int key : keys) {
+        QKeyEvent event(QEvent::KeyPress, key, Qt::NoModifier);
+        QApplication::sendEvent(QApplication::focusWidget(), &event);
+    }
+}
+
+// What has the focus: an account's address or a button's text.
+QString focus()
+{
+    if (const auto *item = qobject_cast<AccountItem *>(QApplication::focusWidget()))
+        return item->mail();
+    const auto *button = qobject_cast<QAbstractButton *>(QApplication::focusWidget());
+    return button ? button->text() : QString();
+}
+
+} // namespace
+
+class TestAccountScreens : public QObject
+{
+    Q_OBJECT
+
+    std::unique_ptr<AccountFile> mFile;
+    std::unique_ptr<AccountManager> mScreen;
+
+    // Stores accounts "0", "1", ..., the one with that number used last, and shows the screen.
+    void show(int accounts, int last = 0)
+    {
+        {
+            const AccountManagerHelper::Session session;
+            AccountManagerHelper::setRefreshToken("r");
+            AccountManagerHelper::setUserName("Name");
+            for (int i = 0; i < accounts; ++i)
+                AccountManagerHelper::addAccount(QString::number(i), "1234", "token");
+            AccountManagerHelper::login(QString::number(last), "1234");
+            AccountManagerHelper::logout();
+        }
+        mScreen = std::make_unique<AccountManager>();
+        mScreen->resize(1280, 720);
+        mScreen->show();
+        QVERIFY(QTest::qWaitForWindowActive(mScreen.get()));
+    }
+    QString label(const QString &name) const { return mScreen->findChild<QLabel *>(name)->text(); }
+
+private slots:
+    void initTestCase() { initResources(); }
+    void init() { mFile = std::make_unique<AccountFile>(); }
+    void cleanup() { mScreen.reset(); }
+
+    void focusMoves_data()
+    {
+        const int up = DEVICE_UP_KEY, down = DEVICE_DOWN_KEY;
+        const int left = DEVICE_LEFT_KEY, right = DEVICE_RIGHT_KEY;
+        QTest::addColumn<int>("accounts");
+        QTest::addColumn<Keys>("keys");
+        QTest::addColumn<QString>("focused");
+        QTest::newRow("start, last used") << 3 << Keys{} << "2";
+        QTest::newRow("down") << 3 << Keys{down} << "0";
+        QTest::newRow("last row") << 3 << Keys{down, down, down} << "1";
+        QTest::newRow("first row") << 3 << Keys{up, left} << "2";
+        QTest::newRow("right") << 3 << Keys{right} << "New";
+        QTest::newRow("to Exit") << 3 << Keys{right, down, down} << "Exit";
+        QTest::newRow("back to New") << 3 << Keys{right, down, up, up, right} << "New";
+        QTest::newRow("back to the row") << 3 << Keys{down, right, down, left} << "0";
+        QTest::newRow("one account") << 1 << Keys{down, right, left} << "0";
+        QTest::newRow("none") << 0 << Keys{left, up, right, DEVICE_PAGEDOWN_KEY} << "New";
+        QTest::newRow("none, Exit") << 0 << Keys{down} << "Exit";
+    }
+
+    void focusMoves()
+    {
+        QFETCH(int, accounts);
+        QFETCH(Keys, keys);
+        show(accounts, accounts - 1);
+        press(keys);
+        QTEST(focus(), "focused");
+        QCOMPARE(mScreen->findChild<LoginPage *>()->hasAccount("2"), accounts == 3);
+        // The page comes back with the focus where it was.
+        const QString before = focus();
+        mScreen->hide();
+        mScreen->show();
+        QApplication::setActiveWindow(mScreen.get());
+        QCOMPARE(focus(), before);
+    }
+
+    void manyAccounts()
+    {
+        show(50);
+        const auto *list = mScreen->findChild<AccountsWidget *>();
+        const auto wholeRowIsSeen = [list] {
+            QWidget *row = QApplication::focusWidget();
+            const QRect place(row->mapTo(list->viewport(), QPoint()), row->size());
+            return list->viewport()->rect().contains(place);
+        };
+        for (int key : {DEVICE_PAGEDOWN_KEY, DEVICE_DOWN_KEY, DEVICE_DOWN_KEY, DEVICE_PAGEUP_KEY}) {
+            press({key});
+            QVERIFY(wholeRowIsSeen());
+        }
+        for (int i = 0; i < 12; ++i)
+            press({DEVICE_PAGEDOWN_KEY});
+        QCOMPARE(focus(), QString("9")); // the last in the order of the file
+        // A failure reads the list again and leaves the reader where he was.
+        OtherConnection(mFile->path()).rows("UPDATE orvala1 SET token=''");
+        press({DEVICE_SELECT_KEY});
+        QCOMPARE(focus(), QString("9"));
+        QVERIFY(wholeRowIsSeen());
+    }
+
+    void signIn()
+    {
+        show(2);
+        QSignalSpy shown(mScreen.get(), &AccountManager::showNewWidget);
+        QSignalSpy finished(mScreen.get(), &AccountManager::loginFinished);
+        press({DEVICE_DOWN_KEY, DEVICE_SELECT_KEY});
+        QCOMPARE(finished.size(), 1);
+        QCOMPARE(AccountManagerHelper::getAccessToken(), QString("token"));
+        QCOMPARE(AccountManagerHelper::getUserName(), QString("Name"));
+        const OtherConnection other(mFile->path());
+        QCOMPARE(other.rows("SELECT usermail FROM orvala1 WHERE login='true'"), QStringList("1"));
+
+        // The main widget makes it one of its pages; it still ends with the account screen.
+        QCOMPARE(shown.size(), 1);
+        const QPointer<QWidget> wait = shown.first().first().value<QWidget *>();
+        QVERIFY(qobject_cast<WaitWidget *>(wait));
+        wait->setParent(nullptr);
+        mScreen.reset();
+        QTRY_VERIFY(!wait);
+    }
+
+    void failedSignIn_data()
+    {
+        using Text = AccountTexts::Text;
+        QTest::addColumn<QString>("fault");
+        QTest::addColumn<int>("text");
+        QTest::newRow("row gone") << "DELETE FROM orvala1 WHERE login='true'"
+                                  << int(Text::AccountGone);
+        QTest::newRow("no token") << "UPDATE orvala1 SET token=NULL" << int(Text::SignInFailed);
+        QTest::newRow("no refresh") << "UPDATE orvala1 SET refresh=''" << int(Text::SignInFailed);
+        QTest::newRow("locked") << "BEGIN EXCLUSIVE" << int(Text::SignInFailed);
+        QTest::newRow("no table") << "DROP TABLE orvala1" << int(Text::SignInFailed);
+    }
+
+    void failedSignIn()
+    {
+        QFETCH(QString, fault);
+        QFETCH(int, text);
+        show(2);
+        QSignalSpy finished(mScreen.get(), &AccountManager::loginFinished);
+        const OtherConnection other(mFile->path());
+        other.rows(fault);
+        press({DEVICE_SELECT_KEY});
+        QCOMPARE(finished.size(), 0);
+        QCOMPARE(label("message"), AccountTexts::text(text));
+        QCOMPARE(focus(), QString(text == AccountTexts::AccountGone ? "1" : "0"));
+        press({DEVICE_RIGHT_KEY});
+        QCOMPARE(focus(), QString("New"));
+        QVERIFY(label("message").isEmpty());
+    }
+
+    void newAndExit()
+    {
+        LogCapture log;
+        show(0);
+        press({DEVICE_SELECT_KEY});
+        QVERIFY(log.contains("has foucus New, emit oauthStarted()"));
+        QVERIFY(log.contains("enter AccountManager::startAuthorize()"));
+        QCOMPARE(label("message"), QString("Please register on PC and try again later."));
+        press({DEVICE_RETURN_KEY});
+        QCOMPARE(log.lines().count("Return key has been Pressed"), 1);
+        press({DEVICE_DOWN_KEY, DEVICE_SELECT_KEY});
+        QCOMPARE(log.lines().count("Return key has been Pressed"), 2);
+    }
+
+    void unreadableAccounts()
+    {
+        mFile->write("", QByteArray(200, 'x'));
+        show(0);
+        QCOMPARE(label("hint"), AccountTexts::text(AccountTexts::AccountsUnreadable));
+        QCOMPARE(focus(), QString("New"));
+    }
+
+    void rowTexts()
+    {
+        QCOMPARE(AccountItem::initialOf("  \u00fcnal"), QString("\u00dc"));
+        QCOMPARE(AccountItem::initialOf("\U0001F600 smile"), QString("\U0001F600"));
+        QCOMPARE(AccountItem::initialOf(" \n"), QString("?"));
+        AccountItem item(QString("<table><tr><td>").repeated(5000), "<img src=x>\n\u202e");
+        QVERIFY(!item.grab().isNull());
+    }
+};
+
+QTEST_MAIN(TestAccountScreens)
+#include "tst_accountscreens.moc"

@@ -1,0 +1,221 @@
+#include "app/mainapplication.h"
+#include "app/mainwidget.h"
+#include "common/ui/qpopupdialog.h"
+#include "common/ui/remotekeys.h"
+#include "network/systemconfig.h"
+#include "platform/devicestate.h"
+#include "platform/ipc.h"
+#include "platform/ipcthread.h"
+#include "support/logcapture.h"
+
+#include <QKeyEvent>
+#include <QLabel>
+#include <QSettings>
+#include <QSignalSpy>
+#include <QStackedWidget>
+#include <QTemporaryDir>
+#include <QTest>
+#include <QTimer>
+
+#include <atomic>
+#include <memory>
+#include <thread>
+
+namespace {
+
+// Notes the keys that reach it.
+class KeyWidget : public QWidget
+{
+public:
+    using QWidget::QWidget;
+    QList<int> keys;
+
+protected:
+    void keyPressEvent(QKeyEvent *event) override { keys.append(event->key()); }
+};
+
+bool press(QObject *receiver, int key)
+{
+    QKeyEvent event(QEvent::KeyPress, key, Qt::NoModifier);
+    return QCoreApplication::sendEvent(receiver, &event);
+}
+
+int requests = 0; // exits that the platform granted
+
+} // namespace
+
+class TestApp : public QObject
+{
+    Q_OBJECT
+
+private slots:
+    void initTestCase();
+    void init();
+    void cleanup();
+    void takesTheExitKeyOut();
+    void routesKeysToTheDialog();
+    void seesAKeyOfAWindowOnce();
+    void addsAPageOnce();
+    void leavesOnlyForTheShell();
+    void tellsOfTheCable();
+    void replacesTheStatusDialog();
+
+private:
+    QList<QPopupDialog *> dialogs() const { return mMain->findChildren<QPopupDialog *>(); }
+
+    QTemporaryDir mFolder;
+    std::unique_ptr<MainWidget> mMain;
+};
+
+void TestApp::initTestCase()
+{
+    QSettings settings(mFolder.filePath("config.ini"), QSettings::IniFormat);
+    settings.setValue("DBPath/DBPath", mFolder.filePath("accounts.db"));
+    settings.sync();
+    SystemConfig::setConfigFile(settings.fileName());
+    SystemConfig::mScreen_Width = 1280;
+    SystemConfig::mScreen_Height = 720;
+    netcommon::Ipc::setSocketPath(mFolder.filePath("no-shell").toStdString());
+    connect(netcommon::IpcThread::getInstance(), &netcommon::IpcThread::signalExit, this,
+            [] { ++requests; });
+    netcommon::IpcThread::getInstance()->start();
+}
+
+void TestApp::init()
+{
+    mMain = std::make_unique<MainWidget>();
+    // Not told to leave by itself here: a test says when.
+    disconnect(netcommon::IpcThread::getInstance(), nullptr, mMain.get(), nullptr);
+    mMain->resize(1280, 720);
+    mMain->show();
+    requests = 0;
+}
+
+void TestApp::cleanup()
+{
+    mMain.reset();
+}
+
+void TestApp::takesTheExitKeyOut()
+{
+    KeyWidget receiver, dialog;
+    QVERIFY(press(&receiver, DEVICE_EXIT_KEY));
+    QTRY_COMPARE(requests, 1);
+    MainApplication::setDialog(&dialog, true);
+    QVERIFY(press(&receiver, DEVICE_EXIT_KEY));
+    MainApplication::setDialog(nullptr, false);
+    QTRY_COMPARE(requests, 2);
+    QVERIFY(receiver.keys.isEmpty());
+    QVERIFY(dialog.keys.isEmpty());
+}
+
+void TestApp::routesKeysToTheDialog()
+{
+    KeyWidget receiver;
+    auto dialog = std::make_unique<KeyWidget>();
+    QVERIFY(!press(&receiver, DEVICE_UP_KEY)); // taken, and yet reported as not
+    MainApplication::setDialog(dialog.get(), true);
+    QVERIFY(press(&receiver, DEVICE_DOWN_KEY));
+    QVERIFY(press(dialog.get(), DEVICE_LEFT_KEY));
+    MainApplication::setDialog(dialog.get(), false);
+    press(&receiver, DEVICE_RIGHT_KEY);
+    QCOMPARE(dialog->keys, QList<int>({DEVICE_DOWN_KEY, DEVICE_LEFT_KEY}));
+    QCOMPARE(receiver.keys, QList<int>({DEVICE_UP_KEY, DEVICE_RIGHT_KEY}));
+}
+
+void TestApp::seesAKeyOfAWindowOnce()
+{
+    KeyWidget window;
+    window.show();
+    QVERIFY(QTest::qWaitForWindowActive(&window));
+    const LogCapture log;
+    QTest::keyPress(window.windowHandle(), Qt::Key(DEVICE_UP_KEY));
+    QTRY_COMPARE(window.keys, QList<int>({DEVICE_UP_KEY}));
+    QCOMPARE(log.lines().count("MainApplication: keyEvent->key()=1000013"), 1);
+    QCOMPARE(log.lines().count("MainApplication: DEVICE_EXIT_KEY=1020001"), 1);
+}
+
+void TestApp::addsAPageOnce()
+{
+    auto *stack = mMain->findChild<QStackedWidget *>();
+    QCOMPARE(stack->count(), 1);
+    auto *page = new QWidget;
+    const LogCapture log;
+    mMain->switchWidget(page);
+    QCOMPARE(stack->currentWidget(), page);
+    mMain->switchWidget(stack->widget(0));
+    mMain->switchWidget(page);
+    QCOMPARE(stack->currentWidget(), page);
+    QCOMPARE(stack->count(), 2);
+    QCOMPARE(log.lines().count("MainWidget switchWidget!!"), 3);
+    QCOMPARE(log.lines().count("mStackedWidget addWidget!!"), 1);
+}
+
+void TestApp::leavesOnlyForTheShell()
+{
+    disconnect(mMain.get(), &MainWidget::signalResponseParent, nullptr, nullptr);
+    QSignalSpy answers(mMain.get(), &MainWidget::signalResponseParent);
+    QEventLoop loop;
+    bool stayed = false;
+    QTimer::singleShot(0, mMain.get(), [&] {
+        mMain->exitOrvala(false, true);
+        QTimer::singleShot(0, mMain.get(), [&] {
+            stayed = true;
+            mMain->exitOrvala(true, false);
+        });
+    });
+    QCOMPARE(loop.exec(), 0);
+    QVERIFY(stayed);
+    QCOMPARE(answers.size(), 1);
+    QCOMPARE(answers.first().first().toInt(), 2);
+}
+
+void TestApp::tellsOfTheCable()
+{
+    char name[] = "eth0";
+    const LogCapture log;
+    for (int event : {1, 0, 1, 2}) {
+        std::thread([&name, event] {
+            MainWidget::NetworkStatusNotify(name, _NETWORK_EVENT_T(event));
+        }).join();
+        QTRY_COMPARE(NetworkCableStatus, event != 1);
+    }
+    QCOMPARE(log.lines().count("Notifycation: Network cable eth0 has plug out.\n"), 2);
+    QCOMPARE(log.lines().count("Notifycation: Network cable eth0 has plug in.\n"), 2);
+}
+
+void TestApp::replacesTheStatusDialog()
+{
+    const auto shows = [this](const QString &text) {
+        for (const QLabel *label : dialogs().first()->findChildren<QLabel *>()) {
+            if (label->text() == text)
+                return true;
+        }
+        return false;
+    };
+    mMain->handleCableStatusChange(false);
+    QVERIFY(shows(QStringLiteral("Error")));
+    mMain->handleCableStatusChange(true);
+    QCOMPARE(dialogs().size(), 1);
+    QVERIFY(shows(QStringLiteral("Notification")));
+    QVERIFY(dialogs().first()->isVisible());
+
+    KeyWidget below(mMain.get());
+    press(&below, DEVICE_LEFT_KEY);
+    QCOMPARE(dialogs().size(), 1);
+    press(&below, DEVICE_SELECT_KEY);
+    QVERIFY(dialogs().isEmpty());
+    press(&below, DEVICE_RIGHT_KEY);
+    QCOMPARE(below.keys, QList<int>({DEVICE_RIGHT_KEY}));
+}
+
+int main(int argc, char *argv[])
+{
+    MainApplication application(argc, argv);
+    TestApp test;
+    const int result = QTest::qExec(&test, argc, argv);
+    delete netcommon::IpcThread::getInstance();
+    delete netcommon::Ipc::getInstance();
+    return result;
+}
+#include "tst_app.moc"

@@ -1,0 +1,157 @@
+#include "picturefiles.h"
+#include "pictures/thumbnailstore.h"
+#include "pictures/wholefile.h"
+
+#include <filesystem>
+#include <gtest/gtest.h>
+#include <thread>
+#include <vector>
+
+namespace fs = std::filesystem;
+
+namespace {
+
+constexpr std::int64_t plenty = 100'000'000;
+class ThumbnailStoreTest : public testing::Test
+{
+protected:
+    TemporaryFolder folder;
+    const std::string photo = folder.file("photo.jpg");
+    const std::string cache = folder.file("cache");
+};
+
+TEST_F(ThumbnailStoreTest, TurnsEveryOrientationUpright)
+{
+    const char *const upright[] = {"rgbw", "grwb", "wbgr", "bwrg", "rbgw", "brwg", "wgbr", "gwrb"};
+    ThumbnailStore store(cache, plenty);
+    for (int orientation = 1; orientation <= 8; ++orientation)
+        for (const int width : {0, 60}) {
+            const bool swaps = orientation > 4;
+            writePicture(photo, swaps ? 80 : 120, swaps ? 120 : 80, orientation);
+            const auto result = store.picture(photo, std::to_string(orientation), width);
+            ASSERT_TRUE(result.ok()) << result.error;
+            const Decoded shown = decode(result.bytes);
+            EXPECT_EQ(shown.width, width ? 60 : 120) << orientation;
+            EXPECT_EQ(shown.height, width ? 40 : 80) << orientation;
+            EXPECT_EQ(shown.quarters, upright[orientation - 1]) << orientation << " at " << width;
+            EXPECT_FALSE(shown.hasMetadata && width) << orientation;
+        }
+}
+
+TEST_F(ThumbnailStoreTest, MakesTheWidthAskedForAndNeverEnlarges)
+{
+    writePicture(photo, 300, 600);
+    ThumbnailStore store(cache, plenty);
+    const std::vector<std::pair<int, int>> cases = {{-5, 1},    {1, 1},      {97, 97},
+                                                    {300, 300}, {2000, 300}, {100000, 300}};
+    for (const auto &[asked, width] : cases)
+        EXPECT_EQ(decode(store.picture(photo, "a", asked).bytes).width, width) << asked;
+    EXPECT_EQ(store.picture(photo, "a", 0).bytes, readWholeFile(photo));
+}
+
+TEST_F(ThumbnailStoreTest, MakesJpegOfEveryFormat)
+{
+    ThumbnailStore store(cache, plenty);
+    for (const char *format : {"png", "gif", "webp", "heic"}) {
+        const std::string path = folder.file(std::string("picture.") + format);
+        writePicture(path, 120, 80);
+        const auto result = store.picture(path, format, 60);
+        EXPECT_EQ(result.error, "") << format;
+        EXPECT_EQ(result.mimeType, "image/jpeg");
+        EXPECT_EQ(decode(result.bytes).width, 60) << format;
+    }
+}
+
+TEST_F(ThumbnailStoreTest, KeepsWhatItMadeAndMakesAgainWhatWasDamaged)
+{
+    writePicture(photo, 120, 80);
+    const std::string made = ThumbnailStore(cache, plenty).picture(photo, "a", 60).bytes;
+    fs::rename(photo, photo + ".away");
+    ThumbnailStore store(cache, plenty);
+    EXPECT_EQ(store.picture(photo, "a", 60).bytes, made);
+    EXPECT_FALSE(store.picture(photo, "a", 61).ok());
+    EXPECT_FALSE(store.picture(photo, "b", 60).ok());
+    fs::rename(photo + ".away", photo);
+    for (const fs::directory_entry &entry : fs::recursive_directory_iterator(cache))
+        if (entry.is_regular_file())
+            fs::resize_file(entry.path(), entry.file_size() / 2);
+    EXPECT_EQ(store.picture(photo, "a", 60).bytes, made);
+}
+
+TEST_F(ThumbnailStoreTest, AnswersManyThreadsAtOnce)
+{
+    writePicture(photo, 1200, 800);
+    ThumbnailStore store(cache, plenty);
+    std::vector<std::string> answers(24);
+    std::vector<std::thread> threads;
+    for (std::size_t i = 0; i < answers.size(); ++i)
+        threads.emplace_back(
+            [&, i] { answers[i] = store.picture(photo, "a", i % 3 == 0 ? 640 : 320).bytes; });
+    for (std::thread &thread : threads)
+        thread.join();
+    for (std::size_t i = 0; i < answers.size(); ++i)
+        EXPECT_EQ(answers[i], answers[i % 3 == 0 ? 0 : 1]);
+    EXPECT_EQ(decode(answers[0]).width, 640);
+    EXPECT_EQ(contentsOf(cache).files, 2);
+}
+
+TEST_F(ThumbnailStoreTest, AnswersBadPhotosWithAnError)
+{
+    writePicture(photo, 1200, 800);
+    const std::string whole = readWholeFile(photo);
+    ThumbnailStore store(cache, plenty);
+    writeBytes(photo, whole.substr(0, whole.size() / 2));
+    EXPECT_EQ(store.picture(photo, "cut", 320).error, "VipsJpeg: Premature end of input file");
+    writeBytes(photo, std::string(5000, '\xff'));
+    EXPECT_FALSE(store.picture(photo, "garbage", 320).ok());
+    EXPECT_FALSE(store.picture(folder.file(""), "folder", 320).ok());
+    EXPECT_EQ(contentsOf(cache).files, 0);
+}
+
+TEST_F(ThumbnailStoreTest, AnswersWithoutAFolder)
+{
+    writePicture(photo, 120, 80);
+    writeBytes(cache, "a file where the folder should be");
+    ThumbnailStore store(cache, plenty);
+    for (int i = 0; i < 2; ++i)
+        EXPECT_EQ(decode(store.picture(photo, "a", 60).bytes).width, 60);
+    EXPECT_EQ(readWholeFile(cache), "a file where the folder should be");
+}
+
+TEST_F(ThumbnailStoreTest, DropsTheLongestUnused)
+{
+    writePicture(photo, 1200, 800);
+    std::int64_t size = 0;
+    {
+        ThumbnailStore store(cache, plenty);
+        for (int width = 400; width < 420; ++width)
+            size += static_cast<std::int64_t>(store.picture(photo, "a", width).bytes.size());
+        store.picture(photo, "a", 400); // used again
+    }
+    { // counts what is there, and tidies before it goes
+        ThumbnailStore store(cache, size / 2);
+    }
+    EXPECT_LE(contentsOf(cache).bytes, size / 2);
+    EXPECT_GT(contentsOf(cache).bytes, size / 4);
+    fs::remove(photo);
+    ThumbnailStore store(cache, size / 2);
+    EXPECT_TRUE(store.picture(photo, "a", 400).ok());
+    EXPECT_TRUE(store.picture(photo, "a", 419).ok());
+    EXPECT_FALSE(store.picture(photo, "a", 401).ok());
+}
+
+TEST_F(ThumbnailStoreTest, StaysBelowItsBoundAndDropsNothingElse)
+{
+    writePicture(photo, 1200, 800);
+    fs::create_directories(cache + "/ab/cd");
+    writeBytes(cache + "/ab/cd/holiday.jpg", std::string(30'000, 'x'));
+    {
+        ThumbnailStore store(cache, 20'000);
+        for (int width = 400; width < 440; ++width)
+            EXPECT_TRUE(store.picture(photo, "a", width).ok());
+    }
+    EXPECT_TRUE(fs::exists(cache + "/ab/cd/holiday.jpg"));
+    EXPECT_LE(contentsOf(cache).bytes, 50'000);
+}
+
+} // namespace

@@ -1,0 +1,267 @@
+#include "support/testservice.h"
+
+#include "index/tokens.h"
+
+#include <gtest/gtest.h>
+
+#include <set>
+
+using Titles = std::vector<std::string>;
+
+namespace {
+
+const char base[] = "/data/feed/api";
+
+class Feeds : public testing::Test, protected TestService
+{
+protected:
+    void SetUp() override
+    {
+        addPhoto("Summer/one.jpg", {{"Exif.Photo.DateTimeOriginal", "2012:03:01 10:00:00"},
+                                    {"Exif.Image.ImageDescription", "A <b>dog</b> & \"cat\" 🐕"},
+                                    {"Iptc.Application2.Keywords", "Dogs"}});
+        addPhoto("Summer/two.jpg", {{"Exif.Photo.DateTimeOriginal", "2013:03:01 10:00:00"}});
+        addPhoto("Winter/three.jpg");
+        start();
+        addUser("ben@orvala.example", "Ben", "ben");
+        writePicture(file("ben/portrait.jpg"), 32, 48);
+        std::filesystem::create_directories(file("ben/Secret"));
+        writePicture(file("ben/Secret/hidden.jpg"), 32, 48);
+        writeBytes(file("ben/Secret/.private"), "");
+        scan();
+    }
+
+    json album() { return feed(albumPath("Summer")); }
+    std::string photoPath(int index) { return pathOf(valueOf(album()["entry"][index], "id")); }
+};
+
+} // namespace
+
+TEST_F(Feeds, albumsCarryWhatTheirRecordsRead)
+{
+    const json list = feed(std::string(base) + "/user/default");
+    EXPECT_EQ(valueOf(list, "gphoto$user"), "1");
+    EXPECT_EQ(titlesOf(list), (Titles{"Winter", "Summer"}));
+    const json summer = list["entry"][1];
+    EXPECT_EQ(valueOf(summer, "published"), "2013-03-01T10:00:00.000Z");
+    EXPECT_EQ(valueOf(summer, "gphoto$numphotos"), "2");
+    EXPECT_EQ(valueOf(summer, "gphoto$user"), "1");
+    EXPECT_EQ(valueOf(summer, "gphoto$nickname"), "Anna");
+    EXPECT_NE(valueOf(summer, "gphoto$id"), "");
+    const json media = summer["media$group"];
+    EXPECT_EQ(statusOf(pathOf(media["media$content"][0]["url"])), 200);
+    EXPECT_EQ(statusOf(pathOf(media["media$thumbnail"][0]["url"])), 200);
+}
+
+TEST_F(Feeds, photosCarryWhatTheirRecordsRead)
+{
+    const json list = album();
+    EXPECT_EQ(titlesOf(list), (Titles{"one", "two"}));
+    const json photo = list["entry"][0];
+    EXPECT_EQ(valueOf(photo, "summary"), "A <b>dog</b> & \"cat\" 🐕");
+    EXPECT_EQ(valueOf(photo, "published"), "2012-03-01T10:00:00.000Z");
+    EXPECT_EQ(valueOf(photo, "gphoto$width"), "48");
+    EXPECT_EQ(valueOf(photo, "gphoto$height"), "32");
+    EXPECT_EQ(valueOf(photo, "gphoto$commentCount"), "0");
+    EXPECT_EQ(valueOf(photo["author"][0], "gphoto$user"), "1");
+    EXPECT_EQ(valueOf(photo["media$group"], "media$keywords"), "Dogs");
+    EXPECT_EQ("/data/feed/api/user/1/albumid/" + valueOf(photo, "gphoto$albumid") + "/photoid/" +
+                  valueOf(photo, "gphoto$id"),
+              photoPath(0));
+    const json thumbnails = photo["media$group"]["media$thumbnail"];
+    ASSERT_EQ(thumbnails.size(), 3u);
+    EXPECT_LE(thumbnails[0]["width"], thumbnails[2]["width"]);
+}
+
+TEST_F(Feeds, aPictureIsFoundAtItsWidth)
+{
+    std::string address = pathOf(album()["entry"][0]["content"]["src"]);
+    EXPECT_EQ(decode(get(address)->body).width, 48);
+    address.insert(address.rfind('/'), "/s24");
+    EXPECT_EQ(decode(get(address)->body).width, 24);
+}
+
+TEST_F(Feeds, featuredPhotosAreAllPublicOnesInAStableOrder)
+{
+    const std::string path = std::string(base) +
+                             "/featured?start-index=1&max-results=2&v=2"
+                             "&prettyprint=true&alt=json&strict=true&kind=photo";
+    const json first = publicFeed(path);
+    EXPECT_EQ(valueOf(first, "openSearch$totalResults"), "4");
+    EXPECT_EQ(valueOf(first, "openSearch$startIndex"), "1");
+    EXPECT_EQ(valueOf(first, "openSearch$itemsPerPage"), "2");
+    Titles titles = titlesOf(first);
+    for (const auto &title :
+         titlesOf(publicFeed(std::string(base) + "/featured?start-index=3&max-results=2")))
+        titles.push_back(title);
+    const std::set<std::string> all(titles.begin(), titles.end());
+    EXPECT_EQ(all, (std::set<std::string>{"one", "two", "three", "portrait"}));
+    EXPECT_EQ(titlesOf(publicFeed(std::string(base) + "/featured")), titles);
+}
+
+TEST_F(Feeds, pagesKeepToTheirLimits)
+{
+    const struct
+    {
+        const char *query;
+        int status;
+        std::size_t entries;
+    } rows[] = {{"start-index=4&max-results=8", 200, 1},
+                {"start-index=5&max-results=8", 200, 0},
+                {"start-index=0&max-results=2", 200, 2},
+                {"start-index=999999999999999999&max-results=999999999999999999", 200, 0},
+                {"max-results=0", 200, 0},
+                {"start-index=-1", 400, 0},
+                {"start-index=1x", 400, 0},
+                {"max-results=", 400, 0},
+                {"max-results=9999999999999999999999", 400, 0}};
+    for (const auto &row : rows) {
+        const auto answer = get(std::string(base) + "/featured?" + row.query);
+        ASSERT_EQ(answer->status, row.status) << row.query;
+        const json document = json::parse(answer->body);
+        if (row.status == 200)
+            EXPECT_EQ(document["feed"]["entry"].size(), row.entries) << row.query;
+        else
+            EXPECT_EQ(document["error"]["code"], row.status);
+    }
+}
+
+TEST_F(Feeds, searchFindsTitlesCaptionsTagsAndAlbumsByTheBeginningsOfWords)
+{
+    const struct
+    {
+        const char *words;
+        Titles titles;
+    } rows[] = {{"dog", {"one"}},         {"DO%20SUM", {"one"}},
+                {"summ", {"two", "one"}}, {"thr", {"three"}},
+                {"winter", {"three"}},    {"hidden", {}},
+                {"secret", {}},           {"", {}},
+                {"%22%20OR%20*", {}},     {"NEAR%28one", {}},
+                {"%F0%9F%90%95", {}},     {"one%00", {"one"}}};
+    for (const auto &row : rows) {
+        const json found =
+            publicFeed(std::string(base) + "/all?q=" + row.words + "&max-results=100&alt=json");
+        EXPECT_EQ(titlesOf(found), row.titles) << row.words;
+        EXPECT_EQ(valueOf(found, "openSearch$totalResults"), std::to_string(row.titles.size()));
+    }
+    EXPECT_EQ(titlesOf(publicFeed(std::string(base) + "/all?q=summ&max-results=100&start-index=2")),
+              (Titles{"one"}));
+}
+
+TEST_F(Feeds, commentsAndTagsOfAPhoto)
+{
+    const std::string text = "a < b & \"c\" <br /> \xF0\x9F\x98\x80";
+    const json document = {
+        {"comments",
+         {{{"photo", "Summer/one.jpg"},
+           {"author", "ben@orvala.example"},
+           {"text", text},
+           {"published", "2012-03-01T10:00:00.000Z"}}}},
+        {"tags",
+         {{{"photo", "Summer/one.jpg"}, {"author", "ben@orvala.example"}, {"tag", "good boy"}}}}};
+    ASSERT_TRUE(import(document));
+    ASSERT_TRUE(import(document)); // changes nothing
+    const json comments = feed(photoPath(0) + "?kind=comment");
+    ASSERT_EQ(comments["entry"].size(), 1u);
+    const json comment = comments["entry"][0];
+    EXPECT_EQ(valueOf(comment, "content"), text);
+    EXPECT_EQ(valueOf(comment, "published"), "2012-03-01T10:00:00.000Z");
+    EXPECT_EQ(valueOf(comment["author"][0], "gphoto$nickname"), "Ben");
+    EXPECT_EQ(photoPath(0), "/data/feed/api/user/1/albumid/" + valueOf(comment, "gphoto$albumid") +
+                                "/photoid/" + valueOf(comment, "gphoto$photoid"));
+    EXPECT_EQ(titlesOf(feed(photoPath(0) + "?kind=tag")), (Titles{"Dogs", "good boy"}));
+    EXPECT_EQ(valueOf(album()["entry"][0], "gphoto$commentCount"), "1");
+    EXPECT_EQ(titlesOf(publicFeed(std::string(base) + "/all?q=boy")), (Titles{"one"}));
+}
+
+TEST_F(Feeds, contactsAreTheOthers)
+{
+    const json list = feed(std::string(base) + "/user/default/contacts?kind=user");
+    ASSERT_EQ(list["entry"].size(), 1u);
+    EXPECT_EQ(valueOf(list["entry"][0], "gphoto$user"), "2");
+    EXPECT_EQ(valueOf(list["entry"][0], "gphoto$nickname"), "Ben");
+    EXPECT_EQ(statusOf(pathOf(valueOf(list["entry"][0], "gphoto$thumbnail"))), 200);
+}
+
+TEST_F(Feeds, tokensDecideWhoSeesWhat)
+{
+    const std::string ben = token("ben@orvala.example");
+    const json own = publicFeed(std::string(base) + "/user/default?access_token=" + ben);
+    ASSERT_EQ(own["entry"].size(), 2u);
+    std::string secret;
+    for (const json &entry : own["entry"]) {
+        if (valueOf(entry, "gphoto$access") == "private")
+            secret = pathOf(valueOf(entry, "id"));
+    }
+    EXPECT_EQ(titlesOf(publicFeed(secret + "?access_token=" + ben)), (Titles{"hidden"}));
+    const std::string anna = token("anna@orvala.example");
+    const std::string expired = token("anna@orvala.example", 0);
+    const struct
+    {
+        std::string path;
+        int status;
+    } rows[] = {{secret + "?access_token=" + anna, 403},
+                {secret + "/photoid/1?kind=comment&access_token=" + anna, 403},
+                {secret, 401},
+                {secret + "?access_token=" + ben + "x", 401},
+                {std::string(base) + "/user/1?access_token=" + expired, 401},
+                {std::string(base) + "/user/1?access_token=", 401},
+                {std::string(base) + "/user/9?access_token=" + anna, 404},
+                {std::string(base) + "/user/1/albumid/999?access_token=" + anna, 404},
+                {std::string(base) + "/user/1/albumid/x?access_token=" + anna, 404},
+                {photoPath(0) + "9999?kind=tag&access_token=" + anna, 404},
+                {photoPath(0) + "?kind=user&access_token=" + anna, 400},
+                {std::string(base) + "/user/ben@orvala.example?access_token=" + anna, 200}};
+    for (const auto &row : rows)
+        EXPECT_EQ(statusOf(row.path), row.status) << row.path;
+    EXPECT_EQ(titlesOf(publicFeed(std::string(base) + "/user/2?access_token=" + anna)),
+              (Titles{"ben"}));
+    EXPECT_EQ(get(std::string(base) + "/user/1", {{"Authorization", "Bearer " + anna}})->status,
+              200);
+}
+
+TEST_F(Feeds, addressesFollowTheHostThatWasAsked)
+{
+    const std::string local = "http://127.0.0.1:" + std::to_string(service().port());
+    const struct
+    {
+        const char *host;
+        std::string origin;
+    } rows[] = {{"tv.home:8443", "http://tv.home:8443"},
+                {"[::1]:8443", "http://[::1]:8443"},
+                {"evil\"/x", local},
+                {"a b", local}};
+    for (const auto &row : rows) {
+        const auto answer = get(std::string(base) + "/featured", {{"Host", row.host}});
+        const std::string id = valueOf(json::parse(answer->body)["feed"], "id");
+        EXPECT_EQ(id, row.origin + base + "/featured");
+    }
+}
+
+TEST_F(Feeds, aRefreshTokenBuysAccess)
+{
+    httplib::Client client("127.0.0.1", service().port());
+    const std::string known = "client_id=583920174652-abcdefghijklmnopqrstuvwxyz&client_secret="
+                              "Qm7rT2vXk9LpZ4wHs1NdYb8E";
+    const std::string refresh = issueTokens(database(), 1, 60).refresh;
+    const auto post = [&](const std::string &body, const char *type) {
+        return client.Post("/o/oauth2/token", body, type);
+    };
+    const std::string good = known + "&refresh_token=" + refresh + "&grant_type=refresh_token";
+    for (const char *type : {"", "application/x-www-form-urlencoded", "text/plain"}) {
+        const auto answer = post(good, type);
+        ASSERT_EQ(answer->status, 200);
+        const json body = json::parse(answer->body);
+        EXPECT_EQ(body.count("refresh_token"), 0u);
+        EXPECT_GT(body["expires_in"].get<int>(), 0);
+        EXPECT_EQ(statusOf(std::string(base) +
+                           "/user/default?access_token=" + body["access_token"].get<std::string>()),
+                  200);
+    }
+    EXPECT_EQ(json::parse(post(good + "x", "")->body)["error"], "unsupported_grant_type");
+    EXPECT_EQ(json::parse(post("x" + good, "")->body)["error"], "invalid_client");
+    EXPECT_EQ(
+        json::parse(post(known + "&refresh_token=no&grant_type=refresh_token", "")->body)["error"],
+        "invalid_grant");
+    EXPECT_EQ(statusOf(std::string(base) + "/user/default?access_token=" + refresh), 401);
+}

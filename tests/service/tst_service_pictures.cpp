@@ -1,0 +1,87 @@
+#include "support/testservice.h"
+
+#include <gtest/gtest.h>
+
+namespace {
+
+class Pictures : public testing::Test, protected TestService
+{
+protected:
+    void SetUp() override
+    {
+        addPhoto("one.jpg");
+        start();
+        scan();
+        mAddress = pathOf(publicFeed("/data/feed/api/featured")["entry"][0]["content"]["src"]);
+    }
+    std::string sized(const std::string &piece) const
+    {
+        return std::string(mAddress).insert(mAddress.rfind('/'), "/" + piece);
+    }
+
+    std::string mAddress;
+};
+
+} // namespace
+
+TEST_F(Pictures, sizesAreChecked)
+{
+    const struct
+    {
+        const char *piece;
+        int status;
+    } rows[] = {{"s24", 200}, {"s16384", 200}, {"s16385", 404},     {"s0", 404},
+                {"s-1", 404}, {"s", 404},      {"24", 404},         {"s99999999999999999999", 404},
+                {"s2x", 404}, {"..", 404},     {"%2e%2e/s24", 404}, {"s24/s24", 404},
+                {"s%32", 200}};
+    for (const auto &row : rows)
+        EXPECT_EQ(statusOf(sized(row.piece)), row.status) << row.piece;
+}
+
+TEST_F(Pictures, onlyKeysLeadToFiles)
+{
+    const std::string key = mAddress.substr(8, 22);
+    for (const std::string path :
+         {"/photos/../one.jpg", "/photos/%2e%2e/one.jpg", "/photos/..%2f..%2fetc/passwd",
+          "/../../../../etc/passwd", "/photos//one.jpg", "/photos/1/one.jpg", "/photos/%00/one.jpg",
+          "/photos/%25/one.jpg", "/photos/'%20OR%201=1--/one.jpg"})
+        EXPECT_EQ(statusOf(path), 404) << path;
+    // What stands behind the key is only a name.
+    for (const std::string name : {"/..%2f..%2fetc%2fpasswd", "/x", "/"})
+        EXPECT_EQ(decode(get("/photos/" + key + name)->body).width, 48) << name;
+}
+
+TEST_F(Pictures, areNotSentAgainWhileTheyAreTheSame)
+{
+    const auto first = get(sized("s24"));
+    const std::string tag = first->get_header_value("ETag");
+    EXPECT_EQ(first->get_header_value("Content-Type"), "image/jpeg");
+    EXPECT_NE(first->get_header_value("Cache-Control"), "");
+    const auto again = get(sized("s24"), {{"If-None-Match", "\"x\", " + tag}});
+    EXPECT_EQ(again->status, 304);
+    EXPECT_EQ(again->body, "");
+    EXPECT_EQ(get(sized("s16"), {{"If-None-Match", tag}})->status, 200);
+
+    writePicture(photo("one.jpg"), 64, 32);
+    scan();
+    EXPECT_EQ(get(sized("s24"), {{"If-None-Match", tag}})->status, 200);
+    EXPECT_EQ(decode(get(mAddress)->body).width, 64);
+}
+
+TEST_F(Pictures, headTellsWhatGetWouldSend)
+{
+    httplib::Client client("127.0.0.1", service().port());
+    const auto head = client.Head(sized("s24"));
+    ASSERT_EQ(head->status, 200);
+    EXPECT_EQ(head->body, "");
+    EXPECT_EQ(head->get_header_value("Content-Length"),
+              std::to_string(get(sized("s24"))->body.size()));
+}
+
+TEST_F(Pictures, aFileThatVanishedIsNotFound)
+{
+    std::filesystem::remove(photo("one.jpg"));
+    EXPECT_EQ(statusOf(sized("s20")), 404);
+    writeBytes(photo("one.jpg"), "something else");
+    EXPECT_EQ(statusOf(sized("s20")), 415);
+}

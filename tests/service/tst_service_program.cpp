@@ -1,0 +1,204 @@
+#include "support/testservice.h"
+
+#include "index/catalogue.h"
+#include "pictures/wholefile.h"
+
+#include <gtest/gtest.h>
+
+#include <spawn.h>
+#include <sys/wait.h>
+
+#include <array>
+#include <csignal>
+#include <thread>
+
+namespace fs = std::filesystem;
+extern char **environ;
+
+namespace {
+
+using Words = std::vector<std::string>;
+
+// The real program in a process of its own.
+class Process
+{
+public:
+    explicit Process(const Words &arguments)
+    {
+        std::vector<char *> words;
+        for (const std::string &argument : arguments)
+            words.push_back(const_cast<char *>(argument.c_str()));
+        words.push_back(nullptr);
+        posix_spawn(&mId, SERVICE_PROGRAM, nullptr, nullptr, words.data(), environ);
+    }
+    ~Process()
+    {
+        if (mId > 0)
+            end(SIGKILL);
+    }
+    // The wait status.
+    int end(int signal)
+    {
+        ::kill(mId, signal);
+        int status = 0;
+        ::waitpid(mId, &status, 0);
+        mId = 0;
+        return status;
+    }
+
+private:
+    pid_t mId = 0;
+};
+
+struct Output
+{
+    int status;
+    std::string text;
+};
+
+Output run(const std::string &arguments)
+{
+    std::FILE *pipe = ::popen((SERVICE_PROGRAM " " + arguments + " 2>&1").c_str(), "r");
+    Output output;
+    std::array<char, 4096> bytes;
+    for (std::size_t n; (n = std::fread(bytes.data(), 1, bytes.size(), pipe)) > 0;)
+        output.text.append(bytes.data(), n);
+    output.status = WEXITSTATUS(::pclose(pipe));
+    return output;
+}
+
+class Program : public testing::Test
+{
+protected:
+    void SetUp() override { fs::create_directories(mFolder.file("photos/a")); }
+
+    std::string data() const { return mFolder.file("data"); }
+    std::unique_ptr<Process> serve()
+    {
+        const std::string ready = mFolder.file("ready");
+        fs::remove(ready);
+        auto process = std::make_unique<Process>(
+            Words{"orvala-service", "serve", "--http", "--data", data(), "--photos",
+                  mFolder.file("photos"), "--ready-file", ready, "--log-level", "off"});
+        waitFor([&] { return fs::exists(ready); });
+        mPort = fs::exists(ready) ? std::stoi(readWholeFile(ready)) : 0;
+        return process;
+    }
+    std::string total()
+    {
+        httplib::Client client("127.0.0.1", mPort);
+        const auto answer = client.Get("/data/feed/api/featured");
+        if (!answer || answer->status != 200)
+            return "no answer";
+        return valueOf(json::parse(answer->body)["feed"], "openSearch$totalResults");
+    }
+    static bool waitFor(const std::function<bool()> &condition)
+    {
+        const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(30);
+        while (!condition()) {
+            if (std::chrono::steady_clock::now() > end)
+                return false;
+            std::this_thread::yield();
+        }
+        return true;
+    }
+
+    TemporaryFolder mFolder;
+    int mPort = 0;
+};
+
+} // namespace
+
+TEST_F(Program, answersWhileItScansAndStopsWhenAsked)
+{
+    writePicture(mFolder.file("photos/a/one.jpg"), 16, 16);
+    const auto process = serve();
+    EXPECT_TRUE(waitFor([&] { return total() == "1"; }));
+    httplib::Client idle("127.0.0.1", mPort);
+    idle.set_keep_alive(true);
+    EXPECT_TRUE(idle.Get("/data/feed/api/featured"));
+    const auto start = std::chrono::steady_clock::now();
+    EXPECT_EQ(process->end(SIGTERM), 0);
+    EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::seconds(1));
+}
+
+TEST_F(Program, survivesBeingKilledAtAnyMoment)
+{
+    writePicture(mFolder.file("plain.jpg"), 16, 16);
+    for (int i = 0; i < 1500; ++i)
+        fs::copy_file(mFolder.file("plain.jpg"),
+                      mFolder.file("photos/a/" + std::to_string(i) + ".jpg"));
+    for (int round = 0; round < 12; ++round) {
+        auto process = serve();
+        const auto moment =
+            std::chrono::steady_clock::now() + std::chrono::milliseconds(round * 13);
+        waitFor([&] { return std::chrono::steady_clock::now() > moment; });
+        process->end(SIGKILL);
+        SQLite::Database index(data() + "/index.db", SQLite::OPEN_READWRITE);
+        EXPECT_EQ(index.execAndGet("PRAGMA integrity_check").getString(), "ok");
+        // Counts and search texts go with the photos they belong to.
+        EXPECT_EQ(index.execAndGet("SELECT count(*) FROM photos").getInt(),
+                  index.execAndGet("SELECT coalesce(sum(photoCount), 0) FROM albums").getInt());
+        EXPECT_EQ(index.execAndGet("SELECT count(*) FROM photos").getInt(),
+                  index.execAndGet("SELECT count(*) FROM photoSearch").getInt());
+    }
+    const auto process = serve();
+    EXPECT_TRUE(waitFor([&] { return total() == "1500"; }));
+}
+
+TEST_F(Program, aRestartReadsNoPhotoAgain)
+{
+    writePicture(mFolder.file("photos/a/one.jpg"), 16, 16);
+    auto process = serve();
+    ASSERT_TRUE(waitFor([&] { return total() == "1"; }));
+    process->end(SIGTERM);
+    // Same size and time, other bytes: whoever reads it finds no picture.
+    const auto time = fs::last_write_time(mFolder.file("photos/a/one.jpg"));
+    writeBytes(mFolder.file("photos/a/one.jpg"),
+               std::string(fs::file_size(mFolder.file("photos/a/one.jpg")), 'x'));
+    fs::last_write_time(mFolder.file("photos/a/one.jpg"), time);
+    writePicture(mFolder.file("photos/b.jpg"), 16, 16); // found after it, in the next folder
+    process = serve();
+    EXPECT_TRUE(waitFor([&] { return total() == "2"; }));
+}
+
+TEST_F(Program, commandsWorkBesideTheService)
+{
+    const auto process = serve();
+    const std::string inData = " --data " + data();
+    EXPECT_EQ(
+        run("user add ben@orvala.example --name Ben --photos " + mFolder.file("photos") + inData)
+            .status,
+        0);
+    const Output list = run("user list" + inData);
+    EXPECT_NE(list.text.find("family@orvala.example\tFamily"), std::string::npos);
+    EXPECT_NE(list.text.find("2\tben@orvala.example\tBen"), std::string::npos);
+    const json tokens = json::parse(run("user token ben@orvala.example" + inData).text);
+    EXPECT_EQ(tokens["expires_in"], 90 * 24 * 3600);
+    httplib::Client client("127.0.0.1", mPort);
+    const std::string path =
+        "/data/feed/api/user/default?access_token=" + tokens["access_token"].get<std::string>();
+    EXPECT_EQ(client.Get(path)->status, 200);
+    writeBytes(mFolder.file("import.json"),
+               R"({"tags":[{"photo":"a/x.jpg","author":"ben@orvala.example","tag":"t"}]})");
+    EXPECT_NE(run("import " + mFolder.file("import.json") + inData).text.find("1 waiting"),
+              std::string::npos);
+    EXPECT_EQ(run("user remove ben@orvala.example" + inData).status, 0);
+    EXPECT_EQ(client.Get(path)->status, 401);
+}
+
+TEST_F(Program, mistakesAreExplained)
+{
+    for (const char *arguments :
+         {"user remove nobody@orvala.example", "user token nobody@orvala.example",
+          "user add nomail --name X", "user add a@b --name X --photos nowhere-at-all",
+          "import nowhere.json"}) {
+        const Output output = run(std::string(arguments) + " --data " + data());
+        EXPECT_EQ(output.status, 1) << arguments;
+        EXPECT_EQ(output.text.rfind("orvala-service: ", 0), 0u) << output.text;
+    }
+    for (const char *arguments :
+         {"serve", "user add", "user list", "user remove", "user token", "import", "photos"})
+        EXPECT_EQ(run(std::string(arguments) + " --help").status, 0) << arguments;
+    EXPECT_NE(run("serve --port 70000").status, 0);
+}

@@ -1,0 +1,239 @@
+#include "support/testservice.h"
+
+#include "base/texts.h"
+#include "index/catalogue.h"
+#include "index/users.h"
+
+#include <gtest/gtest.h>
+
+using Titles = std::vector<std::string>;
+namespace fs = std::filesystem;
+
+namespace {
+
+class Scan : public testing::Test, protected TestService
+{
+protected:
+    Titles featured()
+    {
+        Titles titles = titlesOf(publicFeed("/data/feed/api/featured"));
+        std::sort(titles.begin(), titles.end());
+        return titles;
+    }
+    Titles albums()
+    {
+        Titles titles = titlesOf(feed("/data/feed/api/user/default"));
+        std::sort(titles.begin(), titles.end());
+        return titles;
+    }
+};
+
+} // namespace
+
+TEST_F(Scan, followsWhatHappensInTheFolder)
+{
+    addPhoto("a/one.jpg");
+    addPhoto("a/two.jpg");
+    addPhoto("b/three.jpg");
+    writeBytes(photo("a/note.txt"), "no photo");
+    start();
+    scan();
+    EXPECT_EQ(featured(), (Titles{"one", "three", "two"}));
+    const std::string album = albumPath("a");
+    const std::string address = valueOf(feed(album)["entry"][0], "id");
+
+    fs::remove(photo("a/two.jpg"));
+    fs::remove_all(photo("b"));
+    addPhoto("c/d/four.jpg");
+    addPhoto("a/one.jpg", {{"Exif.Image.ImageDescription", "Now with a caption"}});
+    fs::last_write_time(photo("a/one.jpg"),
+                        fs::file_time_type::clock::now() + std::chrono::hours(1));
+    scan();
+    EXPECT_EQ(featured(), (Titles{"four", "one"}));
+    EXPECT_EQ(albums(), (Titles{"a", "d"}));
+    EXPECT_EQ(valueOf(feed(album)["entry"][0], "id"), address);
+    EXPECT_EQ(valueOf(feed(album)["entry"][0], "summary"), "Now with a caption");
+    EXPECT_EQ(titlesOf(publicFeed("/data/feed/api/all?q=capt")), (Titles{"one"}));
+    EXPECT_EQ(titlesOf(publicFeed("/data/feed/api/all?q=three")), Titles{});
+}
+
+TEST_F(Scan, aLostDiskLosesNothing)
+{
+    addPhoto("a/one.jpg");
+    start();
+    scan();
+    ASSERT_TRUE(import(
+        {{"comments",
+          {{{"photo", "a/one.jpg"}, {"author", "anna@orvala.example"}, {"text", "Nice"}}}}}));
+    const std::string id = valueOf(feed(albumPath("a"))["entry"][0], "id");
+    fs::rename(file("photos"), file("away"));
+    scan();
+    EXPECT_EQ(featured(), Titles{"one"});
+    fs::create_directories(file("photos")); // an empty mount point
+    scan();
+    EXPECT_EQ(featured(), Titles{"one"});
+    // A folder that goes and comes back keeps its photos' comments.
+    fs::remove(file("photos"));
+    fs::rename(file("away"), file("photos"));
+    addPhoto("b/two.jpg");
+    fs::rename(photo("a"), file("a"));
+    scan();
+    EXPECT_EQ(featured(), Titles{"two"});
+    fs::rename(file("a"), photo("a"));
+    scan();
+    const json back = feed(albumPath("a"))["entry"][0];
+    EXPECT_EQ(valueOf(back, "id"), id);
+    EXPECT_EQ(valueOf(back, "gphoto$commentCount"), "1");
+}
+
+TEST_F(Scan, unreadableFilesStayInTheirAlbumOnly)
+{
+    addPhoto("a/good.jpg");
+    writeBytes(photo("a/bad.jpg"), "no picture");
+    writeBytes(photo("a/empty.png"), "");
+    start();
+    scan();
+    EXPECT_EQ(featured(), Titles{"good"});
+    const json list = feed(albumPath("a"));
+    ASSERT_EQ(list["entry"].size(), 3u);
+    for (const json &entry : list["entry"])
+        EXPECT_EQ(statusOf(pathOf(entry["content"]["src"])),
+                  valueOf(entry, "title") == "good" ? 200 : 415);
+    auto reader = database().read();
+    const auto unreadable = unreadablePhotos(reader);
+    ASSERT_EQ(unreadable.size(), 2u);
+    EXPECT_EQ(unreadable[0].path, photo("a/bad.jpg"));
+    EXPECT_NE(unreadable[0].error, "");
+}
+
+TEST_F(Scan, oddNamesAreServed)
+{
+    const Titles names = {"per%cent #1?.jpg", "quote\"&<b>.jpg", "caf\xC3\xA9 \xF0\x9F\x90\x95.jpg",
+                          "latin\xE9.jpg",    "line\nbreak.jpg", "dot.dot.JPEG"};
+    addPhoto("plain.jpg");
+    for (const std::string &name : names) {
+        fs::create_directories(photo("odd \xFF&<x>"));
+        fs::copy_file(photo("plain.jpg"), photo("odd \xFF&<x>/" + name));
+    }
+    start();
+    scan();
+    EXPECT_EQ(albums(), (Titles{"odd \xEF\xBF\xBD&<x>", "photos"}));
+    const json list = feed(albumPath("odd \xEF\xBF\xBD&<x>"));
+    ASSERT_EQ(list["entry"].size(), names.size());
+    for (const json &entry : list["entry"]) {
+        const std::string address = pathOf(entry["media$group"]["media$thumbnail"][0]["url"]);
+        EXPECT_EQ(statusOf(address), 200) << address;
+    }
+    const Titles titles = titlesOf(list);
+    EXPECT_EQ(std::count(titles.begin(), titles.end(), "latin\xEF\xBF\xBD"), 1);
+}
+
+TEST_F(Scan, linksAndHiddenNames)
+{
+    addPhoto("a/one.jpg");
+    addPhoto(".trash/gone.jpg");
+    addPhoto("a/.hidden.jpg");
+    fs::create_directory_symlink(photo(""), photo("a/circle"));
+    fs::create_symlink(photo("a/missing.jpg"), photo("a/broken.jpg"));
+    start();
+    scan();
+    EXPECT_EQ(featured(), Titles{"one"});
+}
+
+TEST_F(Scan, privacyFollowsItsMark)
+{
+    addPhoto("a/b/one.jpg");
+    start();
+    scan();
+    writeBytes(photo("a/.private"), "");
+    scan();
+    EXPECT_EQ(featured(), Titles{});
+    EXPECT_EQ(titlesOf(publicFeed("/data/feed/api/all?q=one")), Titles{});
+    EXPECT_EQ(albums(), Titles{"b"});
+    fs::remove(photo("a/.private"));
+    scan();
+    EXPECT_EQ(featured(), Titles{"one"});
+    EXPECT_EQ(titlesOf(publicFeed("/data/feed/api/all?q=one")), Titles{"one"});
+}
+
+TEST_F(Scan, importsWaitForTheirPhotos)
+{
+    start();
+    scan();
+    const json document = {
+        {"users", {{{"mail", "cleo@orvala.example"}, {"name", "Cleo"}}}},
+        {"comments",
+         {{{"photo", "later.jpg"}, {"author", "cleo@orvala.example"}, {"text", "At last"}}}},
+        {"tags", {{{"photo", "later.jpg"}, {"author", "cleo@orvala.example"}, {"tag", "late"}}}}};
+    ASSERT_TRUE(import(document));
+    addPhoto("later.jpg");
+    scan();
+    ASSERT_TRUE(import(document));
+    scan();
+    const json photo = feed(albumPath("photos"))["entry"][0];
+    EXPECT_EQ(valueOf(photo, "gphoto$commentCount"), "1");
+    EXPECT_EQ(valueOf(photo["media$group"], "media$keywords"), "late");
+    for (const json &bad :
+         {json::array(), json({{"users", {1}}}), json({{"users", 1}}),
+          json({{"tags", {{{"photo", "x"}, {"author", "nobody"}, {"tag", "t"}}}}})})
+        EXPECT_FALSE(import(bad)) << bad;
+}
+
+TEST_F(Scan, aUserComesAndGoes)
+{
+    addPhoto("one.jpg");
+    start();
+    addUser("ben@orvala.example", "Ben", "ben");
+    writePicture(file("ben/two.jpg"), 16, 16);
+    scan();
+    EXPECT_EQ(featured(), (Titles{"one", "two"}));
+    EXPECT_TRUE(removeUser(database(), "ben@orvala.example"));
+    EXPECT_EQ(featured(), Titles{"one"});
+    EXPECT_EQ(titlesOf(publicFeed("/data/feed/api/all?q=two")), Titles{});
+    EXPECT_FALSE(removeUser(database(), "ben@orvala.example"));
+    EXPECT_TRUE(fs::exists(file("ben/two.jpg")));
+}
+
+TEST_F(Scan, aNewerIndexIsRefused)
+{
+    start();
+    stop();
+    std::string error;
+    {
+        SQLite::Database index(file("data/index.db"), SQLite::OPEN_READWRITE);
+        index.exec("PRAGMA user_version = 99");
+    }
+    EXPECT_FALSE(openIndex(file("data"), &error));
+    EXPECT_NE(error.find("newer"), std::string::npos);
+    writeBytes(file("data/index.db"), "this is no database, whatever its name says");
+    EXPECT_FALSE(openIndex(file("data"), &error));
+}
+
+TEST(Texts, timesWithAnyZone)
+{
+    const struct
+    {
+        const char *text;
+        const char *utc;
+    } rows[] = {{"2012-03-01T10:00:00.000Z", "2012-03-01T10:00:00"},
+                {"2012-03-01T10:00:00", "2012-03-01T10:00:00"},
+                {"2012-03-01T01:30:00+02:00", "2012-02-29T23:30:00"},
+                {"2012-03-01T10:00:00.5-01:00", "2012-03-01T11:00:00"}};
+    for (const auto &row : rows)
+        EXPECT_EQ(utcTime(parseTime(row.text).value_or(0)), row.utc) << row.text;
+    for (const char *bad : {"", "2012", "2012-03-01 10:00:00", "2012-03-01T10:00:00X",
+                            "2012-03-01T10:00:00+2", "2012-03-01T10:00:00+02:00x"})
+        EXPECT_FALSE(parseTime(bad)) << bad;
+}
+
+TEST(Texts, whatIsNoUtf8IsReplaced)
+{
+    const std::string mark = "\xEF\xBF\xBD";
+    EXPECT_EQ(validUtf8("a\xC3\xA9\xF0\x9F\x90\x95"), "a\xC3\xA9\xF0\x9F\x90\x95");
+    EXPECT_EQ(validUtf8("\xE9x"), mark + "x");
+    EXPECT_EQ(validUtf8("\xC0\xAF"), mark + mark);            // a slash in a longer form
+    EXPECT_EQ(validUtf8("\xED\xA0\x80"), mark + mark + mark); // half of a pair
+    EXPECT_EQ(validUtf8("\xF0\x9F\x90"), mark + mark + mark); // cut
+    EXPECT_EQ(percentDecoded("%41%4"), "A%4");
+    EXPECT_EQ(percentDecoded(percentEncoded("\xE9 /%")), "\xE9 /%");
+}
