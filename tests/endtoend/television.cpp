@@ -152,7 +152,7 @@ QStringList Television::captions() const
 bool Television::showsColours(const QHash<QString, QColor> &expected) const
 {
     for (const PhotoItem *cell : cells()) {
-        const QImage picture = cell->pictureLabel()->picture().toImage();
+        const QImage picture = cell->picture().toImage();
         if (picture.isNull() ||
             !isNear(picture.pixelColor(picture.rect().center()), expected.value(cell->caption())))
             return false;
