@@ -10,7 +10,7 @@ const char frame[] = R"html(<!DOCTYPE html>
 <html lang="en"><head><meta charset="utf-8"><title>{title}</title>
 <style>
 html { font-size: 28px; font-size: 3.9vh; }
-body { margin: 0; padding: 6vh 8%; background: #14181f; color: #f4f1ea;
+body { margin: 0; padding: 10vh 8% 0; background: #14181f; color: #f4f1ea;
   font-family: Inter, "DejaVu Sans", sans-serif; font-size: 1rem; line-height: 1.35;
   overflow: hidden; text-align: center; }
 h1 { margin: 0 0 .7em; font-size: 1.5em; font-weight: bold; }
@@ -56,8 +56,8 @@ const char panel[] = R"html(<div id="logincaptcha">
 // The buttons wait for a moment, so that a key pressed twice on the page before allows nothing.
 const char consent[] = R"html(<p class="name">{name}</p>
 <h1>Show your photos on this screen?</h1>
-<p>It will see your albums and those of your family, and may add and delete comments, tags and
-photos in your name.</p>
+<p>It will see your albums and what others here share with you, and may write comments and tags and
+add photos in your name.</p>
 <form method="post" action="/o/oauth2/approve" style="width:auto">
 <input type="hidden" name="form" value="{form}">
 <input type="hidden" name="client_id" value="{client}">
