@@ -56,15 +56,6 @@ bool isFolder(const std::string &path)
 
 } // namespace
 
-std::string absoluteFolder(const std::string &folder)
-{
-    std::error_code code;
-    std::string path = std::filesystem::absolute(folder, code).lexically_normal();
-    while (path.size() > 1 && path.back() == '/')
-        path.pop_back();
-    return path;
-}
-
 int runUserAdd(const UserOptions &options)
 {
     if (!isMail(options.mail))

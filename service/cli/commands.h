@@ -20,5 +20,3 @@ int runUserToken(const std::string &data, const std::string &mail);
 // Paths in the file start at the folder, when one is given.
 int runImport(const std::string &data, const std::string &file, const std::string &folder);
 int runUnreadable(const std::string &data);
-// The absolute form of a folder, as the index keeps it: without a slash at its end.
-std::string absoluteFolder(const std::string &folder);

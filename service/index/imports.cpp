@@ -66,13 +66,11 @@ bool checkAuthors(Session &session, const json &document, const char *list, std:
     return true;
 }
 
-// Imported times may have any zone; what cannot be told is taken as it stands.
+// In UTC as the index keeps it; empty without a time.
 std::string publishedOf(const json &entry)
 {
-    std::string published = textOf(entry, "published");
-    if (!published.empty() && published.back() == 'Z')
-        published.pop_back();
-    return published.substr(0, published.find('.'));
+    const auto seconds = parseTime(textOf(entry, "published"));
+    return seconds ? utcTime(*seconds) : std::string();
 }
 
 int remember(Session &session, const json &entry, const char *kind, const std::string &content)
@@ -140,6 +138,24 @@ int applyWaiting(Session &session)
     return waiting;
 }
 
+bool checkTimes(const json &document, std::string *error)
+{
+    for (const json &entry : document.value("comments", json::array())) {
+        const std::string published = textOf(entry, "published");
+        if (published.empty() || parseTime(published))
+            continue;
+        *error = "\"" + published + "\" is no time";
+        return false;
+    }
+    return true;
+}
+
+std::string photosOf(const json &user)
+{
+    const std::string folder = textOf(user, "photos");
+    return folder.empty() ? folder : absoluteFolder(folder);
+}
+
 bool checkShape(const json &document, std::string *error)
 {
     if (!document.is_object()) {
@@ -148,7 +164,8 @@ bool checkShape(const json &document, std::string *error)
     }
     return checkList(document, "users", {"mail", "name"}, error) &&
            checkList(document, "comments", {"photo", "author", "text"}, error) &&
-           checkList(document, "tags", {"photo", "author", "tag"}, error);
+           checkList(document, "tags", {"photo", "author", "tag"}, error) &&
+           checkTimes(document, error);
 }
 
 void makeAbsolute(json &entry, const char *key, const std::filesystem::path &folder)
@@ -180,7 +197,7 @@ bool importDocument(Database &database, const json &document, ImportResult *resu
         return false;
     Database::Writer writer(database);
     for (const json &user : document.value("users", json::array())) {
-        saveUser(writer, {0, textOf(user, "mail"), textOf(user, "name"), textOf(user, "photos")});
+        saveUser(writer, {0, textOf(user, "mail"), textOf(user, "name"), photosOf(user)});
         ++result->users;
     }
     if (!checkAuthors(writer, document, "comments", error) ||

@@ -246,10 +246,18 @@ void Connection::follow(const QUrl &target)
     if (!target.isEmpty() && isWebAddress(next)) {
         dropReply();
         mNextHop.disconnect();
-        connect(&mNextHop, &QTimer::timeout, this, [this, next] { startGet(next); });
+        connect(&mNextHop, &QTimer::timeout, this, [this, next] {
+            if (startGet(next) != NET_SUCCESS)
+                failRedirect();
+        });
         mNextHop.start(mHops++ < promptHops ? 0 : lateHopMilliseconds);
         return;
     }
+    failRedirect();
+}
+
+void Connection::failRedirect()
+{
     const QPointer<Connection> self(this);
     fail(QNetworkReply::ProtocolInvalidOperationError, QStringLiteral("Redirect to nowhere"));
     if (self && !mIsRemoved)

@@ -111,6 +111,7 @@ private:
     void dropReply();
     bool takeArrived();
     void follow(const QUrl &target);
+    void failRedirect();
     void fail(QNetworkReply::NetworkError code, const QString &text);
 
     QPointer<QNetworkAccessManager> mManager;

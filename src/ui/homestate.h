@@ -21,10 +21,10 @@ struct HomeState
     int mIndexInPage = 0;             // of the record jumped to
     bool mIsPageDown = false;
     bool mIsReturnFromDetail = false;
-    bool mCanPlay = false; // a list has been shown
-    int mInitIndex = -1;   // grid index to focus after a page change; -1: as it is
+    bool mCanPlay = false;      // a list has been shown
+    int mInitIndex = -1;        // grid index to focus after a page change; -1: as it is
+    PackageProperty mAlbumList; // in which the album opened last stood, and the page of it
     int mSelectedAlbumIndex = 0;
-    int mSelectedAlbumStart = 1; // of the page on which that album stood
     int mSelectedPersonIndex = 0;
     int mSelectedPersonStart = 1;
     int mInitStart = 1; // page to show when the list has come

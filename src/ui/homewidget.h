@@ -2,11 +2,11 @@
 
 #include "data/package.h"
 #include "network/errorcode.h"
+#include "ui/backdrop.h"
 #include "ui/cellfiller.h"
 #include "ui/gridowner.h"
 #include "ui/homestate.h"
 
-#include <QPixmap>
 #include <QTimer>
 #include <QWidget>
 
@@ -107,7 +107,6 @@ private:
     bool goBack();
     void play();
     void confirmSignOut();
-    void renderBackdrop(const QSize &pixels);
 
     HomeState mState;
     UpWidget *mTitleWidget;
@@ -120,6 +119,5 @@ private:
     FailurePage *mFailurePage;
     HomeBars *mBars;
     QTimer mPageTimer;
-    QPixmap mBackdrop;    // background and content frame, in device pixels
-    QRect mBackdropFrame; // where the frame is in it
+    Backdrop mBackdrop;
 };

@@ -2,16 +2,14 @@
 
 #include "base/log.h"
 #include "common/ui/remotekeys.h"
-#include "data/package.h"
 #include "platform/ipcthread.h"
-#include "ui/homewidget.h"
 #include "ui/paging.h"
 #include "ui/slidemarks.h"
 #include "ui/slidephotos.h"
+#include "ui/sliderecords.h"
 #include "ui/slidesetting.h"
 
 #include <QKeyEvent>
-#include <QLocale>
 
 #include <limits>
 #include <utility>
@@ -25,35 +23,9 @@ namespace {
 enum PlayStatus { Started = 0, Stopped = 2 };
 constexpr int kStatusUpdate = 2;
 
-// The page shown by the home screen. Whoever reads it asks again after the event loop has run.
-const Package *package()
-{
-    return HomeWidget::mCurrentPackageData;
-}
-
-int recordCount()
-{
-    return package() ? package()->count() : 0;
-}
-
-bool isDownloading()
-{
-    return HomeWidget::mWidgetInst && HomeWidget::mWidgetInst->isLoading();
-}
-
 int turnLength(int seconds)
 {
     return qBound(1, seconds, std::numeric_limits<int>::max() / 1000 - 10) * 1000;
-}
-
-QString captionOf(const OrvalaPhoto &photo)
-{
-    return photo.summary().trimmed().isEmpty() ? photo.title() : photo.summary();
-}
-
-QString dateOf(const OrvalaPhoto &photo)
-{
-    return QLocale().toString(photo.published().date(), QStringLiteral("d MMMM yyyy"));
 }
 
 } // namespace
@@ -144,7 +116,7 @@ void QImageSlide::updatePlayState(bool isPlay)
 void QImageSlide::renewPlayArray(int refreshMode)
 {
     logLine("enter QImageSlide::renewPlayArray, refreshMode = ", refreshMode);
-    const int dataCount = recordCount();
+    const int dataCount = sliderecords::count();
     if (mPlayArray.size() > dataCount) {
         logLine("Warning: record array more than data count");
         mPlayArray.shrink(dataCount, mMode);
@@ -155,7 +127,7 @@ void QImageSlide::renewPlayArray(int refreshMode)
 void QImageSlide::update(bool isUpdateIndex)
 {
     logLine("enter QImageSlide::update()");
-    if (!package()) {
+    if (!sliderecords::hasList()) {
         logLine("Wrong QImageSlide::update()");
         emit recordsLost();
         return;
@@ -179,8 +151,8 @@ bool QImageSlide::holdsOn()
 {
     if (!mOptions.waitForPhoto || mIsHolding)
         return false;
-    const bool isLast = mIndex + 1 >= recordCount();
-    mIsHolding = isLast ? mOptions.wholeList && recordCount() < package()->mTotalCount
+    const bool isLast = mIndex + 1 >= sliderecords::count();
+    mIsHolding = isLast ? mOptions.wholeList && sliderecords::count() < sliderecords::total()
                         : !mPhotos->isSettled(urlAt(mIndex + 1));
     return mIsHolding;
 }
@@ -195,7 +167,7 @@ void QImageSlide::takeTurnHeld(const QString &url)
 
 void QImageSlide::advance()
 {
-    const int count = recordCount();
+    const int count = sliderecords::count();
     ++mIndex;
     while (mOptions.skipUnreadable && mIndex + 1 < count && mPhotos->hasFailed(urlAt(mIndex)))
         ++mIndex;
@@ -210,10 +182,10 @@ void QImageSlide::advance()
 void QImageSlide::refreshDatas()
 {
     const int ahead = mIndex + paging::pageSize;
-    const int total = package()->mTotalCount;
+    const int total = sliderecords::total();
     const bool isMoreToCome =
-        mOptions.wholeList ? recordCount() < total : ahead < total - paging::pageSize;
-    if (mIndex < paging::pageSize || ahead < recordCount() || !isMoreToCome)
+        mOptions.wholeList ? sliderecords::count() < total : ahead < total - paging::pageSize;
+    if (mIndex < paging::pageSize || ahead < sliderecords::count() || !isMoreToCome)
         return;
     logLine("QImageSlide::refreshDatas() notify to load next page datas, mIndex=", mIndex);
     emit handleSlidePageDown(mIndex + 1);
@@ -222,7 +194,7 @@ void QImageSlide::refreshDatas()
 // Moves the position into the list. False when the play was over and the player has left.
 bool QImageSlide::clampIndex()
 {
-    const int count = recordCount();
+    const int count = sliderecords::count();
     const bool isOver = mIndex >= count;
     mIndex = qMax(0, qMin(mIndex, count - 1));
     if (isOver && mIsPlay) {
@@ -236,12 +208,12 @@ bool QImageSlide::clampIndex()
 void QImageSlide::showCurrent(SlideLabel::Change change)
 {
     mMarks->setPlaying(mIsPlay);
-    const OrvalaPhoto *photo = photoAt(mIndex);
+    const OrvalaPhoto *photo = sliderecords::photo(mPlayArray.at(mIndex));
     if (!photo) {
         mLabel->setPlaceholder(QStringLiteral(":/res/image_not_download.png"));
         return;
     }
-    mLabel->setTexts(captionOf(*photo), dateOf(*photo));
+    mLabel->setTexts(sliderecords::caption(*photo), sliderecords::date(*photo));
     mPhotos->show(photo->imageUrl(), photo->thumbnailUrl(), change);
 }
 
@@ -259,28 +231,22 @@ void QImageSlide::prefetch()
     mPhotos->want(urls);
 }
 
-const OrvalaPhoto *QImageSlide::photoAt(int position) const
-{
-    return package() ? package()->record<OrvalaPhoto>(mPlayArray.at(position)) : nullptr;
-}
-
 QString QImageSlide::urlAt(int position) const
 {
-    const OrvalaPhoto *photo = photoAt(position);
-    return photo ? photo->imageUrl() : QString();
+    return sliderecords::url(mPlayArray.at(position));
 }
 
 bool QImageSlide::isKeyAnswered() const
 {
     if (mOptions.keysWhileLoading)
         return true;
-    if (isDownloading()) {
+    if (sliderecords::isDownloading()) {
         logLine("{QImageSlide::keyPressEvent} data is downloading and return...");
         return false;
     }
-    if (!package())
+    if (!sliderecords::hasList())
         logLine("{QImageSlide::keyPressEvent} mCurrentPackageData is NULL");
-    return package();
+    return sliderecords::hasList();
 }
 
 void QImageSlide::keyPressEvent(QKeyEvent *event)
@@ -340,7 +306,7 @@ void QImageSlide::stepBack()
 
 void QImageSlide::stepOn()
 {
-    if (mIndex >= recordCount() - 1)
+    if (mIndex >= sliderecords::count() - 1)
         return;
     ++mIndex;
     update(false);

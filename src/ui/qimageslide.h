@@ -7,7 +7,6 @@
 #include <QTimer>
 #include <QWidget>
 
-class OrvalaPhoto;
 class SlideMarks;
 class SlidePhotos;
 class SlideSetting;
@@ -73,7 +72,6 @@ private:
     void takeTurnHeld(const QString &url);
     void showCurrent(SlideLabel::Change change);
     void prefetch();
-    const OrvalaPhoto *photoAt(int position) const;
     QString urlAt(int position) const;
 
     bool isKeyAnswered() const;

@@ -1,6 +1,7 @@
 #include "support/testservice.h"
 
 #include "index/catalogue.h"
+#include "pictures/wholefile.h"
 
 #include <gtest/gtest.h>
 
@@ -80,7 +81,7 @@ protected:
             Words{"orvala-service", "serve", "--http", "--data", data(), "--photos",
                   mFolder.file("photos"), "--ready-file", ready, "--log-level", "off"});
         waitFor([&] { return fs::exists(ready); });
-        mPort = fs::exists(ready) ? std::stoi(readBytes(ready)) : 0;
+        mPort = fs::exists(ready) ? std::stoi(readWholeFile(ready)) : 0;
         return process;
     }
     std::string total()
