@@ -49,6 +49,7 @@ void SlidePhotos::show(const QString &url, const QString &thumbnailUrl, SlideLab
     if (url != mShown)
         mBefore = mShown;
     mShown = url;
+    mIsAwaited = false;
     Download::forget(mLabel);
     Download::mCurrentSlideShowImageUrl = url;
     if (showNow(url, change))
@@ -59,6 +60,7 @@ void SlidePhotos::show(const QString &url, const QString &thumbnailUrl, SlideLab
         return;
     const bool isRequested = request(url);
     Download::mPhotoSlideShowUrlHash.insert(url, mLabel);
+    mIsAwaited = true;
     QString failed = url;
     if (!isRequested)
         Download::downloadSlideShowPhotoCB(failed, NET_FAILED);
@@ -176,6 +178,8 @@ void SlidePhotos::take(const QString &url, ErrorCode code)
         mFailed.remove(url);
     else
         mFailed.insert(url);
+    if (url == mShown && mIsAwaited && code == NET_SUCCESS && mLabel->placeholder().isEmpty())
+        mPrepared.insert(url, mLabel->slide()); // Download has put it there already
     if (mWanted.value(0) == url)
         mPrepareTimer.start();
     emit arrived(url);

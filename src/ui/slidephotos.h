@@ -57,7 +57,8 @@ private:
     SlideLabel *mLabel;
     SlideOptions mOptions;
     QString mShown;
-    QString mBefore; // shown before that: the way back is as short
+    bool mIsAwaited = false; // what is shown stands in for the photo, which Download will put there
+    QString mBefore;         // shown before that: the way back is as short
     QStringList mWanted;
     QSet<QString> mAsked; // requested, and not arrived yet
     QSet<QString> mGone;  // arrived while wanted: not fetched ahead again
