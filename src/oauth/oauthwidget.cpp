@@ -54,6 +54,8 @@ OAuthWidget::OAuthWidget(std::unique_ptr<SignInView> page, QWidget *parent)
 {
     setFocusPolicy(Qt::StrongFocus);
     buildLayout();
+    mStallTimer.setSingleShot(true);
+    connect(&mStallTimer, &QTimer::timeout, this, &OAuthWidget::handleLoadingTimeout);
 }
 
 OAuthWidget::~OAuthWidget()
@@ -148,7 +150,14 @@ void OAuthWidget::startLoading()
     mRing->startAnimation();
     mStack->setCurrentWidget(mLoadingPage);
     takeFocus();
+    mStallTimer.stop();
     mUtil->startLoadingTimer(loadingMilliseconds());
+}
+
+void OAuthWidget::stopTimers()
+{
+    mStallTimer.stop();
+    mUtil->stopTimer();
 }
 
 void OAuthWidget::stopAnimation()
@@ -161,16 +170,16 @@ void OAuthWidget::handleLoadStarted()
 {
     if (mStack->currentWidget() == mPage->widget())
         mBusy->startAnimation();
-    mUtil->startLoadingTimer(loadingMilliseconds());
+    mStallTimer.start(loadingMilliseconds());
 }
 
 void OAuthWidget::handleLoadFinished(bool finished)
 {
     if (!finished) {
-        mUtil->startLoadingTimer(std::min(loadingMilliseconds(), 1000 * kSecondsAfterFailure));
+        mStallTimer.start(std::min(loadingMilliseconds(), 1000 * kSecondsAfterFailure));
         return;
     }
-    mUtil->stopTimer();
+    stopTimers();
     mBusy->stopAnimation();
     // Whatever page came, the user must see it.
     if (mStack->currentWidget() == mLoadingPage)
@@ -179,7 +188,7 @@ void OAuthWidget::handleLoadFinished(bool finished)
 
 void OAuthWidget::showWebView()
 {
-    mUtil->stopTimer();
+    stopTimers();
     stopAnimation();
     mStack->setCurrentWidget(mPage->widget());
     mPage->widget()->show(); // it has been closed if this is the second time
@@ -245,7 +254,7 @@ void OAuthWidget::handleError()
 void OAuthWidget::showMessage(const QString &text)
 {
     closeInputDialog();
-    mUtil->stopTimer();
+    stopTimers();
     stopAnimation();
     mMessage->setText(text);
     mStack->setCurrentWidget(mMessage);
@@ -255,13 +264,13 @@ void OAuthWidget::showMessage(const QString &text)
 void OAuthWidget::handleLoadingTimeout()
 {
     stopAnimation();
-    mUtil->stopTimer();
+    stopTimers();
     emit authorizeConnectTimeout();
 }
 
 void OAuthWidget::getAuthorizedResult(bool result)
 {
-    mUtil->stopTimer();
+    stopTimers();
     emit oauthFinished(result);
 }
 

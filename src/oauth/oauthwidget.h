@@ -2,6 +2,7 @@
 
 #include <QPointer>
 #include <QString>
+#include <QTimer>
 #include <QWidget>
 
 #include <memory>
@@ -65,6 +66,7 @@ private:
     void connectPage();
     void startLoading();
     void stopAnimation();
+    void stopTimers();
     void handleLoadStarted();
     void handleLoadFinished(bool finished);
     void takeFocus();
@@ -78,4 +80,6 @@ private:
     QProgressIndicator *mBusy = nullptr; // beside a page that loads the next one
     QLabel *mMessage = nullptr;
     QPointer<QPopUpForm> mInputForm;
+    // Any title stops the sign-in's own timer, also that of a page of which the rest never comes.
+    QTimer mStallTimer;
 };

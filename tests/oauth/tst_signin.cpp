@@ -257,7 +257,7 @@ private slots:
         start(service.get());
         if (shows)
             QTRY_VERIFY(mScreen->isPageShown());
-        else
+        else // the ring turns and the program waits
             QTRY_COMPARE(mServer->requests().size(), 1);
         for (int key : {DEVICE_DOWN_KEY, DEVICE_UP_KEY, DEVICE_RETURN_KEY})
             mScreen->press(key);
@@ -273,6 +273,22 @@ private slots:
         QVERIFY(mScreen->isPageShown());
         mScreen->press(DEVICE_RETURN_KEY); // leaves the page
         QTRY_VERIFY(mScreen->isAtAccounts());
+    }
+
+    // The rest of the page never comes, although its title did.
+    void stalled()
+    {
+        struct Stalled : SignInCase
+        {
+            Server::Behaviour signInPage() override
+            {
+                return Server::raw("HTTP/1.1 200 OK\r\nContent-Type: text/html\r\n"
+                                   "Content-Length: 9000\r\n\r\n<title>Sign in</title>",
+                                   false);
+            }
+        } service;
+        start(&service, "1");
+        waitForTimeOut();
     }
 
     void unreachable()
