@@ -111,6 +111,7 @@ QAbstractButton *LoginPage::makeButton(QVBoxLayout *column, const QString &text)
 
 void LoginPage::reload()
 {
+    QWidget *button = focusWidget(); // where the user comes back to
     QVector<AccountsWidget::Account> accounts;
     const bool readable = readAccounts(&accounts);
     if (readable)
@@ -120,7 +121,10 @@ void LoginPage::reload()
     mHint->setVisible(empty);
     mHint->setText(
         AccountTexts::text(readable ? AccountTexts::NoAccounts : AccountTexts::AccountsUnreadable));
-    restoreFocus();
+    if (button && (button == mNewButton || button == mExitButton))
+        button->setFocus();
+    else
+        restoreFocus();
 }
 
 void LoginPage::restoreFocus()
