@@ -146,6 +146,8 @@ ErrorCode PhotoManager::takePicture(const QString &url, QPointer<Connection> &co
     QPixmap *picture = createPhoto(bytes.constData(), bytes.size());
     if (!picture)
         return NET_REJECTED;
+    // As labels want it; set when it is shown, it would cost a copy each time.
+    picture->setDevicePixelRatio(SystemConfig::scale());
     const int cost = costOf(*picture);
     if (!mPhotoCache.insert(url, picture, cost))
         logLine("failed to cache photo:", url, "; result :", "false", "; size = ", cost);

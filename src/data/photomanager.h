@@ -25,8 +25,8 @@ public:
 
     // True unless a connection could not be created or started; then nothing calls back.
     static bool downloadPhoto(const QString &url, Callback callback);
-    // The cached picture or null. The cache may delete it with the next picture that arrives: never
-    // keep the pointer over the event loop.
+    // The cached picture, with the device pixel ratio of the interface's scale, or null. The cache
+    // may delete it with the next picture that arrives: never keep the pointer over the event loop.
     static QPixmap *getPhoto(const QString &url);
 
     static void networkCallback(QString url, CallbackType type, int param);
