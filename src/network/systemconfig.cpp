@@ -228,7 +228,8 @@ QString SystemConfig::oauthBase()
 
 QString SystemConfig::signInPage()
 {
-    return value(QStringLiteral("Service/SignInPage"), serviceOrigin + QStringLiteral("/signin"));
+    return value(QStringLiteral("Service/SignInPage"),
+                 serviceOrigin + QStringLiteral("/ServiceLogin"));
 }
 
 QString SystemConfig::oauthScope()
