@@ -20,6 +20,7 @@
 #include <QTemporaryDir>
 #include <QtTest>
 
+#include <algorithm>
 #include <cstdio>
 
 namespace {
@@ -81,6 +82,7 @@ public:
         for (int key : keys)
             QTest::sendKeyEvent(QTest::Press, mHost->detail(), Qt::Key(key), QString(), {});
     }
+    Host *host() { return mHost; }
     void take(const QString &name)
     {
         const auto *stage = mHost->findChild<DetailStage *>();
@@ -109,6 +111,35 @@ void takeStates(Gallery &gallery)
     gallery.press({DEVICE_SELECT_KEY, DEVICE_UP_KEY});
     gallery.take("without-information");
     gallery.press({DEVICE_DOWN_KEY, DEVICE_SELECT_KEY, DEVICE_UP_KEY});
+}
+
+// The last step of zoom and the far end of the photo.
+void takeClosest(Gallery &gallery)
+{
+    gallery.press({DEVICE_DOWN_KEY, DEVICE_LEFT_KEY, DEVICE_LEFT_KEY, DEVICE_LEFT_KEY,
+                   DEVICE_LEFT_KEY, DEVICE_LEFT_KEY, DEVICE_LEFT_KEY, DEVICE_RIGHT_KEY,
+                   DEVICE_SELECT_KEY});
+    for (int i = 0; i < 40; ++i)
+        gallery.press({i < 6 ? DEVICE_PAGEUP_KEY : DEVICE_RIGHT_KEY});
+    QTest::qWait(1000);
+    gallery.take("zoom-closest");
+}
+
+// From a key to the picture that it leads to, over photos that are there.
+void measureMoves(Gallery &gallery, int count)
+{
+    QVector<double> milliseconds;
+    for (int i = 1; i < count; ++i) {
+        QElapsedTimer timer;
+        timer.start();
+        gallery.press({DEVICE_PRE_KEY});
+        gallery.host()->repaint();
+        milliseconds << timer.nsecsElapsed() / 1e6;
+    }
+    std::sort(milliseconds.begin(), milliseconds.end());
+    if (!milliseconds.isEmpty())
+        std::printf("key to picture: median %.1f ms, worst %.1f ms\n",
+                    milliseconds.at(milliseconds.size() / 2), milliseconds.last());
 }
 
 } // namespace
@@ -144,7 +175,10 @@ int main(int argc, char **argv)
         gallery.take(QString("photo%1").arg(i, 2, 10, QChar('0')));
         if (i == 1)
             takeStates(gallery);
+        if (i == count)
+            takeClosest(gallery);
         gallery.press({DEVICE_RIGHT_KEY});
     }
+    measureMoves(gallery, count);
     return 0;
 }
