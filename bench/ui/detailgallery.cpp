@@ -59,14 +59,16 @@ protected:
     void paintEvent(QPaintEvent *) override
     {
         QPainter painter(this);
-        painter.drawPixmap(0, 0, loadPicture(":/res/orvala_background.png", size()));
-        painter.drawPixmap(frame().topLeft(), loadPicture(":/res/Content_Bg.png", frame().size()));
+        painter.drawPixmap(0, 0, mBackground);
+        painter.drawPixmap(frame().topLeft(), mFrame);
     }
 
 private:
     static QRect frame() { return QRect(64, 100, 1152, 548); }
 
     PictureDetailWidget *mDetail;
+    const QPixmap mBackground = loadPicture(":/res/orvala_background.png", QSize(1280, 720));
+    const QPixmap mFrame = loadPicture(":/res/Content_Bg.png", frame().size());
 };
 
 class Gallery
