@@ -3,7 +3,9 @@
 #include <array>
 #include <cctype>
 #include <charconv>
+#include <cstdio>
 #include <ctime>
+#include <filesystem>
 
 namespace {
 
@@ -68,6 +70,20 @@ std::string formatted(const std::tm &time)
     std::array<char, 32> text;
     const std::size_t length = std::strftime(text.data(), text.size(), "%Y-%m-%dT%H:%M:%S", &time);
     return std::string(text.data(), length);
+}
+
+// "Z", nothing or "+02:00" behind a time, in seconds.
+std::optional<std::int64_t> zoneOffset(const std::string &text)
+{
+    if (text.empty() || text == "Z" || text == "z")
+        return 0;
+    int hours = 0, minutes = 0, read = 0;
+    const bool isSigned = text[0] == '+' || text[0] == '-';
+    if (!isSigned || std::sscanf(text.c_str() + 1, "%2d:%2d%n", &hours, &minutes, &read) != 2 ||
+        read + 1 != static_cast<int>(text.size()))
+        return std::nullopt;
+    const std::int64_t seconds = hours * 3600 + minutes * 60;
+    return text[0] == '-' ? -seconds : seconds;
 }
 
 } // namespace
@@ -150,4 +166,28 @@ std::string withoutExtension(const std::string &name)
 {
     const std::size_t dot = name.rfind('.');
     return dot == std::string::npos || dot == 0 ? name : name.substr(0, dot);
+}
+
+std::optional<std::int64_t> parseTime(const std::string &text)
+{
+    std::tm time{};
+    const char *end = strptime(text.c_str(), "%Y-%m-%dT%H:%M:%S", &time);
+    if (!end)
+        return std::nullopt;
+    std::string rest = end;
+    if (!rest.empty() && rest[0] == '.')
+        rest.erase(0, std::min(rest.find_first_not_of("0123456789", 1), rest.size()));
+    const auto offset = zoneOffset(rest);
+    if (!offset)
+        return std::nullopt;
+    return timegm(&time) - *offset;
+}
+
+std::string absoluteFolder(const std::string &folder)
+{
+    std::error_code code;
+    std::string path = std::filesystem::absolute(folder, code).lexically_normal();
+    while (path.size() > 1 && path.back() == '/')
+        path.pop_back();
+    return path;
 }

@@ -22,6 +22,12 @@ std::optional<std::int64_t> parseNumber(std::string_view text);
 std::string utcTime(std::int64_t seconds);
 std::string localTime(std::int64_t seconds);
 std::int64_t currentSeconds();
+// Seconds since 1970 of an ISO time with or without fraction and zone, UTC if it has none; nothing
+// if it is no such time.
+std::optional<std::int64_t> parseTime(const std::string &text);
 
 // A file name without its extension; a name that is only an extension stays whole.
 std::string withoutExtension(const std::string &name);
+
+// The absolute form of a folder without a slash at its end.
+std::string absoluteFolder(const std::string &folder);

@@ -1,6 +1,6 @@
 #include "cli/serve.h"
 
-#include "cli/commands.h"
+#include "base/texts.h"
 #include "index/database.h"
 #include "index/users.h"
 #include "scan/scanner.h"

@@ -6,7 +6,8 @@ class Database;
 class ThumbnailStore;
 
 // Answers the picture addresses: "photos/KEY/sWIDTH/NAME" and, for the full size,
-// "photos/KEY/NAME". The key alone picks the photo; the name is for those who save it.
+// "photos/KEY/NAME". The key alone picks the photo; the name is for those who save it. Pictures
+// take no token: the key is random and only stands in feeds, which do.
 class PhotoPictures
 {
 public:

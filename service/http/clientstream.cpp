@@ -92,6 +92,15 @@ bool ClientStream::hasInput() const
     return mInputStart < mInput.size() || (mSsl && SSL_has_pending(mSsl));
 }
 
+bool ClientStream::awaitsInput(std::chrono::milliseconds moment)
+{
+    if (hasInput())
+        return true;
+    pollfd descriptors[2] = {{mSocket, POLLIN, 0}, {mStopEvent, POLLIN, 0}};
+    return ::poll(descriptors, 2, static_cast<int>(moment.count())) > 0 &&
+           descriptors[1].revents == 0;
+}
+
 bool ClientStream::flush()
 {
     std::size_t sent = 0;

@@ -32,8 +32,9 @@ public:
     bool handshake();
     void beginRequest();
     void headArrived();
-    // Bytes of a next request are here already.
+    // Bytes of a next request are here already, or come within a moment.
     bool hasInput() const;
+    bool awaitsInput(std::chrono::milliseconds moment);
     bool flush();
     // Something broke that leaves the rest of the input meaningless.
     bool isBroken() const { return mBroken; }

@@ -53,6 +53,8 @@ CREATE TABLE photos (
     UNIQUE (album, name)
 );
 CREATE INDEX photosInOrder ON photos (album, present, published, name);
+CREATE INDEX showablePhotos ON photos (key, album, present, error)
+    WHERE present = 1 AND error = '';
 CREATE INDEX unreadablePhotos ON photos (album) WHERE error <> '';
 CREATE TABLE tags (
     id INTEGER PRIMARY KEY,

@@ -153,7 +153,10 @@ void LoginPage::showMessage(const QString &text)
 void LoginPage::showEvent(QShowEvent *event)
 {
     QWidget::showEvent(event);
-    if (!mNewButton->hasFocus() && !mExitButton->hasFocus())
+    // Where it was before, also when another page or window has it at the moment.
+    if (QWidget *last = focusWidget())
+        last->setFocus();
+    else
         restoreFocus();
 }
 

@@ -4,6 +4,7 @@
 
 #include <QDir>
 #include <QFile>
+#include <QSettings>
 #include <QSqlDatabase>
 #include <QSqlQuery>
 #include <QTemporaryDir>
@@ -19,10 +20,9 @@ public:
     void use(const QString &path)
     {
         mPath = path;
-        QFile config(mFolder.filePath("config.ini"));
-        if (config.open(QIODevice::WriteOnly | QIODevice::Truncate))
-            config.write("[DBPath]\nDBPath=" + path.toUtf8() + "\n");
-        config.close();
+        QSettings config(mFolder.filePath("config.ini"), QSettings::IniFormat);
+        config.setValue("DBPath/DBPath", path);
+        config.sync();
         SystemConfig::setConfigFile(config.fileName());
     }
     QString path() const { return mPath; }

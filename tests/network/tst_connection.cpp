@@ -3,6 +3,7 @@
 #include "support/logcapture.h"
 #include "support/misbehavingserver.h"
 
+#include <QSettings>
 #include <QTemporaryDir>
 #include <QTimer>
 #include <QtTest>
@@ -53,37 +54,443 @@ class TestConnection : public QObject
     Q_OBJECT
 
 private slots:
-    void init();
-    void cleanup();
+    void init()
+    {
+        SystemConfig::setConfigFile(QStringLiteral("absent.ini"));
+        mServer = std::make_unique<Server>();
+        events.clear();
+        reaction = nullptr;
+    }
 
-    void poolFindsByUrlText();
-    void getDeliversTheBody();
-    void percentSignDecidesTheEncoding();
-    void failuresReportErrorThenFinish_data();
-    void failuresReportErrorThenFinish();
-    void unknownContentErrorIsNoError();
-    void progressNeedsATotal();
-    void readDataCopiesNoMoreThanAsked();
-    void redirectsKeepTheKey();
-    void redirectsToNowhereFail_data();
-    void redirectsToNowhereFail();
-    void redirectLoopStarvesNobody();
-    void largeAnswersAreAborted_data();
-    void largeAnswersAreAborted();
-    void brokenAnswersEnd_data();
-    void brokenAnswersEnd();
-    void removedInTheCallbackStaysSilent();
-    void removedWhileRunningStaysSilent();
-    void deletedInTheCallback();
-    void synchronousCodes_data();
-    void synchronousCodes();
-    void synchronousRequestsSendTheirBody();
-    void exitWhileWaitingIsNoSuccess();
-    void removedWhileWaiting();
-    void nestedWaits();
-    void socketsAreReused();
-    void certificatesAreAcceptedUnlessStrict();
-    void proxyIsAppliedOnlyWhenValid();
+    void cleanup()
+    {
+        Connection::removeAllConnections();
+        QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+        Connection::closeIdleSockets();
+    }
+
+    void poolFindsByUrlText()
+    {
+        Connection *first = start("/a");
+        Connection *second = start("/A");
+        QCOMPARE(Connection::findConnection(mServer->url("/A")), second);
+        QVERIFY(!Connection::findConnection(mServer->url("/b")));
+        QVERIFY(Connection::removeConnection(second));
+        QVERIFY(!Connection::removeConnection(second));
+        QVERIFY(!Connection::findConnection(mServer->url("/A")));
+        Connection::clearConnections();
+        QVERIFY(!Connection::findConnection(mServer->url("/a")));
+        delete first; // emptied, not deleted
+    }
+
+    void getDeliversTheBody()
+    {
+        mServer->on("/plain", Server::answer("0123456789"));
+        mServer->on("/chunked", Server::chunked("0123456789"));
+        mServer->on("/gzip", Server::gzip("0123456789"));
+        mServer->on("/drip", Server::drip("0123456789", 3, 1));
+        const QByteArray zlibStream = qCompress("0123456789").mid(4);
+        const Server::Headers deflate = {{"Content-Encoding", "deflate"}};
+        mServer->on("/zlib", Server::answer(zlibStream, 200, deflate));
+        mServer->on("/bare", Server::answer(zlibStream.mid(2).chopped(4), 200, deflate));
+        for (const char *path : {"/plain", "/chunked", "/gzip", "/zlib", "/bare", "/drip"}) {
+            events.clear();
+            Connection *connection = start(path);
+            WAIT_FINISHED();
+            QCOMPARE(count(CALLBACK_ERROR), 0);
+            QVERIFY(count(CALLBACK_READY_READ) > 0);
+            QCOMPARE(connection->errorCode(), NET_SUCCESS);
+            QCOMPARE(events.last().url, mServer->url(path));
+            QCOMPARE(body(connection), QByteArray("0123456789"));
+        }
+    }
+
+    void percentSignDecidesTheEncoding()
+    {
+        for (const char *path : {"/a%20b", "/a b"}) {
+            start(path);
+            QTRY_COMPARE(mServer->requests().size(), 1);
+            QCOMPARE(mServer->requests().first().path, QByteArray("/a%20b"));
+            mServer = std::make_unique<Server>();
+        }
+    }
+
+    void failuresReportErrorThenFinish_data()
+    {
+        QTest::addColumn<int>("status");
+        QTest::addColumn<int>("number");
+        QTest::addColumn<int>("code");
+        QTest::newRow("unauthorised") << 401 << 204 << NET_FAILED;
+        QTest::newRow("forbidden") << 403 << 201 << NET_CONTENT_ERROR;
+        QTest::newRow("missing") << 404 << 203 << NET_CONTENT_ERROR;
+        QTest::newRow("method") << 405 << 202 << NET_FAILED;
+        QTest::newRow("server") << 500 << 401 << NET_FAILED;
+    }
+
+    void failuresReportErrorThenFinish()
+    {
+        QFETCH(int, status);
+        QFETCH(int, number);
+        QFETCH(int, code);
+        mServer->on("/x", Server::html(status));
+        QList<ErrorCode> seen;
+        Connection *connection = start("/x");
+        reaction = [&](const Event &event) {
+            if (event.type == CALLBACK_ERROR || event.type == CALLBACK_FINISHED)
+                seen << connection->errorCode();
+        };
+        WAIT_FINISHED();
+        QCOMPARE(count(CALLBACK_ERROR), 1);
+        for (const Event &event : qAsConst(events))
+            QVERIFY(event.type != CALLBACK_ERROR || event.param == number);
+        QCOMPARE(seen, QList<ErrorCode>({code, code}));
+    }
+
+    void unknownContentErrorIsNoError()
+    {
+        mServer->on("/x", Server::answer("why", 422));
+        LogCapture log;
+        start("/x");
+        WAIT_FINISHED();
+        QCOMPARE(count(CALLBACK_ERROR), 0);
+        QVERIFY(LogCapture::contains(
+            "Connection::handleError ignor : QNetworkReply::UnknownContentError"));
+        QCOMPARE(Connection::createConnection()->post(mServer->url("/x"), "a", 1), NET_SUCCESS);
+    }
+
+    void progressNeedsATotal()
+    {
+        mServer->on("/chunked", Server::chunked("0123456789"));
+        mServer->on("/drip", Server::drip("0123456789", 5, 1));
+        start("/chunked");
+        WAIT_FINISHED();
+        QCOMPARE(count(CALLBACK_PROGRESS), 0);
+        events.clear();
+        QList<int> percents;
+        reaction = [&](const Event &event) {
+            if (event.type == CALLBACK_PROGRESS)
+                percents << event.param;
+        };
+        Connection *connection = start("/drip");
+        WAIT_FINISHED();
+        QVERIFY(std::is_sorted(percents.cbegin(), percents.cend()));
+        QCOMPARE(percents.last(), 100);
+        percents.clear();
+        connection->handleDownloadProgress(-1, 10);
+        connection->handleDownloadProgress(2, 3);
+        connection->handleDownloadProgress(9, 3);
+        QCOMPARE(percents, QList<int>({66, 100}));
+    }
+
+    void readDataCopiesNoMoreThanAsked()
+    {
+        mServer->on("/x", Server::answer("0123456789"));
+        char buffer[16] = {};
+        Connection *idle = Connection::createConnection();
+        QCOMPARE(idle->getAvailable(), Q_INT64_C(-1));
+        QCOMPARE(idle->readData(buffer, 4), Q_INT64_C(-1));
+        Connection *connection = start("/x");
+        WAIT_FINISHED();
+        LogCapture log;
+        QCOMPARE(connection->readData(buffer, 4), Q_INT64_C(4));
+        QCOMPARE(connection->readData(buffer + 4, 12), Q_INT64_C(6));
+        QCOMPARE(QByteArray(buffer), QByteArray("0123456789"));
+        QCOMPARE(connection->readData(buffer, 16), Q_INT64_C(-1));
+        QCOMPARE(LogCapture::lines(),
+                 QStringList({"availableSize =10 len=4", "availableSize =6 len=12",
+                              "read data from buffer to byteArray, lenght=6",
+                              "availableSize =0 len=16"}));
+    }
+
+    void redirectsKeepTheKey()
+    {
+        mServer->on("/a", Server::redirect("/b", 301));
+        mServer->on("/b", Server::redirect(mServer->url("/c").toUtf8(), 307));
+        mServer->on("/c", Server::answer("here"));
+        Connection *connection = start("/a");
+        WAIT_FINISHED();
+        QCOMPARE(count(CALLBACK_ERROR), 0);
+        QCOMPARE(events.last().url, mServer->url("/a"));
+        QCOMPARE(body(connection), QByteArray("here"));
+    }
+
+    void redirectsToNowhereFail_data()
+    {
+        QTest::addColumn<QByteArray>("target");
+        for (const char *target : {"", "file:///etc/passwd", "ftp://127.0.0.1/", "data:,x",
+                                   "http://", "qrc:/x", "http://a:b:c/"})
+            QTest::newRow(target) << QByteArray(target);
+    }
+
+    void redirectsToNowhereFail()
+    {
+        QFETCH(QByteArray, target);
+        mServer->on("/a", Server::redirect(target));
+        Connection *connection = start("/a");
+        WAIT_FINISHED();
+        QCOMPARE(count(CALLBACK_ERROR), 1);
+        QCOMPARE(connection->errorCode(), NET_FAILED);
+        QCOMPARE(mServer->requests().size(), 1);
+    }
+
+    // Without an end, but slow: the loop keeps time for everything else.
+    void redirectLoopStarvesNobody()
+    {
+        mServer->on("/a", Server::redirect("/a"));
+        Connection *connection = start("/a");
+        QTRY_VERIFY(mServer->requests().size() > 20);
+        const int before = mServer->requests().size();
+        QTRY_VERIFY(mServer->requests().size() > before);
+        QVERIFY(mServer->requests().size() <= before + 2);
+        Connection::removeConnection(connection);
+        QCOMPARE(count(CALLBACK_FINISHED), 0);
+    }
+
+    void largeAnswersAreAborted_data()
+    {
+        QTest::addColumn<Server::Behaviour>("behaviour");
+        QTest::newRow("plain") << Server::answer(QByteArray(1 << 20, 'x'));
+        QTest::newRow("chunked") << Server::chunked(QByteArray(1 << 20, 'x'));
+        QTest::newRow("gzip bomb") << Server::gzipBomb(256);
+    }
+
+    void largeAnswersAreAborted()
+    {
+        QFETCH(Server::Behaviour, behaviour);
+        mServer->on("/x", behaviour);
+        Connection *connection = Connection::createConnection();
+        connection->setCallback(record);
+        connection->setMaximumSize(100000);
+        connection->get(mServer->url("/x"));
+        WAIT_FINISHED();
+        QCOMPARE(count(CALLBACK_ERROR), 1);
+        QCOMPARE(connection->errorCode(), NET_CANCELED);
+        QCOMPARE(connection->post(mServer->url("/x"), "", 0), NET_CANCELED);
+    }
+
+    void brokenAnswersEnd_data()
+    {
+        QTest::addColumn<Server::Behaviour>("behaviour");
+        QTest::addColumn<bool>("isError");
+        QTest::newRow("reset") << Server::reset() << true;
+        QTest::newRow("cut") << Server::cut("abc", 10) << true;
+        QTest::newRow("no HTTP") << Server::raw("220 smtp ready\r\n") << true;
+        // The toolkit lets these pass: the reader of the body finds out.
+        QTest::newRow("bad chunks") << Server::badChunks() << false;
+        QTest::newRow("cut gzip") << Server::cutGzip("{\"a\":1}") << false;
+    }
+
+    void brokenAnswersEnd()
+    {
+        QFETCH(Server::Behaviour, behaviour);
+        QFETCH(bool, isError);
+        mServer->on("/x", behaviour);
+        start("/x");
+        WAIT_FINISHED();
+        if (isError)
+            QCOMPARE(count(CALLBACK_ERROR), 1);
+    }
+
+    void silentAnswersAreGivenUp()
+    {
+        const QTemporaryDir folder;
+        QSettings settings(folder.filePath("config.ini"), QSettings::IniFormat);
+        settings.setValue("Network/SilenceSeconds", 1);
+        settings.sync();
+        SystemConfig::setConfigFile(settings.fileName());
+        mServer->on("/x", Server::silence());
+        mServer->on("/drip", Server::drip("0123456789", 1, 150)); // slower, but never silent
+        Connection *connection = start("/x");
+        Connection *slow = start("/drip");
+        QTRY_COMPARE(count(CALLBACK_FINISHED), 2);
+        QCOMPARE(count(CALLBACK_ERROR), 1);
+        QCOMPARE(connection->errorCode(), NET_TIMEOUT);
+        QCOMPARE(body(slow), QByteArray("0123456789"));
+    }
+
+    void removedInTheCallbackStaysSilent()
+    {
+        mServer->on("/fine", Server::answer("x"));
+        QPointer<Connection> connection;
+        reaction = [&](const Event &event) {
+            if (event.type == CALLBACK_ERROR || event.type == CALLBACK_FINISHED)
+                Connection::removeConnection(connection);
+        };
+        for (const char *path : {"/missing", "/fine"}) {
+            events.clear();
+            connection = start(path);
+            QTRY_VERIFY(!connection);
+            QCOMPARE(count(CALLBACK_FINISHED), 1);
+            QCOMPARE(events.last().type, CALLBACK_FINISHED);
+        }
+    }
+
+    void removedWhileRunningStaysSilent()
+    {
+        mServer->on("/x", Server::silence());
+        const QPointer<Connection> connection = start("/x");
+        QTRY_COMPARE(mServer->requests().size(), 1);
+        Connection::removeConnection(connection);
+        QTRY_COMPARE(mServer->openConnections(), 0);
+        QVERIFY(!connection);
+        QVERIFY(events.isEmpty());
+    }
+
+    void deletedInTheCallback()
+    {
+        mServer->on("/fine", Server::answer("x"));
+        mServer->on("/nowhere", Server::redirect(""));
+        mServer->on("/missing", Server::answer("", 404));
+        QPointer<Connection> connection;
+        reaction = [&](const Event &) { delete connection; };
+        for (const char *path : {"/fine", "/nowhere", "/missing"}) {
+            connection = start(path);
+            QTRY_VERIFY(!connection);
+        }
+    }
+
+    void synchronousCodes_data()
+    {
+        QTest::addColumn<Server::Behaviour>("behaviour");
+        QTest::addColumn<int>("code");
+        QTest::addColumn<QString>("line");
+        const QString none;
+        QTest::newRow("fine") << Server::answer("x") << NET_SUCCESS
+                              << "Connection::syncRequest() SUCCESS";
+        QTest::newRow("403") << Server::answer("", 403) << NET_CONTENT_ERROR << "errorcode=201";
+        QTest::newRow("404") << Server::answer("", 404) << NET_CONTENT_ERROR << "errorcode=203";
+        QTest::newRow("405") << Server::answer("", 405) << NET_NOT_PERMITTED << "errorcode=202";
+        QTest::newRow("500") << Server::answer("", 500) << NET_FAILED
+                             << "Connection::syncRequest NET_FAILED";
+        QTest::newRow("silence") << Server::silence() << NET_TIMEOUT
+                                 << "Connection::syncRequest() NET_TIMEOUT!!!";
+    }
+
+    void synchronousCodes()
+    {
+        QFETCH(Server::Behaviour, behaviour);
+        QFETCH(int, code);
+        QFETCH(QString, line);
+        mServer->on("/x", behaviour);
+        Connection *connection = Connection::createConnection();
+        connection->setTimeout(code == NET_TIMEOUT ? 20 : 20000);
+        LogCapture log;
+        QCOMPARE(connection->deleteResource(mServer->url("/x")), code);
+        QCOMPARE(connection->errorCode(), code);
+        QVERIFY(LogCapture::contains(line));
+        QCOMPARE(mServer->requests().last().method, QByteArray("DELETE"));
+    }
+
+    void synchronousRequestsSendTheirBody()
+    {
+        mServer->on("/x", Server::echo());
+        Connection *connection = Connection::createConnection();
+        QCOMPARE(connection->post(mServer->url("/x"), "application/atom+xml", "<a>\0</a>junk", 8),
+                 NET_SUCCESS);
+        const QByteArray echoed = body(connection);
+        QVERIFY(echoed.startsWith("POST /x\n"));
+        QVERIFY(echoed.contains("\ncontent-type: application/atom+xml\n"));
+        QVERIFY(echoed.endsWith(QByteArray("\n\n<a>\0</a>", 10)));
+
+        const quint16 port = mServer->serverPort();
+        mServer.reset();
+        QCOMPARE(connection->post(QStringLiteral("http://127.0.0.1:%1/").arg(port), nullptr, 0),
+                 NET_REFUSED);
+    }
+
+    void exitWhileWaitingIsNoSuccess()
+    {
+        mServer->on("/x", Server::silence());
+        Connection *connection = Connection::createConnection();
+        ErrorCode code = NET_SUCCESS;
+        QTimer::singleShot(0, this, [&] { code = connection->post(mServer->url("/x"), "", 0); });
+        QTimer::singleShot(1, this, [] { QCoreApplication::exit(); });
+        QCoreApplication::exec();
+        QCOMPARE(code, NET_CANCELED);
+    }
+
+    void removedWhileWaiting()
+    {
+        mServer->on("/x", Server::silence());
+        const QPointer<Connection> removed = Connection::createConnection();
+        QTimer::singleShot(0, this, [&] { Connection::removeConnection(removed); });
+        QCOMPARE(removed->post(mServer->url("/x"), "", 0), NET_CANCELED);
+        const QPointer<Connection> deleted = Connection::createConnection();
+        QTimer::singleShot(0, this, [&] { delete deleted; });
+        QCOMPARE(deleted->post(mServer->url("/x"), "", 0), NET_CANCELED);
+        QVERIFY(!deleted);
+    }
+
+    void nestedWaits()
+    {
+        mServer->on("/slow", Server::drip("abc", 1, 5));
+        mServer->on("/missing", Server::answer("", 404));
+        Connection *outer = Connection::createConnection();
+        Connection *inner = Connection::createConnection();
+        ErrorCode innerCode = NET_SUCCESS;
+        QTimer::singleShot(0, this,
+                           [&] { innerCode = inner->deleteResource(mServer->url("/missing")); });
+        QCOMPARE(outer->post(mServer->url("/slow"), "", 0), NET_SUCCESS);
+        QCOMPARE(innerCode, NET_CONTENT_ERROR);
+    }
+
+    void socketsAreReused()
+    {
+        mServer = std::make_unique<Server>(Server::Tls);
+        mServer->on("/x", Server::answer("x"));
+        for (int round = 1; round <= 3; ++round) {
+            events.clear();
+            Connection *connection = start("/x");
+            WAIT_FINISHED();
+            Connection::removeConnection(connection);
+            QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+            QCOMPARE(mServer->connections(), 1);
+        }
+        // A socket that the server has closed meanwhile is replaced.
+        mServer->closeConnections();
+        QTRY_COMPARE(mServer->openConnections(), 0);
+        events.clear();
+        start("/x");
+        WAIT_FINISHED();
+        QCOMPARE(count(CALLBACK_ERROR), 0);
+    }
+
+    void certificatesAreAcceptedUnlessStrict()
+    {
+        mServer = std::make_unique<Server>(Server::Tls);
+        mServer->on("/x", Server::answer("x"));
+        {
+            LogCapture log;
+            QCOMPARE(Connection::createConnection()->deleteResource(mServer->url("/x")),
+                     NET_SUCCESS);
+            QVERIFY(LogCapture::anyStartsWith("Connection::handleSslErrors ssl error: "));
+        }
+        QTemporaryDir folder;
+        QFile file(folder.filePath("strict.ini"));
+        QVERIFY(file.open(QIODevice::WriteOnly));
+        file.write("[Network]\nVerifyCertificates=true\n");
+        file.close();
+        SystemConfig::setConfigFile(file.fileName());
+        QCOMPARE(Connection::createConnection()->deleteResource(mServer->url("/x")), NET_FAILED);
+    }
+
+    void proxyIsAppliedOnlyWhenValid()
+    {
+        const QNetworkProxy before = QNetworkProxy::applicationProxy();
+        Connection *connection = Connection::createConnection();
+        for (const char *bad :
+             {"", ":80", "host", "host:", "host:0", "host:x", "host:70000", "::80"})
+            QVERIFY(!connection->setProxy(QLatin1String(bad)));
+        QCOMPARE(QNetworkProxy::applicationProxy(), before);
+        LogCapture log;
+        Server proxy;
+        proxy.on("http://album.orvala.example/x", Server::answer("through the proxy"));
+        connection = Connection::createConnection("127.0.0.1", QString::number(proxy.serverPort()));
+        QVERIFY(LogCapture::contains(
+            QStringLiteral("mProxyHost=127.0.0.1; mProxyPort=%1").arg(proxy.serverPort())));
+        QCOMPARE(connection->deleteResource("http://album.orvala.example/x"), NET_SUCCESS);
+        QNetworkProxy::setApplicationProxy(before);
+    }
 
 private:
     Connection *start(const QString &path)
@@ -96,420 +503,6 @@ private:
 
     std::unique_ptr<Server> mServer;
 };
-
-void TestConnection::init()
-{
-    SystemConfig::setConfigFile(QStringLiteral("absent.ini"));
-    mServer = std::make_unique<Server>();
-    events.clear();
-    reaction = nullptr;
-}
-
-void TestConnection::cleanup()
-{
-    Connection::removeAllConnections();
-    QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
-    Connection::closeIdleSockets();
-}
-
-void TestConnection::poolFindsByUrlText()
-{
-    Connection *first = start("/a");
-    Connection *second = start("/A");
-    QCOMPARE(Connection::findConnection(mServer->url("/A")), second);
-    QVERIFY(!Connection::findConnection(mServer->url("/b")));
-    QVERIFY(Connection::removeConnection(second));
-    QVERIFY(!Connection::removeConnection(second));
-    QVERIFY(!Connection::findConnection(mServer->url("/A")));
-    Connection::clearConnections();
-    QVERIFY(!Connection::findConnection(mServer->url("/a")));
-    delete first; // emptied, not deleted
-}
-
-void TestConnection::getDeliversTheBody()
-{
-    mServer->on("/plain", Server::answer("0123456789"));
-    mServer->on("/chunked", Server::chunked("0123456789"));
-    mServer->on("/gzip", Server::gzip("0123456789"));
-    mServer->on("/drip", Server::drip("0123456789", 3, 1));
-    for (const char *path : {"/plain", "/chunked", "/gzip", "/drip"}) {
-        events.clear();
-        Connection *connection = start(path);
-        WAIT_FINISHED();
-        QCOMPARE(count(CALLBACK_ERROR), 0);
-        QVERIFY(count(CALLBACK_READY_READ) > 0);
-        QCOMPARE(connection->errorCode(), NET_SUCCESS);
-        QCOMPARE(events.last().url, mServer->url(path));
-        QCOMPARE(body(connection), QByteArray("0123456789"));
-    }
-}
-
-void TestConnection::percentSignDecidesTheEncoding()
-{
-    for (const char *path : {"/a%20b", "/a b"}) {
-        start(path);
-        QTRY_COMPARE(mServer->requests().size(), 1);
-        QCOMPARE(mServer->requests().first().path, QByteArray("/a%20b"));
-        mServer = std::make_unique<Server>();
-    }
-}
-
-void TestConnection::failuresReportErrorThenFinish_data()
-{
-    QTest::addColumn<int>("status");
-    QTest::addColumn<int>("number");
-    QTest::addColumn<int>("code");
-    QTest::newRow("unauthorised") << 401 << 204 << NET_FAILED;
-    QTest::newRow("forbidden") << 403 << 201 << NET_CONTENT_ERROR;
-    QTest::newRow("missing") << 404 << 203 << NET_CONTENT_ERROR;
-    QTest::newRow("method") << 405 << 202 << NET_FAILED;
-    QTest::newRow("server") << 500 << 401 << NET_FAILED;
-}
-
-void TestConnection::failuresReportErrorThenFinish()
-{
-    QFETCH(int, status);
-    QFETCH(int, number);
-    QFETCH(int, code);
-    mServer->on("/x", Server::html(status));
-    QList<ErrorCode> seen;
-    Connection *connection = start("/x");
-    reaction = [&](const Event &event) {
-        if (event.type == CALLBACK_ERROR || event.type == CALLBACK_FINISHED)
-            seen << connection->errorCode();
-    };
-    WAIT_FINISHED();
-    QCOMPARE(count(CALLBACK_ERROR), 1);
-    for (const Event &event : qAsConst(events))
-        QVERIFY(event.type != CALLBACK_ERROR || event.param == number);
-    QCOMPARE(seen, QList<ErrorCode>({code, code}));
-}
-
-void TestConnection::unknownContentErrorIsNoError()
-{
-    mServer->on("/x", Server::answer("why", 422));
-    LogCapture log;
-    start("/x");
-    WAIT_FINISHED();
-    QCOMPARE(count(CALLBACK_ERROR), 0);
-    QVERIFY(
-        LogCapture::contains("Connection::handleError ignor : QNetworkReply::UnknownContentError"));
-    QCOMPARE(Connection::createConnection()->post(mServer->url("/x"), "a", 1), NET_SUCCESS);
-}
-
-void TestConnection::progressNeedsATotal()
-{
-    mServer->on("/chunked", Server::chunked("0123456789"));
-    mServer->on("/drip", Server::drip("0123456789", 5, 1));
-    start("/chunked");
-    WAIT_FINISHED();
-    QCOMPARE(count(CALLBACK_PROGRESS), 0);
-    events.clear();
-    QList<int> percents;
-    reaction = [&](const Event &event) {
-        if (event.type == CALLBACK_PROGRESS)
-            percents << event.param;
-    };
-    Connection *connection = start("/drip");
-    WAIT_FINISHED();
-    QVERIFY(std::is_sorted(percents.cbegin(), percents.cend()));
-    QCOMPARE(percents.last(), 100);
-    percents.clear();
-    connection->handleDownloadProgress(-1, 10);
-    connection->handleDownloadProgress(2, 3);
-    connection->handleDownloadProgress(9, 3);
-    QCOMPARE(percents, QList<int>({66, 100}));
-}
-
-void TestConnection::readDataCopiesNoMoreThanAsked()
-{
-    mServer->on("/x", Server::answer("0123456789"));
-    char buffer[16] = {};
-    Connection *idle = Connection::createConnection();
-    QCOMPARE(idle->getAvailable(), Q_INT64_C(-1));
-    QCOMPARE(idle->readData(buffer, 4), Q_INT64_C(-1));
-    Connection *connection = start("/x");
-    WAIT_FINISHED();
-    LogCapture log;
-    QCOMPARE(connection->readData(buffer, 4), Q_INT64_C(4));
-    QCOMPARE(connection->readData(buffer + 4, 12), Q_INT64_C(6));
-    QCOMPARE(QByteArray(buffer), QByteArray("0123456789"));
-    QCOMPARE(connection->readData(buffer, 16), Q_INT64_C(-1));
-    QCOMPARE(LogCapture::lines(), QStringList({"availableSize =10 len=4", "availableSize =6 len=12",
-                                               "read data from buffer to byteArray, lenght=6",
-                                               "availableSize =0 len=16"}));
-}
-
-void TestConnection::redirectsKeepTheKey()
-{
-    mServer->on("/a", Server::redirect("/b", 301));
-    mServer->on("/b", Server::redirect(mServer->url("/c").toUtf8(), 307));
-    mServer->on("/c", Server::answer("here"));
-    Connection *connection = start("/a");
-    WAIT_FINISHED();
-    QCOMPARE(count(CALLBACK_ERROR), 0);
-    QCOMPARE(events.last().url, mServer->url("/a"));
-    QCOMPARE(body(connection), QByteArray("here"));
-}
-
-void TestConnection::redirectsToNowhereFail_data()
-{
-    QTest::addColumn<QByteArray>("target");
-    for (const char *target : {"", "file:///etc/passwd", "ftp://127.0.0.1/", "data:,x", "http://",
-                               "qrc:/x", "http://a:b:c/"})
-        QTest::newRow(target) << QByteArray(target);
-}
-
-void TestConnection::redirectsToNowhereFail()
-{
-    QFETCH(QByteArray, target);
-    mServer->on("/a", Server::redirect(target));
-    Connection *connection = start("/a");
-    WAIT_FINISHED();
-    QCOMPARE(count(CALLBACK_ERROR), 1);
-    QCOMPARE(connection->errorCode(), NET_FAILED);
-    QCOMPARE(mServer->requests().size(), 1);
-}
-
-// Without an end, but slow: the loop keeps time for everything else.
-void TestConnection::redirectLoopStarvesNobody()
-{
-    mServer->on("/a", Server::redirect("/a"));
-    Connection *connection = start("/a");
-    QTRY_VERIFY(mServer->requests().size() > 20);
-    const int before = mServer->requests().size();
-    QTRY_VERIFY(mServer->requests().size() > before);
-    QVERIFY(mServer->requests().size() <= before + 2);
-    Connection::removeConnection(connection);
-    QCOMPARE(count(CALLBACK_FINISHED), 0);
-}
-
-void TestConnection::largeAnswersAreAborted_data()
-{
-    QTest::addColumn<Server::Behaviour>("behaviour");
-    QTest::newRow("plain") << Server::answer(QByteArray(1 << 20, 'x'));
-    QTest::newRow("chunked") << Server::chunked(QByteArray(1 << 20, 'x'));
-    QTest::newRow("gzip bomb") << Server::gzipBomb(256);
-}
-
-void TestConnection::largeAnswersAreAborted()
-{
-    QFETCH(Server::Behaviour, behaviour);
-    mServer->on("/x", behaviour);
-    Connection *connection = Connection::createConnection();
-    connection->setCallback(record);
-    connection->setMaximumSize(100000);
-    connection->get(mServer->url("/x"));
-    WAIT_FINISHED();
-    QCOMPARE(count(CALLBACK_ERROR), 1);
-    QCOMPARE(connection->errorCode(), NET_CANCELED);
-    QCOMPARE(connection->post(mServer->url("/x"), "", 0), NET_CANCELED);
-}
-
-void TestConnection::brokenAnswersEnd_data()
-{
-    QTest::addColumn<Server::Behaviour>("behaviour");
-    QTest::addColumn<bool>("isError");
-    QTest::newRow("reset") << Server::reset() << true;
-    QTest::newRow("cut") << Server::cut("abc", 10) << true;
-    QTest::newRow("no HTTP") << Server::raw("220 smtp ready\r\n") << true;
-    // The toolkit lets these pass: the reader of the body finds out.
-    QTest::newRow("bad chunks") << Server::badChunks() << false;
-    QTest::newRow("cut gzip") << Server::cutGzip("{\"a\":1}") << false;
-}
-
-void TestConnection::brokenAnswersEnd()
-{
-    QFETCH(Server::Behaviour, behaviour);
-    QFETCH(bool, isError);
-    mServer->on("/x", behaviour);
-    start("/x");
-    WAIT_FINISHED();
-    if (isError)
-        QCOMPARE(count(CALLBACK_ERROR), 1);
-}
-
-void TestConnection::removedInTheCallbackStaysSilent()
-{
-    mServer->on("/fine", Server::answer("x"));
-    QPointer<Connection> connection;
-    reaction = [&](const Event &event) {
-        if (event.type == CALLBACK_ERROR || event.type == CALLBACK_FINISHED)
-            Connection::removeConnection(connection);
-    };
-    for (const char *path : {"/missing", "/fine"}) {
-        events.clear();
-        connection = start(path);
-        QTRY_VERIFY(!connection);
-        QCOMPARE(count(CALLBACK_FINISHED), 1);
-        QCOMPARE(events.last().type, CALLBACK_FINISHED);
-    }
-}
-
-void TestConnection::removedWhileRunningStaysSilent()
-{
-    mServer->on("/x", Server::silence());
-    const QPointer<Connection> connection = start("/x");
-    QTRY_COMPARE(mServer->requests().size(), 1);
-    Connection::removeConnection(connection);
-    QTRY_COMPARE(mServer->openConnections(), 0);
-    QVERIFY(!connection);
-    QVERIFY(events.isEmpty());
-}
-
-void TestConnection::deletedInTheCallback()
-{
-    mServer->on("/fine", Server::answer("x"));
-    mServer->on("/nowhere", Server::redirect(""));
-    mServer->on("/missing", Server::answer("", 404));
-    QPointer<Connection> connection;
-    reaction = [&](const Event &) { delete connection; };
-    for (const char *path : {"/fine", "/nowhere", "/missing"}) {
-        connection = start(path);
-        QTRY_VERIFY(!connection);
-    }
-}
-
-void TestConnection::synchronousCodes_data()
-{
-    QTest::addColumn<Server::Behaviour>("behaviour");
-    QTest::addColumn<int>("code");
-    QTest::addColumn<QString>("line");
-    const QString none;
-    QTest::newRow("fine") << Server::answer("x") << NET_SUCCESS
-                          << "Connection::syncRequest() SUCCESS";
-    QTest::newRow("403") << Server::answer("", 403) << NET_CONTENT_ERROR << "errorcode=201";
-    QTest::newRow("404") << Server::answer("", 404) << NET_CONTENT_ERROR << "errorcode=203";
-    QTest::newRow("405") << Server::answer("", 405) << NET_NOT_PERMITTED << "errorcode=202";
-    QTest::newRow("500") << Server::answer("", 500) << NET_FAILED
-                         << "Connection::syncRequest NET_FAILED";
-    QTest::newRow("silence") << Server::silence() << NET_TIMEOUT
-                             << "Connection::syncRequest() NET_TIMEOUT!!!";
-}
-
-void TestConnection::synchronousCodes()
-{
-    QFETCH(Server::Behaviour, behaviour);
-    QFETCH(int, code);
-    QFETCH(QString, line);
-    mServer->on("/x", behaviour);
-    Connection *connection = Connection::createConnection();
-    connection->setTimeout(code == NET_TIMEOUT ? 20 : 20000);
-    LogCapture log;
-    QCOMPARE(connection->deleteResource(mServer->url("/x")), code);
-    QCOMPARE(connection->errorCode(), code);
-    QVERIFY(LogCapture::contains(line));
-    QCOMPARE(mServer->requests().last().method, QByteArray("DELETE"));
-}
-
-void TestConnection::synchronousRequestsSendTheirBody()
-{
-    mServer->on("/x", Server::echo());
-    Connection *connection = Connection::createConnection();
-    QCOMPARE(connection->post(mServer->url("/x"), "application/atom+xml", "<a>\0</a>junk", 8),
-             NET_SUCCESS);
-    const QByteArray echoed = body(connection);
-    QVERIFY(echoed.startsWith("POST /x\n"));
-    QVERIFY(echoed.contains("\ncontent-type: application/atom+xml\n"));
-    QVERIFY(echoed.endsWith(QByteArray("\n\n<a>\0</a>", 10)));
-
-    const quint16 port = mServer->serverPort();
-    mServer.reset();
-    QCOMPARE(connection->post(QStringLiteral("http://127.0.0.1:%1/").arg(port), nullptr, 0),
-             NET_REFUSED);
-}
-
-void TestConnection::exitWhileWaitingIsNoSuccess()
-{
-    mServer->on("/x", Server::silence());
-    Connection *connection = Connection::createConnection();
-    ErrorCode code = NET_SUCCESS;
-    QTimer::singleShot(0, this, [&] { code = connection->post(mServer->url("/x"), "", 0); });
-    QTimer::singleShot(1, this, [] { QCoreApplication::exit(); });
-    QCoreApplication::exec();
-    QCOMPARE(code, NET_CANCELED);
-}
-
-void TestConnection::removedWhileWaiting()
-{
-    mServer->on("/x", Server::silence());
-    const QPointer<Connection> removed = Connection::createConnection();
-    QTimer::singleShot(0, this, [&] { Connection::removeConnection(removed); });
-    QCOMPARE(removed->post(mServer->url("/x"), "", 0), NET_CANCELED);
-    const QPointer<Connection> deleted = Connection::createConnection();
-    QTimer::singleShot(0, this, [&] { delete deleted; });
-    QCOMPARE(deleted->post(mServer->url("/x"), "", 0), NET_CANCELED);
-    QVERIFY(!deleted);
-}
-
-void TestConnection::nestedWaits()
-{
-    mServer->on("/slow", Server::drip("abc", 1, 5));
-    mServer->on("/missing", Server::answer("", 404));
-    Connection *outer = Connection::createConnection();
-    Connection *inner = Connection::createConnection();
-    ErrorCode innerCode = NET_SUCCESS;
-    QTimer::singleShot(0, this,
-                       [&] { innerCode = inner->deleteResource(mServer->url("/missing")); });
-    QCOMPARE(outer->post(mServer->url("/slow"), "", 0), NET_SUCCESS);
-    QCOMPARE(innerCode, NET_CONTENT_ERROR);
-}
-
-void TestConnection::socketsAreReused()
-{
-    mServer = std::make_unique<Server>(Server::Tls);
-    mServer->on("/x", Server::answer("x"));
-    for (int round = 1; round <= 3; ++round) {
-        events.clear();
-        Connection *connection = start("/x");
-        WAIT_FINISHED();
-        Connection::removeConnection(connection);
-        QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
-        QCOMPARE(mServer->connections(), 1);
-    }
-    // A socket that the server has closed meanwhile is replaced.
-    mServer->closeConnections();
-    QTRY_COMPARE(mServer->openConnections(), 0);
-    events.clear();
-    start("/x");
-    WAIT_FINISHED();
-    QCOMPARE(count(CALLBACK_ERROR), 0);
-}
-
-void TestConnection::certificatesAreAcceptedUnlessStrict()
-{
-    mServer = std::make_unique<Server>(Server::Tls);
-    mServer->on("/x", Server::answer("x"));
-    {
-        LogCapture log;
-        QCOMPARE(Connection::createConnection()->deleteResource(mServer->url("/x")), NET_SUCCESS);
-        QVERIFY(LogCapture::anyStartsWith("Connection::handleSslErrors ssl error: "));
-    }
-    QTemporaryDir folder;
-    QFile file(folder.filePath("strict.ini"));
-    QVERIFY(file.open(QIODevice::WriteOnly));
-    file.write("[Network]\nVerifyCertificates=true\n");
-    file.close();
-    SystemConfig::setConfigFile(file.fileName());
-    QCOMPARE(Connection::createConnection()->deleteResource(mServer->url("/x")), NET_FAILED);
-}
-
-void TestConnection::proxyIsAppliedOnlyWhenValid()
-{
-    const QNetworkProxy before = QNetworkProxy::applicationProxy();
-    Connection *connection = Connection::createConnection();
-    for (const char *bad : {"", ":80", "host", "host:", "host:0", "host:x", "host:70000", "::80"})
-        QVERIFY(!connection->setProxy(QLatin1String(bad)));
-    QCOMPARE(QNetworkProxy::applicationProxy(), before);
-    LogCapture log;
-    Server proxy;
-    proxy.on("http://album.orvala.example/x", Server::answer("through the proxy"));
-    connection = Connection::createConnection("127.0.0.1", QString::number(proxy.serverPort()));
-    QVERIFY(LogCapture::contains(
-        QStringLiteral("mProxyHost=127.0.0.1; mProxyPort=%1").arg(proxy.serverPort())));
-    QCOMPARE(connection->deleteResource("http://album.orvala.example/x"), NET_SUCCESS);
-    QNetworkProxy::setApplicationProxy(before);
-}
 
 QTEST_GUILESS_MAIN(TestConnection)
 #include "tst_connection.moc"

@@ -1,3 +1,4 @@
+#include "pictures/wholefile.h"
 #include "support/testservice.h"
 
 #include "http/accesslog.h"
@@ -201,13 +202,13 @@ TEST_F(Http, theCertificateIsMadeOnceAndPrivate)
     namespace fs = std::filesystem;
     start(true);
     stop();
-    const std::string certificate = readBytes(file("data/certificate.pem"));
+    const std::string certificate = readWholeFile(file("data/certificate.pem"));
     EXPECT_EQ(fs::status(file("data/certificate.pem")).permissions(),
               fs::perms::owner_read | fs::perms::owner_write);
     EXPECT_EQ(fs::status(file("data/index.db")).permissions(),
               fs::perms::owner_read | fs::perms::owner_write);
     start(true);
-    EXPECT_EQ(readBytes(file("data/certificate.pem")), certificate);
+    EXPECT_EQ(readWholeFile(file("data/certificate.pem")), certificate);
     std::string error;
     ServiceSettings second;
     second.data = file("data");

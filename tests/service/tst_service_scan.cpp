@@ -1,6 +1,6 @@
 #include "support/testservice.h"
 
-#include "feeds/featuredlist.h"
+#include "base/texts.h"
 #include "index/catalogue.h"
 #include "index/users.h"
 
@@ -207,4 +207,33 @@ TEST_F(Scan, aNewerIndexIsRefused)
     EXPECT_NE(error.find("newer"), std::string::npos);
     writeBytes(file("data/index.db"), "this is no database, whatever its name says");
     EXPECT_FALSE(openIndex(file("data"), &error));
+}
+
+TEST(Texts, timesWithAnyZone)
+{
+    const struct
+    {
+        const char *text;
+        const char *utc;
+    } rows[] = {{"2012-03-01T10:00:00.000Z", "2012-03-01T10:00:00"},
+                {"2012-03-01T10:00:00", "2012-03-01T10:00:00"},
+                {"2012-03-01T01:30:00+02:00", "2012-02-29T23:30:00"},
+                {"2012-03-01T10:00:00.5-01:00", "2012-03-01T11:00:00"}};
+    for (const auto &row : rows)
+        EXPECT_EQ(utcTime(parseTime(row.text).value_or(0)), row.utc) << row.text;
+    for (const char *bad : {"", "2012", "2012-03-01 10:00:00", "2012-03-01T10:00:00X",
+                            "2012-03-01T10:00:00+2", "2012-03-01T10:00:00+02:00x"})
+        EXPECT_FALSE(parseTime(bad)) << bad;
+}
+
+TEST(Texts, whatIsNoUtf8IsReplaced)
+{
+    const std::string mark = "\xEF\xBF\xBD";
+    EXPECT_EQ(validUtf8("a\xC3\xA9\xF0\x9F\x90\x95"), "a\xC3\xA9\xF0\x9F\x90\x95");
+    EXPECT_EQ(validUtf8("\xE9x"), mark + "x");
+    EXPECT_EQ(validUtf8("\xC0\xAF"), mark + mark);            // a slash in a longer form
+    EXPECT_EQ(validUtf8("\xED\xA0\x80"), mark + mark + mark); // half of a pair
+    EXPECT_EQ(validUtf8("\xF0\x9F\x90"), mark + mark + mark); // cut
+    EXPECT_EQ(percentDecoded("%41%4"), "A%4");
+    EXPECT_EQ(percentDecoded(percentEncoded("\xE9 /%")), "\xE9 /%");
 }

@@ -1,6 +1,7 @@
 #include "common/ui/dialogpanel.h"
 
 #include "common/ui/frames.h"
+#include "common/ui/popupoverlay.h"
 #include "common/ui/textfit.h"
 #include "network/systemconfig.h"
 
@@ -30,13 +31,16 @@ QLabel *makeLabel(QWidget *parent, int points)
     auto *label = new QLabel(parent);
     label->setTextFormat(Qt::PlainText);
     label->setAlignment(Qt::AlignCenter);
+    setPopupColours(label);
     QFont font = label->font();
     font.setPointSize(points);
     label->setFont(font);
     return label;
 }
 
-QLabel *makeTitle(QWidget *parent)
+} // namespace
+
+QLabel *makePopupTitle(QWidget *parent)
 {
     QLabel *title = makeLabel(parent, SystemConfig::menuFont());
     title->setStyleSheet(QStringLiteral("QLabel {border-image: url(%1); color: white;}")
@@ -45,12 +49,10 @@ QLabel *makeTitle(QWidget *parent)
     return title;
 }
 
-} // namespace
-
 DialogPanel::DialogPanel(const ButtonStyles &styles, QWidget *parent)
     : QFrame(parent)
     , mStyles(styles)
-    , mTitle(makeTitle(this))
+    , mTitle(makePopupTitle(this))
 {
     setFixedWidth(panelWidth());
     auto *content = new QContentFrame(this);
@@ -97,8 +99,10 @@ QPushButton *DialogPanel::addButton(const QString &text)
     font.setPointSize(SystemConfig::buttonFont());
     button->setFont(font);
     button->setText(buttonText(text, font, kButtonSize.width() - 2 * kBorder));
+    button->setLayoutDirection(text.isRightToLeft() ? Qt::RightToLeft : Qt::LeftToRight);
     button->setFixedSize(kButtonSize);
     button->setFocusPolicy(Qt::NoFocus);
+    setPopupColours(button);
     button->setStyleSheet(mButtons.isEmpty() ? mStyles.focused : mStyles.normal);
     mButtonRow->insertWidget(mButtonRow->count() - 1, button);
     mButtons.append(button);

@@ -44,3 +44,6 @@ private:
     QList<QPushButton *> mButtons;
     int mFocusedButton = 0;
 };
+
+// The title bar of a pop-up, as wide as its layout makes it.
+QLabel *makePopupTitle(QWidget *parent);

@@ -2,7 +2,6 @@
 
 #include "network/systemconfig.h"
 
-#include <QApplication>
 #include <QGridLayout>
 #include <QKeyEvent>
 #include <QPainter>
@@ -17,7 +16,6 @@ PopupOverlay::PopupOverlay(QWidget *parent)
     : QWidget(parent)
 {
     setFocusPolicy(Qt::StrongFocus);
-    setPalette(popupPalette(palette()));
     auto *rows = new QGridLayout(this);
     rows->setContentsMargins(0, 0, 0, 0);
     if (parent)
@@ -81,17 +79,18 @@ void PopupOverlay::hideEvent(QHideEvent *event)
 
 void PopupOverlay::takeFocus()
 {
-    QWidget *before = QApplication::focusWidget();
-    if (focusPolicy() == Qt::NoFocus || (before && isAncestorOf(before)))
+    if (focusPolicy() == Qt::NoFocus || isNested())
         return;
-    mFocusBefore = before;
+    QWidget *before = window()->focusWidget();
+    if (before != this && !isAncestorOf(before))
+        mFocusBefore = before;
     focusReceiver()->setFocus();
 }
 
 void PopupOverlay::giveFocusBack()
 {
-    QWidget *focus = QApplication::focusWidget();
-    const bool isOurs = focus && (focus == this || isAncestorOf(focus));
+    const QWidget *focus = window()->focusWidget();
+    const bool isOurs = focus == this || isAncestorOf(focus);
     if (isOurs && mFocusBefore && mFocusBefore->isVisible())
         mFocusBefore->setFocus();
     mFocusBefore = nullptr;
@@ -109,10 +108,20 @@ void PopupOverlay::keyPressEvent(QKeyEvent *event)
     event->accept();
 }
 
-QPalette popupPalette(QPalette palette)
+// Tab must not lead to what lies below; while it hides, the focus may go where Qt puts it.
+bool PopupOverlay::focusNextPrevChild(bool next)
+{
+    return !isVisible() && QWidget::focusNextPrevChild(next);
+}
+
+void setPopupColours(QWidget *widget)
 {
     const QColor text(0xf2, 0xf6, 0xf9);
-    for (QPalette::ColorRole role : {QPalette::WindowText, QPalette::Text, QPalette::ButtonText})
+    const QColor dimmed(0x75, 0x84, 0x8f);
+    QPalette palette = widget->palette();
+    for (QPalette::ColorRole role : {QPalette::WindowText, QPalette::Text, QPalette::ButtonText}) {
         palette.setColor(role, text);
-    return palette;
+        palette.setColor(QPalette::Disabled, role, dimmed);
+    }
+    widget->setPalette(palette);
 }

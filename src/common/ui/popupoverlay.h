@@ -8,8 +8,8 @@
 // the focus when it is shown and gives it back to where it was when it goes; with the focus policy
 // Qt::NoFocus it leaves the focus alone, for a dialog that is handed its keys.
 //
-// An overlay inside an overlay covers that one and does not dim it again. In a parent whose layout
-// holds it, it keeps the place that the layout gives.
+// An overlay inside an overlay covers that one, neither dims it again nor takes the focus by
+// itself. In a parent whose layout holds it, it keeps the place that the layout gives.
 class PopupOverlay : public QWidget
 {
     Q_OBJECT
@@ -28,6 +28,7 @@ protected:
     void hideEvent(QHideEvent *event) override;
     void paintEvent(QPaintEvent *event) override;
     void keyPressEvent(QKeyEvent *event) override;
+    bool focusNextPrevChild(bool next) override;
 
     // Who gets the focus when the overlay is shown; the overlay itself unless told otherwise.
     virtual QWidget *focusReceiver() { return this; }
@@ -42,5 +43,6 @@ private:
     QPointer<QWidget> mFocusBefore;
 };
 
-// Light text, for what lies on the dark panels of pop-ups.
-QPalette popupPalette(QPalette palette);
+// Gives a widget on the dark panel of a pop-up its light text. Palettes are not inherited below a
+// widget with a style sheet: each one that shows text needs its own.
+void setPopupColours(QWidget *widget);
