@@ -106,6 +106,14 @@ std::optional<AlbumRecord> albumWithId(Session &session, std::int64_t userId, st
     return albumAt(query);
 }
 
+std::optional<std::string> folderOfAlbum(Session &session, std::int64_t albumId)
+{
+    Query query(session, "SELECT folder FROM albums WHERE id = ?", albumId);
+    if (!query.next())
+        return std::nullopt;
+    return query.text(0);
+}
+
 std::vector<PhotoRecord> photosOf(Session &session, std::int64_t albumId, const Page &page)
 {
     std::vector<PhotoRecord> photos;

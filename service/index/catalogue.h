@@ -18,6 +18,9 @@ std::vector<AlbumRecord> albumsOf(Session &session, const AlbumFilter &filter, c
 std::int64_t albumCount(Session &session, const AlbumFilter &filter);
 std::optional<AlbumRecord> albumWithId(Session &session, std::int64_t userId, std::int64_t albumId);
 
+// The album's folder below its user's; nothing if there is no such album.
+std::optional<std::string> folderOfAlbum(Session &session, std::int64_t albumId);
+
 // In the order in which they were taken.
 std::vector<PhotoRecord> photosOf(Session &session, std::int64_t albumId, const Page &page);
 std::optional<PhotoRecord> photoWithId(Session &session, std::int64_t photoId);

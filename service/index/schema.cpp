@@ -92,7 +92,13 @@ CREATE VIRTUAL TABLE photoSearch USING fts5 (
 );
 )sql";
 
-const char *const steps[] = {firstVersion};
+// Texts that came with an uploaded photo; they stand above those in its file.
+const char givenTexts[] = R"sql(
+ALTER TABLE photos ADD COLUMN givenTitle TEXT NOT NULL DEFAULT '';
+ALTER TABLE photos ADD COLUMN givenCaption TEXT NOT NULL DEFAULT '';
+)sql";
+
+const char *const steps[] = {firstVersion, givenTexts};
 constexpr int newestVersion = sizeof steps / sizeof steps[0];
 
 } // namespace
