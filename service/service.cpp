@@ -2,6 +2,7 @@
 
 #include "base/secrets.h"
 #include "feeds/feeds.h"
+#include "feeds/health.h"
 #include "feeds/photopictures.h"
 #include "http/httpserver.h"
 #include "index/database.h"
@@ -100,6 +101,7 @@ bool Service::Parts::startServer(const ServiceSettings &settings, std::string *e
     SignInPages::Settings pages;
     pages.withTls = settings.withTls;
     signIn = std::make_unique<SignInPages>(*database, codes, pages);
+    addHealthRoute(router, *database);
     feeds->addRoutes(router);
     posting->addRoutes(router);
     pictures->addRoutes(router);

@@ -221,13 +221,14 @@ std::optional<PhotoRecord> portraitOf(Session &session, std::int64_t userId)
 std::optional<PhotoFile> fileWithKey(Session &session, const std::string &key)
 {
     Query query(session,
-                "SELECT " PATH_OF_PHOTO ", p.id, p.size, p.changed FROM photos p "
+                "SELECT " PATH_OF_PHOTO ", p.id, p.size, p.changed, u.photos FROM photos p "
                 "JOIN albums a ON a.id = p.album JOIN users u ON u.id = a.user "
                 "WHERE p.key = ? AND p.present = 1",
                 key);
     if (!query.next())
         return std::nullopt;
-    return PhotoFile{query.text(0), query.text(1) + "-" + query.text(2) + "-" + query.text(3)};
+    return PhotoFile{query.text(0), query.text(1) + "-" + query.text(2) + "-" + query.text(3),
+                     query.text(4)};
 }
 
 std::vector<UnreadablePhoto> unreadablePhotos(Session &session)

@@ -21,6 +21,7 @@ public:
     void keep() { mKept = true; }
 
     std::string path() const { return mFolder + "/" + mName; }
+    const std::string &folder() const { return mFolder; }
     const std::string &name() const { return mName; }
 
 private:

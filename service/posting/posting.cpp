@@ -222,6 +222,8 @@ void Posting::storePhoto(Asked &asked, const AlbumRecord &album, const AtomEntry
 {
     const std::string folder = folderOfAlbum(asked.session, album.id).value_or("");
     NewPhotoFile file(asked.owner.photos + (folder.empty() ? "" : "/" + folder));
+    if (!liesWithin(asked.owner.photos, file.folder()))
+        return asked.refuse(forbidden, "the album's folder is elsewhere");
     if (!file.write(bytes))
         return asked.refuse(507, "the album's folder takes no more photos");
     std::string error;
