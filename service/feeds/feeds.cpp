@@ -36,6 +36,7 @@ std::optional<PhotoRecord> coverOf(Session &session, const AlbumRecord &album)
 Feeds::Feeds(Database &database, std::string scheme)
     : mDatabase(database)
     , mScheme(std::move(scheme))
+    , mFeatured(database)
 {
 }
 
@@ -75,7 +76,9 @@ void Feeds::featured(Asked &asked)
     if (!page)
         return;
     const FeaturedList::Ids ids = mFeatured.photos(asked.session);
-    const auto photos = photosWithIds(asked.session, slice(*ids, *page));
+    const std::vector<std::int64_t> shown = slice(*ids, *page);
+    const auto photos = photosWithIds(asked.session, shown);
+    mFeatured.noteShown(shown);
     asked.send("Featured photos", *page, ids->size(), photoEntries(photos, asked.origin));
 }
 

@@ -144,14 +144,6 @@ std::vector<PhotoRecord> photosWithIds(Session &session, const std::vector<std::
     return photos;
 }
 
-std::vector<std::int64_t> featuredOrder(Session &session)
-{
-    // Keys are random and stay: their order is a shuffle that every page agrees on.
-    return numbersOf(Query(session, "SELECT p.id FROM photos p JOIN albums a ON a.id = p.album "
-                                    "WHERE p.present = 1 AND p.error = '' AND NOT a.private "
-                                    "ORDER BY p.key"));
-}
-
 std::string searchExpression(const std::string &text)
 {
     std::string expression, word;

@@ -26,9 +26,6 @@ std::vector<PhotoRecord> photosOf(Session &session, std::int64_t albumId, const 
 std::optional<PhotoRecord> photoWithId(Session &session, std::int64_t photoId);
 std::vector<PhotoRecord> photosWithIds(Session &session, const std::vector<std::int64_t> &ids);
 
-// All photos for everybody, in an order that mixes people and albums and stays as it is.
-std::vector<std::int64_t> featuredOrder(Session &session);
-
 // A MATCH expression for photos that hold a word beginning with each word of the text; empty for a
 // text without a word.
 std::string searchExpression(const std::string &text);
