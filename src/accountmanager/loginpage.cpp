@@ -68,7 +68,6 @@ LoginPage::LoginPage(QWidget *parent)
     , mHint(makeLabel(this, "hint", AccountTexts::text(AccountTexts::NoAccounts)))
     , mMessage(makeLabel(this, "message", QString()))
 {
-    setStyleSheet(kStyle);
     buildLayout();
     connect(mAccounts, &AccountsWidget::selectItem, this, &LoginPage::handleSelectIndex);
     connect(mAccounts, &AccountsWidget::clickedDelBut, this, &LoginPage::popupConfirmDialog);
@@ -148,6 +147,9 @@ void LoginPage::showMessage(const QString &text)
 void LoginPage::showEvent(QShowEvent *event)
 {
     QWidget::showEvent(event);
+    // Not before: a style sheet that sets a text size keeps the family that was the program's then.
+    if (styleSheet().isEmpty())
+        setStyleSheet(kStyle);
     // Where it was before, also when another page or window has it at the moment.
     if (QWidget *last = focusWidget())
         last->setFocus();
