@@ -247,6 +247,11 @@ bool SystemConfig::verifyCertificates()
     return settings().value(QStringLiteral("Network/VerifyCertificates"), false).toBool();
 }
 
+int SystemConfig::silenceSeconds()
+{
+    return qMax(0, integer("Network/SilenceSeconds", 0));
+}
+
 int SystemConfig::idleConnectionSeconds()
 {
     return qMax(0, integer("Network/IdleConnectionSeconds", 60));

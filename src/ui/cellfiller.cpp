@@ -28,14 +28,14 @@ QString albumCaption(const Album &album, const PhotoItem &cell)
 {
     const QString title =
         QFontMetrics(cell.captionFont())
-            .elidedText(oneLine(album.title()), Qt::ElideRight, cell.captionWidth());
+            .elidedText(oneLine(album.title()), Qt::ElideRight, cell.captionRect().width());
     const QString unit = album.numPhotos() == 1 ? I18n::label(18) : I18n::label(26);
     return title + QLatin1Char('\n') + QString::number(album.numPhotos()) + unit;
 }
 
 } // namespace
 
-CellFiller::CellFiller(FormScrollWidget *content)
+CellFiller::CellFiller(FormScrollWidget *content, QWidget *backdrop)
 {
     for (int i = 0; i < paging::pageSize; ++i) {
         auto *cell = new PhotoItem(content);
@@ -43,6 +43,7 @@ CellFiller::CellFiller(FormScrollWidget *content)
         font.setPixelSize(kCaptionHeight);
         cell->setCaptionFont(font);
         cell->setCaptionColor(QColor(0xe6, 0xed, 0xf2));
+        cell->setBackdrop(backdrop);
         cell->hide();
         content->addItem(cell, i);
         mCells << cell;

@@ -6,13 +6,15 @@
 
 class FormScrollWidget;
 class PhotoItem;
+class QWidget;
 
 // Lays the records of a page into the cells of the focus grid and asks for their thumbnails. The
 // cells are made once and belong to the grid's content.
 class CellFiller
 {
 public:
-    explicit CellFiller(FormScrollWidget *content);
+    // The backdrop is the widget that paints what lies behind the cells.
+    CellFiller(FormScrollWidget *content, QWidget *backdrop);
 
     // Shows the records from `first` on, one a cell, and hides the cells that are left over.
     // Returns the number of cells shown.

@@ -18,7 +18,6 @@ bool HomeState::enterMenu(const PackageProperty &property)
 {
     const bool changed = property.mType != mCurrentProperty.mType;
     mSelectedAlbumIndex = 0;
-    mSelectedAlbumStart = 1;
     if (changed) {
         logLine("apackage type has changed");
         mSelectedPersonIndex = 0;
@@ -39,7 +38,7 @@ void HomeState::openAlbum(int cell, const Album &album)
 {
     logLine("Back up the select album index");
     mSelectedAlbumIndex = cell;
-    mSelectedAlbumStart = mCurrentProperty.mStartIndex;
+    mAlbumList = mCurrentProperty;
     mInitStart = 1;
     mCurrentProperty.mStartIndex = 1;
     mCurrentProperty.mType = TYPE_ALBUM_PHOTOS;
@@ -50,7 +49,6 @@ void HomeState::openAlbum(int cell, const Album &album)
 void HomeState::openPerson(int cell, const FavoritePeople &person)
 {
     mSelectedAlbumIndex = 0;
-    mSelectedAlbumStart = 1;
     mSelectedPersonIndex = cell;
     mSelectedPersonStart = mCurrentProperty.mStartIndex;
     mInitStart = 1;
@@ -72,11 +70,10 @@ HomeState::Back HomeState::back() const
 
 void HomeState::backToAlbums()
 {
-    mCurrentProperty.mType = TYPE_ALBUM_LIST;
+    mCurrentProperty = mAlbumList;
     mCurrentProperty.mStartIndex = 1;
-    mCurrentProperty.mAlbumId.clear();
     mInitIndex = mSelectedAlbumIndex;
-    mInitStart = mSelectedAlbumStart;
+    mInitStart = mAlbumList.mStartIndex;
 }
 
 void HomeState::backToPeople()
@@ -108,6 +105,19 @@ bool HomeState::pageDown(int arg, const Package *package)
     mIndexInPage = page.indexInPage;
     mCurrentProperty.mStartIndex = page.startIndex;
     return true;
+}
+
+void HomeState::selectRecord(int number)
+{
+    const int indexInPage = (qMax(1, number) - 1) % paging::pageSize;
+    // Further search results are held from the beginning of their block on.
+    const int before = mCurrentProperty.mType == TYPE_SEARCH_MORE_PHOTOS
+                           ? mCurrentProperty.mStartIndex - 1 -
+                                 (mCurrentProperty.mStartIndex - 1) % paging::blockSize
+                           : 0;
+    mIsPageDown = false;
+    mInitIndex = indexInPage;
+    mCurrentProperty.mStartIndex = before + qMax(1, number) - indexInPage;
 }
 
 void HomeState::packageArrived(const Package &package)

@@ -21,10 +21,10 @@ struct HomeState
     int mIndexInPage = 0;             // of the record jumped to
     bool mIsPageDown = false;
     bool mIsReturnFromDetail = false;
-    bool mCanPlay = false; // a list has been shown
-    int mInitIndex = -1;   // grid index to focus after a page change; -1: as it is
+    bool mCanPlay = false;      // a list has been shown
+    int mInitIndex = -1;        // grid index to focus after a page change; -1: as it is
+    PackageProperty mAlbumList; // in which the album opened last stood, and the page of it
     int mSelectedAlbumIndex = 0;
-    int mSelectedAlbumStart = 1; // of the page on which that album stood
     int mSelectedPersonIndex = 0;
     int mSelectedPersonStart = 1;
     int mInitStart = 1; // page to show when the list has come
@@ -44,6 +44,8 @@ struct HomeState
     // A page of the list shown; false, and unchanged, when there is none.
     bool pageUp(int arg);
     bool pageDown(int arg, const Package *package);
+    // The page of a record of the list held (from 1), to focus its cell.
+    void selectRecord(int number);
 
     // The list wanted has come, or a cell of it takes the focus.
     void packageArrived(const Package &package);

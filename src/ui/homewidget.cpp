@@ -11,12 +11,12 @@
 #include "ui/formscrollwidget.h"
 #include "ui/homebars.h"
 #include "ui/paging.h"
-#include "ui/stretchedpicture.h"
+#include "ui/qimageslide.h"
 #include "ui/upwidget.h"
 
 #include <QFrame>
-#include <QKeyEvent>
 #include <QMetaMethod>
+#include <QPaintEvent>
 #include <QPainter>
 #include <QScrollBar>
 #include <QStackedLayout>
@@ -106,7 +106,7 @@ void HomeWidget::buildPages(QWidget *frame)
     auto *content = new FormScrollWidget(mCommentArea);
     mCommentArea->setWidget(content);
     content->setColumn(SystemConfig::scrollAreaMaxColumn());
-    mCells = std::make_unique<CellFiller>(content);
+    mCells = std::make_unique<CellFiller>(content, this);
 
     mLoadingPage = new LoadingPage(frame);
     mNoPhotoPage = new NoPhotoAvailableWidget(frame);
@@ -148,7 +148,8 @@ void HomeWidget::requestPage()
     mCurrentPackageData = nullptr;
     mLoadingPage->start();
     showPage(mLoadingPage);
-    mLoadingPage->setFocus();
+    if (mayFocus())
+        mLoadingPage->setFocus();
     if (const int patience = pagePatience())
         mPageTimer.start(patience);
     tryToDownload(mState.mCurrentProperty);
@@ -196,15 +197,8 @@ void HomeWidget::showFailure(ErrorCode code)
 {
     mFailurePage->setReason(code);
     showPage(mFailurePage);
-    mFailurePage->setFocus();
-}
-
-// Return on the failure page: to the list or page before, or up to the menu.
-void HomeWidget::leaveFailure()
-{
-    if (goBack() || handlePageUp(paging::onePage))
-        return;
-    mTitleWidget->setFocus();
+    if (mayFocus())
+        mFailurePage->setFocus();
 }
 
 void HomeWidget::tryToShowCurrentPackage(PackageProperty &property)
@@ -248,7 +242,7 @@ void HomeWidget::focusAfterPageDown()
     if (mState.mCurrentProperty.mType != TYPE_FEATURED_PHOTOS || !wanted)
         return;
     mState.mIsReturnFromDetail = mState.mIsPageDown = false;
-    if (mPages->currentWidget() == mCommentArea)
+    if (mPages->currentWidget() == mCommentArea && mayFocus())
         mCommentArea->updateFocus();
 }
 
@@ -263,7 +257,8 @@ void HomeWidget::pushPackageData()
     mState.mCanPlay = true;
     if (shown == 0) {
         showPage(mNoPhotoPage);
-        mTitleWidget->setFocus();
+        if (mayFocus())
+            mTitleWidget->setFocus();
         return;
     }
     if (mState.mInitIndex >= 0)
@@ -275,8 +270,18 @@ void HomeWidget::pushPackageData()
     updatePhotoRatio(mCommentArea->content()->getIndex());
 }
 
+// The keys belong to the slide show while it is on the screen.
+bool HomeWidget::mayFocus()
+{
+    if (QImageSlide::mIsShowing)
+        logLine("Do not focus on current widget casue QImageSlide is showing");
+    return !QImageSlide::mIsShowing;
+}
+
 void HomeWidget::focusContent()
 {
+    if (!mayFocus())
+        return;
     if (mPages->currentWidget() == mCommentArea)
         mCommentArea->initFocus();
     else if (mPages->currentWidget() != mNoPhotoPage)
@@ -311,95 +316,6 @@ void HomeWidget::startAtFirstCell()
 {
     if (!mCommentArea->content()->setIndex(0))
         mState.mInitIndex = 0;
-}
-
-void HomeWidget::handleCommentEnter(int itemIndex, bool)
-{
-    if (!mCurrentPackageData) {
-        reshow(); // the cache has let go of the list
-        return;
-    }
-    bool opened = false;
-    if (mState.mCurrentProperty.mType == TYPE_ALBUM_LIST)
-        opened = openAlbum(itemIndex);
-    else if (mState.mCurrentProperty.mType == TYPE_FAVORITE_PEOPLE)
-        opened = openPerson(itemIndex);
-    if (!opened)
-        return;
-    startAtFirstCell();
-    mCommentArea->verticalScrollBar()->setValue(0);
-    requestPage();
-}
-
-bool HomeWidget::openAlbum(int itemIndex)
-{
-    const auto *album = mCurrentPackageData->record<Album>(mState.recordIndex(itemIndex));
-    if (!album) {
-        logLine("Wrong iAlbum HomeWidget::handleCommentEnter");
-        return false;
-    }
-    mState.openAlbum(itemIndex, *album);
-    mAlbumStr = album->title();
-    return true;
-}
-
-bool HomeWidget::openPerson(int itemIndex)
-{
-    const auto *person = mCurrentPackageData->record<FavoritePeople>(mState.recordIndex(itemIndex));
-    if (!person) {
-        logLine("Wrong favorite people HomeWidget::handleCommentEnter");
-        return false;
-    }
-    mState.openPerson(itemIndex, *person);
-    mFavoritePeopleName = person->nickname();
-    return true;
-}
-
-bool HomeWidget::handlePageUp(int arg)
-{
-    if (!mState.pageUp(arg))
-        return false;
-    showOtherPage("Page Up, other mCurrentProperty type:");
-    return true;
-}
-
-bool HomeWidget::handlePageDown(int arg)
-{
-    logLine("enter HomeWidget::handlePageDown()");
-    if (!mCurrentPackageData && mPages->currentWidget() == mCommentArea)
-        reshow(); // the cache has let go of the list; what it holds is known when it is back
-    if (!mState.pageDown(arg, mCurrentPackageData))
-        return false;
-    showOtherPage("Page Down, other mCurrentProperty type:");
-    return true;
-}
-
-// Featured photos come page by page; the other lists are held whole.
-void HomeWidget::showOtherPage(const char *otherType)
-{
-    const int type = mState.mCurrentProperty.mType;
-    if (type == TYPE_FEATURED_PHOTOS)
-        handleUpWidgetEnter(mState.mCurrentProperty);
-    else if (mState.isWholeList())
-        reshow();
-    else
-        logLine(otherType, type);
-}
-
-void HomeWidget::reshow()
-{
-    if (mCurrentPackageData) {
-        CellFiller::cancelThumbnails();
-        pushPackageData();
-        return;
-    }
-    mState.restart();
-    requestPage();
-}
-
-void HomeWidget::changeBlock(bool)
-{
-    // Blocks are a matter of search results, which have no page here yet.
 }
 
 void HomeWidget::updatePhotoRatio(int index)
@@ -439,89 +355,6 @@ QList<int> HomeWidget::usefulKeys(bool isList) const
     return keys;
 }
 
-void HomeWidget::keyPressEvent(QKeyEvent *event)
-{
-    event->accept();
-    if (isLoading()) {
-        logLine(" it is downloading data now, so no key press events!");
-        return;
-    }
-    const bool failed = mPages->currentWidget() == mFailurePage;
-    switch (event->key()) {
-    case DEVICE_RETURN_KEY:
-        if (!goBack())
-            confirmSignOut();
-        break;
-    case DEVICE_DOWN_KEY:
-        logLine("<DEVICE_DOWN_KEY> setFocus()");
-        focusContent();
-        break;
-    case DEVICE_UP_KEY:
-        logLine("<DEVICE_UP_KEY> mTitleWidget->setFocus()");
-        mTitleWidget->setFocus();
-        break;
-    case DEVICE_PLAY_KEY:
-    case DEVICE_PLAYPAUSE_KEY:
-        play();
-        break;
-    case DEVICE_RED_KEY:
-        mTitleWidget->returnToHome();
-        updatePhotoRatio(0);
-        break;
-    case DEVICE_PAGEUP_KEY:
-        if (!failed)
-            handlePageUp(paging::onePage);
-        break;
-    case DEVICE_PAGEDOWN_KEY:
-        if (!failed)
-            handlePageDown(paging::onePage);
-        break;
-    default:
-        event->ignore();
-    }
-}
-
-bool HomeWidget::goBack()
-{
-    switch (mState.back()) {
-    case HomeState::Back::Albums:
-        mState.backToAlbums();
-        break;
-    case HomeState::Back::People:
-        mState.backToPeople();
-        break;
-    default:
-        return false;
-    }
-    requestPage();
-    return true;
-}
-
-void HomeWidget::play()
-{
-    const int type = mState.mCurrentProperty.mType;
-    const bool isSearch = type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
-    if (!mState.isPhotoList() || (isSearch && !mState.mIsSearchShown))
-        return;
-    const int cell = mCommentArea->content()->getIndex();
-    const int index = mState.recordIndex(cell);
-    if (cell >= 0 && mState.mCanPlay && index >= 0 && index < recordCount())
-        emit slidePlay(index);
-    else
-        logLine("{HomeWidget::keyPressEvent} mCurrentPackageData is NULL");
-}
-
-void HomeWidget::confirmSignOut()
-{
-    logLine("{HomeWidget::confirmSignOut} signing out is refused");
-    returnFromLogoutCancel();
-}
-
-void HomeWidget::returnFromLogoutCancel()
-{
-    mTitleWidget->cancelSignOut();
-}
-
 void HomeWidget::showEvent(QShowEvent *event)
 {
     QWidget::showEvent(event);
@@ -529,28 +362,8 @@ void HomeWidget::showEvent(QShowEvent *event)
         focusContent();
 }
 
-// Background and content frame are stretched once; a cell's repaint then takes a single blit.
 void HomeWidget::paintEvent(QPaintEvent *event)
 {
-    const QSize pixels = (QSizeF(size()) * devicePixelRatioF()).toSize();
-    if (mBackdrop.size() != pixels || mBackdropFrame != mFrame->geometry())
-        renderBackdrop(pixels);
-    const QRect area = event->rect();
-    const qreal ratio = devicePixelRatioF();
     QPainter painter(this);
-    painter.drawPixmap(
-        area.topLeft(), mBackdrop,
-        QRectF(QPointF(area.topLeft()) * ratio, QSizeF(area.size()) * ratio).toRect());
-}
-
-void HomeWidget::renderBackdrop(const QSize &pixels)
-{
-    mBackdropFrame = mFrame->geometry();
-    mBackdrop = QPixmap(pixels);
-    mBackdrop.fill(Qt::black);
-    mBackdrop.setDevicePixelRatio(devicePixelRatioF());
-    QPainter painter(&mBackdrop);
-    painter.setRenderHint(QPainter::SmoothPixmapTransform);
-    painter.drawPixmap(rect(), QPixmap(QStringLiteral(":/res/orvala_background.png")));
-    painter.drawPixmap(mBackdropFrame, QPixmap(QStringLiteral(":/res/Content_Bg.png")));
+    mBackdrop.paint(painter, event->region(), size(), mFrame->geometry());
 }

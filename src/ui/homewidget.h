@@ -2,11 +2,11 @@
 
 #include "data/package.h"
 #include "network/errorcode.h"
+#include "ui/backdrop.h"
 #include "ui/cellfiller.h"
 #include "ui/gridowner.h"
 #include "ui/homestate.h"
 
-#include <QPixmap>
 #include <QTimer>
 #include <QWidget>
 
@@ -70,6 +70,8 @@ public slots:
     void updatePhotoRatio(int index);
     void handleCommentEnter(int itemIndex, bool isEnterPress);
     void returnFromLogoutCancel();
+    // Shows the page of that record (from 1) with the focus on it.
+    void showRecord(int number);
 
 signals:
     void packageReady(PackageProperty &property);
@@ -99,12 +101,12 @@ private:
     void refreshBars();
     QList<int> usefulKeys(bool isList) const;
     void focusContent();
+    static bool mayFocus();
     bool openAlbum(int itemIndex);
     bool openPerson(int itemIndex);
     bool goBack();
     void play();
     void confirmSignOut();
-    void renderBackdrop(const QSize &pixels);
 
     HomeState mState;
     UpWidget *mTitleWidget;
@@ -117,6 +119,5 @@ private:
     FailurePage *mFailurePage;
     HomeBars *mBars;
     QTimer mPageTimer;
-    QPixmap mBackdrop;    // background and content frame, in device pixels
-    QRect mBackdropFrame; // where the frame is in it
+    Backdrop mBackdrop;
 };

@@ -1,5 +1,6 @@
 #include "ui/informationline.h"
 
+#include <QPaintEvent>
 #include <QPainter>
 
 #include <algorithm>
@@ -18,6 +19,8 @@ InformationLine::InformationLine(QWidget *parent)
     QFont larger = font();
     larger.setPixelSize(kTextHeight);
     setFont(larger);
+    mBold = larger;
+    mBold.setBold(true);
     setSizePolicy(QSizePolicy::Expanding, QSizePolicy::Fixed);
 }
 
@@ -26,9 +29,32 @@ void InformationLine::setTexts(const QString &title, const QString &position)
     const QString shown = title.left(kLongestTitle).simplified();
     if (shown == mTitle && position == mPosition)
         return;
+    const bool onlyPosition = shown == mTitle && position.size() == mPosition.size();
     mTitle = shown;
     mPosition = position;
+    if (onlyPosition) {
+        update(mPositionLeft, 0, width() - mPositionLeft, height());
+        return;
+    }
+    layOut();
     update();
+}
+
+void InformationLine::layOut()
+{
+    const QFontMetrics metrics(mBold);
+    // Room for as many of the widest digits, so that the title stays put while the focus moves.
+    const int position =
+        fontMetrics().horizontalAdvance(QString(mPosition.size(), QLatin1Char('0')));
+    const int room = std::max(0, width() - (mPosition.isEmpty() ? 0 : position + kGap));
+    mShownTitle = metrics.elidedText(mTitle, Qt::ElideRight, room);
+    mPositionLeft = metrics.horizontalAdvance(mShownTitle) + kGap;
+}
+
+void InformationLine::resizeEvent(QResizeEvent *event)
+{
+    QWidget::resizeEvent(event);
+    layOut();
 }
 
 QString InformationLine::text() const
@@ -43,22 +69,15 @@ QSize InformationLine::sizeHint() const
     return {200, fontMetrics().height()};
 }
 
-void InformationLine::paintEvent(QPaintEvent *)
+void InformationLine::paintEvent(QPaintEvent *event)
 {
-    QFont bold = font();
-    bold.setBold(true);
-    const QFontMetrics metrics(bold);
-    const int position =
-        mPosition.isEmpty() ? 0 : fontMetrics().horizontalAdvance(mPosition) + kGap;
-    const int room = std::max(0, width() - position);
-    const QString title = metrics.elidedText(mTitle, Qt::ElideRight, room);
-
     QPainter painter(this);
-    painter.setFont(bold);
-    painter.setPen(QColor(0xe6, 0xed, 0xf2));
-    painter.drawText(rect(), Qt::AlignVCenter, title);
-    painter.setFont(font());
+    if (event->rect().left() < mPositionLeft) {
+        painter.setFont(mBold);
+        painter.setPen(QColor(0xe6, 0xed, 0xf2));
+        painter.drawText(rect(), Qt::AlignVCenter, mShownTitle);
+        painter.setFont(font());
+    }
     painter.setPen(QColor(0xa2, 0xbb, 0xc9));
-    painter.drawText(rect().adjusted(metrics.horizontalAdvance(title) + kGap, 0, 0, 0),
-                     Qt::AlignVCenter, mPosition);
+    painter.drawText(rect().adjusted(mPositionLeft, 0, 0, 0), Qt::AlignVCenter, mPosition);
 }

@@ -20,8 +20,14 @@ public:
 
 protected:
     void paintEvent(QPaintEvent *event) override;
+    void resizeEvent(QResizeEvent *event) override;
 
 private:
+    void layOut();
+
+    QFont mBold;
     QString mTitle;
     QString mPosition;
+    QString mShownTitle; // cut to the room it has
+    int mPositionLeft = 0;
 };

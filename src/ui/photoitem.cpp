@@ -5,8 +5,8 @@
 #include "network/systemconfig.h"
 #include "ui/stretchedpicture.h"
 
+#include <QPaintEvent>
 #include <QPainter>
-#include <QVBoxLayout>
 
 namespace {
 
@@ -22,7 +22,9 @@ const char *const kFocusedStyle =
     "border-image:none;}";
 const char *const kFocusBar = ":/res/FocusBar.png";
 
-const char *const kPictureStyle = "border-image:none;background-color:transparent";
+const char *const kAlbumStyle = "border-image:url(%1);";
+const char *const kPhotoStyle = "background-color:white;border-image:url(%1)";
+const char *const kPlainStyle = "border-image:none;background-color:transparent";
 const char *const kAlbumGround = ":/res/Album_Thumbnail_Bg.png";
 const char *const kPhotoGround = ":/res/Thumbnail_Bg.png";
 
@@ -35,31 +37,26 @@ QString latin(const char *text)
 
 PhotoItem::PhotoItem(QWidget *parent)
     : QFrame(parent)
-    , mArea(new PictureArea(this))
-    , mPicture(new PhotoLabel(mArea))
-    , mCaption(new CaptionLabel(this))
+    , mCaptionFont(font())
 {
+    const QSize cell = SystemConfig::photoItemSize();
+    mCaptionHeight = cell.height() / 5;
+    mPictureHeight = cell.height() - mCaptionHeight;
     setFocusPolicy(Qt::StrongFocus);
     setContentsMargins(10, 0, 10, 0);
-    auto *column = new QVBoxLayout(this);
-    column->setContentsMargins(0, 0, 0, 0);
-    column->setSpacing(0);
-    column->addWidget(mArea);
-    column->addWidget(mCaption, 1, Qt::AlignHCenter | Qt::AlignTop);
+    setFixedSize(cell);
+}
 
-    auto *row = new QHBoxLayout(mArea);
-    row->setContentsMargins(0, 0, 0, 0);
-    row->addWidget(mPicture, 0, Qt::AlignCenter);
+PhotoItem::~PhotoItem()
+{
+    forgetFaces();
+}
 
-    const QSize cell = SystemConfig::photoItemSize();
-    mPicture->setStyleSheet(latin(kPictureStyle));
-    mPicture->setFixedWidth(int(cell.width() * 0.8));
-    mPicture->setAlignment(Qt::AlignCenter);
-    mCaption->setTextFormat(Qt::PlainText);
-    mCaption->setAlignment(Qt::AlignCenter);
-    mCaption->setFixedWidth(cell.width() - 20);
-    const int caption = cell.height() / 5;
-    setHeights(cell.height() - caption, caption, cell);
+void PhotoItem::setBackdrop(QWidget *backdrop)
+{
+    mBackdrop = backdrop;
+    setAttribute(Qt::WA_OpaquePaintEvent, backdrop);
+    change();
 }
 
 QString PhotoItem::styleSheet() const
@@ -67,74 +64,71 @@ QString PhotoItem::styleSheet() const
     return hasFocus() ? latin(kFocusedStyle).arg(latin(kFocusBar)) : latin(kUnfocusedStyle);
 }
 
+QString PhotoItem::groundStyleSheet() const
+{
+    if (mDisplayType == TYPE_ALBUM_LIST)
+        return latin(kAlbumStyle).arg(latin(kAlbumGround));
+    if (mDisplayType == TYPE_ALBUM_PHOTOS)
+        return latin(kPhotoStyle).arg(latin(kPhotoGround));
+    return latin(kPlainStyle);
+}
+
 void PhotoItem::setCaptionFont(const QFont &font)
 {
-    mCaption->setFont(font);
+    mCaptionFont = font;
+    change();
 }
 
 void PhotoItem::setCaptionColor(const QColor &color)
 {
-    QPalette colours = mCaption->palette();
-    colours.setColor(QPalette::WindowText, color);
-    mCaption->setPalette(colours);
-}
-
-void PhotoItem::setHeights(int picture, int caption, const QSize &cell)
-{
-    mPicture->setFixedHeight(picture);
-    mCaption->setFixedHeight(caption);
-    mArea->setFixedHeight(cell.height() - caption - kSpaceBelow);
-    setFixedSize(cell);
+    mCaptionColor = color;
+    change();
 }
 
 void PhotoItem::setDisplayType(int type)
 {
     mDisplayType = type;
     const QSize cell = SystemConfig::photoItemSize();
-    const int line = mCaption->fontMetrics().lineSpacing();
-    const int caption = type == TYPE_ALBUM_LIST ? 2 * line : line;
+    const int line = QFontMetrics(mCaptionFont).lineSpacing();
     const int frame = type == TYPE_ALBUM_PHOTOS ? 25 : 0;
-    if (type == TYPE_ALBUM_LIST)
-        mArea->setGround(QStringLiteral("border-image:url(%1);").arg(latin(kAlbumGround)),
-                         latin(kAlbumGround), Qt::transparent);
-    else if (type == TYPE_ALBUM_PHOTOS)
-        mArea->setGround(
-            QStringLiteral("background-color:white;border-image:url(%1)").arg(latin(kPhotoGround)),
-            latin(kPhotoGround), Qt::white);
-    else
-        mArea->setGround(latin(kPictureStyle), QString(), Qt::transparent);
-    setHeights(cell.height() - line - frame, caption,
-               QSize(cell.width(), cell.height() + caption + 10));
+    mCaptionHeight = type == TYPE_ALBUM_LIST ? 2 * line : line;
+    mPictureHeight = cell.height() - line - frame;
+    mPicture = QPixmap(); // it had another size
+    setFixedSize(cell.width(), cell.height() + mCaptionHeight + 10);
+    change();
 }
 
 void PhotoItem::setCaption(const QString &text)
 {
-    const QString shown = text.left(kLongestCaption);
-    if (mDisplayType == TYPE_ALBUM_LIST)
-        mCaption->setCaption(shown);
-    else
-        mCaption->setCaption(
-            mCaption->fontMetrics().elidedText(shown, Qt::ElideRight, captionWidth()));
+    mCaption = text.left(kLongestCaption);
+    if (mDisplayType != TYPE_ALBUM_LIST)
+        mCaption =
+            QFontMetrics(mCaptionFont).elidedText(mCaption, Qt::ElideRight, captionRect().width());
+    change();
 }
 
-QString PhotoItem::caption() const
+QRect PhotoItem::groundRect() const
 {
-    return mCaption->text();
+    QRect ground = contentsRect();
+    ground.setHeight(height() - mCaptionHeight - kSpaceBelow);
+    return ground;
 }
 
-int PhotoItem::captionWidth() const
+QRect PhotoItem::pictureRect() const
 {
-    return mCaption->maximumWidth();
+    QRect picture(0, 0, int(width() * 0.8), mPictureHeight);
+    picture.moveCenter(groundRect().center());
+    return picture;
 }
 
-QFont PhotoItem::captionFont() const
+QRect PhotoItem::captionRect() const
 {
-    return mCaption->font();
+    return {10, groundRect().bottom() + 1, width() - 20, mCaptionHeight};
 }
 
 QSize PhotoItem::imageSize() const
 {
-    return (QSizeF(mPicture->maximumSize()) * devicePixelRatioF()).toSize();
+    return (QSizeF(pictureRect().size()) * devicePixelRatioF()).toSize();
 }
 
 void PhotoItem::setImage(const QPixmap &picture)
@@ -152,22 +146,31 @@ void PhotoItem::setPlaceholder(const QString &resource)
 void PhotoItem::show(const QPixmap &picture)
 {
     const QSize size = imageSize();
-    if (picture.size() == size) {
-        QPixmap whole = picture;
-        whole.setDevicePixelRatio(devicePixelRatioF());
-        mPicture->setPicture(whole);
-        return;
+    mPicture = picture;
+    mPicture.setDevicePixelRatio(1);
+    if (picture.size() != size) {
+        QPixmap ground(size);
+        ground.fill(Qt::transparent);
+        QPainter painter(&ground);
+        painter.drawPixmap((size.width() - picture.width()) / 2,
+                           (size.height() - picture.height()) / 2, mPicture);
+        painter.end();
+        mPicture = ground;
     }
-    QPixmap ground(size);
-    ground.fill(Qt::transparent);
-    QPixmap photo = picture;
-    photo.setDevicePixelRatio(1);
-    QPainter painter(&ground);
-    painter.drawPixmap((size.width() - photo.width()) / 2, (size.height() - photo.height()) / 2,
-                       photo);
-    painter.end();
-    ground.setDevicePixelRatio(devicePixelRatioF());
-    mPicture->setPicture(ground);
+    mPicture.setDevicePixelRatio(devicePixelRatioF());
+    change();
+}
+
+void PhotoItem::change()
+{
+    forgetFaces();
+    update();
+}
+
+void PhotoItem::forgetFaces()
+{
+    for (QPixmapCache::Key &key : mFaces)
+        QPixmapCache::remove(key);
 }
 
 void PhotoItem::focusInEvent(QFocusEvent *event)
@@ -182,82 +185,57 @@ void PhotoItem::focusOutEvent(QFocusEvent *event)
     update();
 }
 
-void PhotoItem::paintEvent(QPaintEvent *)
+void PhotoItem::paintEvent(QPaintEvent *event)
 {
-    if (!hasFocus())
-        return;
     QPainter painter(this);
-    painter.drawPixmap(0, 0, stretchedPicture(latin(kFocusBar), size(), kBorder, this));
+    if (mBackdrop)
+        copyPixels(painter, face(hasFocus()), event->rect(), devicePixelRatioF());
+    else
+        paintFace(painter, hasFocus());
 }
 
-void PictureArea::setGround(const QString &sheet, const QString &resource, const QColor &colour)
+// Scrolling moves the cell over the backdrop, whose part in the face is then another one.
+QPixmap PhotoItem::face(bool focused)
 {
-    mSheet = sheet;
-    mResource = resource;
-    mColour = colour;
-    update();
-}
-
-void PictureArea::paintEvent(QPaintEvent *)
-{
-    if (mResource.isEmpty())
-        return;
-    QPainter painter(this);
-    if (mColour.alpha() > 0)
-        painter.fillRect(rect(), mColour);
-    painter.drawPixmap(0, 0, loadPicture(mResource, size()));
-}
-
-void PhotoLabel::setPicture(const QPixmap &picture)
-{
-    const QSize size = (QSizeF(maximumSize()) * devicePixelRatioF()).toSize();
-    mPicture = picture;
-    if (!picture.isNull() && picture.size() != size) {
-        mPicture = picture.scaled(size, Qt::IgnoreAspectRatio, Qt::SmoothTransformation);
-        mPicture.setDevicePixelRatio(devicePixelRatioF());
+    const QRect ground(mapTo(mBackdrop, QPoint(0, 0)), mBackdrop->size());
+    if (ground != mFacesGround)
+        forgetFaces();
+    mFacesGround = ground;
+    QPixmap kept;
+    if (!QPixmapCache::find(mFaces[focused], &kept)) {
+        kept = renderFace(focused);
+        mFaces[focused] = QPixmapCache::insert(kept);
     }
-    update();
+    return kept;
 }
 
-void PhotoLabel::paintEvent(QPaintEvent *)
+QPixmap PhotoItem::renderFace(bool focused) const
 {
-    if (mPicture.isNull())
-        return;
-    QPainter painter(this);
-    painter.drawPixmap(0, 0, mPicture);
+    QPixmap face((QSizeF(size()) * devicePixelRatioF()).toSize());
+    face.fill(Qt::black);
+    face.setDevicePixelRatio(devicePixelRatioF());
+    QPainter painter(&face);
+    mBackdrop->render(&painter, QPoint(0, 0), QRect(mFacesGround.topLeft(), size()),
+                      QWidget::RenderFlags());
+    paintFace(painter, focused);
+    painter.end();
+    face.setDevicePixelRatio(1);
+    return face;
 }
 
-void CaptionLabel::setCaption(const QString &text)
+void PhotoItem::paintFace(QPainter &painter, bool focused) const
 {
-    setText(text);
-    mRendered = QPixmap();
-    update();
-}
-
-void CaptionLabel::changeEvent(QEvent *event)
-{
-    QLabel::changeEvent(event);
-    mRendered = QPixmap();
-}
-
-void CaptionLabel::paintEvent(QPaintEvent *)
-{
-    if (text().isEmpty())
-        return;
-    const QSize pixels = (QSizeF(size()) * devicePixelRatioF()).toSize();
-    if (mRendered.size() != pixels)
-        render();
-    QPainter painter(this);
-    painter.drawPixmap(0, 0, mRendered);
-}
-
-void CaptionLabel::render()
-{
-    mRendered = QPixmap((QSizeF(size()) * devicePixelRatioF()).toSize());
-    mRendered.fill(Qt::transparent);
-    mRendered.setDevicePixelRatio(devicePixelRatioF());
-    QPainter painter(&mRendered);
-    painter.setFont(font());
-    painter.setPen(palette().color(QPalette::WindowText));
-    painter.drawText(rect(), int(alignment()), text());
+    if (focused)
+        painter.drawPixmap(0, 0, stretchedPicture(latin(kFocusBar), size(), kBorder, this));
+    const QRect ground = groundRect();
+    if (mDisplayType == TYPE_ALBUM_LIST) {
+        painter.drawPixmap(ground.topLeft(), loadPicture(latin(kAlbumGround), ground.size()));
+    } else if (mDisplayType == TYPE_ALBUM_PHOTOS) {
+        painter.fillRect(ground, Qt::white);
+        painter.drawPixmap(ground.topLeft(), loadPicture(latin(kPhotoGround), ground.size()));
+    }
+    painter.drawPixmap(pictureRect().topLeft(), mPicture);
+    painter.setFont(mCaptionFont);
+    painter.setPen(mCaptionColor);
+    painter.drawText(captionRect(), Qt::AlignCenter, mCaption);
 }

@@ -3,17 +3,15 @@
 #include "data/imagetarget.h"
 
 #include <QFrame>
-#include <QLabel>
+#include <QPixmapCache>
+#include <QPointer>
 
-class PictureArea;
-class PhotoLabel;
-class CaptionLabel;
-
-// One cell of the focus grid: a picture in its frame, and a caption below.
+// One cell of the focus grid: a picture on its ground, and a caption below.
 //
-// What it looks like is fixed by the style sheets that styleSheet() returns, but they are painted
-// by the cell itself, each picture stretched once: setting a sheet at every focus move would
-// re-polish the cell's children and make a move three times as slow.
+// What it looks like is fixed by style sheets, which styleSheet() and groundStyleSheet() return.
+// The cell paints that look itself, as a whole and opaque, and keeps it for each state: a focus
+// move then takes one blit for each of the two cells, where a sheet set anew would re-polish and
+// repaint widgets behind widgets.
 class PhotoItem : public QFrame, public ImageTarget
 {
     Q_OBJECT
@@ -21,13 +19,20 @@ class PhotoItem : public QFrame, public ImageTarget
 
 public:
     explicit PhotoItem(QWidget *parent = nullptr);
+    ~PhotoItem() override;
 
-    // The sheet whose look the cell has now: focused or not.
+    // The widget behind the cell that paints what shows through; without one the cell is
+    // transparent and painted anew each time.
+    void setBackdrop(QWidget *backdrop);
+
+    // The sheet whose look the cell has now: focused or not; and the one of the picture's ground.
     QString styleSheet() const;
+    QString groundStyleSheet() const;
 
     // Font and colour of the caption; set before the display type, which measures the font.
     void setCaptionFont(const QFont &font);
     void setCaptionColor(const QColor &color);
+    QFont captionFont() const { return mCaptionFont; }
 
     // Lays the cell out for the kind of list it shows, a PackageType.
     void setDisplayType(int type);
@@ -35,18 +40,18 @@ public:
     // The caption, as plain text. Albums show it unchanged, in two lines; all other lists cut it at
     // the right to the caption's width.
     void setCaption(const QString &text);
-    QString caption() const; // as shown
-    int captionWidth() const;
-    QFont captionFont() const;
+    QString caption() const { return mCaption; } // as shown
+
+    QRect groundRect() const;
+    QRect pictureRect() const;
+    QRect captionRect() const;
 
     QSize imageSize() const override;
-    // Centres the picture on a transparent ground of the label's size, so that the label has
-    // nothing left to stretch.
+    // Pictures of another size than imageSize() are centred on a transparent ground of that size,
+    // so that nothing is stretched.
     void setImage(const QPixmap &picture) override;
     void setPlaceholder(const QString &resource) override;
-
-    const PhotoLabel *pictureLabel() const { return mPicture; }
-    const PictureArea *pictureArea() const { return mArea; }
+    const QPixmap &picture() const { return mPicture; }
 
 protected:
     void focusInEvent(QFocusEvent *event) override;
@@ -54,71 +59,22 @@ protected:
     void paintEvent(QPaintEvent *event) override;
 
 private:
-    void setHeights(int picture, int caption, const QSize &cell);
+    void change();
+    void forgetFaces();
+    QPixmap face(bool focused);
+    QPixmap renderFace(bool focused) const;
+    void paintFace(QPainter &painter, bool focused) const;
     void show(const QPixmap &picture);
 
-    PictureArea *mArea;
-    PhotoLabel *mPicture;
-    CaptionLabel *mCaption;
     int mDisplayType = 0;
-};
+    QFont mCaptionFont;
+    QColor mCaptionColor = Qt::white;
+    QString mCaption;
+    QPixmap mPicture; // of exactly the picture's size
+    int mPictureHeight;
+    int mCaptionHeight;
 
-// The ground on which a cell's picture lies.
-class PictureArea : public QWidget
-{
-    Q_OBJECT
-    Q_PROPERTY(QString styleSheet READ styleSheet)
-
-public:
-    using QWidget::QWidget;
-
-    // The sheet whose look the area has; it is painted from the resource, stretched once.
-    QString styleSheet() const { return mSheet; }
-    void setGround(const QString &sheet, const QString &resource, const QColor &colour);
-
-protected:
-    void paintEvent(QPaintEvent *event) override;
-
-private:
-    QString mSheet;
-    QString mResource;
-    QColor mColour;
-};
-
-// A label that shows a picture at its own size: one of another size is stretched once, when set.
-class PhotoLabel : public QLabel
-{
-    Q_OBJECT
-
-public:
-    using QLabel::QLabel;
-
-    void setPicture(const QPixmap &picture);
-    const QPixmap &picture() const { return mPicture; }
-
-protected:
-    void paintEvent(QPaintEvent *event) override;
-
-private:
-    QPixmap mPicture;
-};
-
-// A label whose plain text is laid out once and then blitted.
-class CaptionLabel : public QLabel
-{
-    Q_OBJECT
-
-public:
-    using QLabel::QLabel;
-
-    void setCaption(const QString &text);
-
-protected:
-    void paintEvent(QPaintEvent *event) override;
-    void changeEvent(QEvent *event) override;
-
-private:
-    void render();
-
-    QPixmap mRendered;
+    QPointer<QWidget> mBackdrop;
+    QRect mFacesGround;          // where on the backdrop the kept faces were painted, and its size
+    QPixmapCache::Key mFaces[2]; // unfocused, focused
 };

@@ -53,3 +53,14 @@ QPixmap fittedPicture(const QString &resource, const QSize &size)
     QPixmapCache::insert(key, fitted);
     return fitted;
 }
+
+void copyPixels(QPainter &painter, const QPixmap &pixels, const QRect &area, qreal ratio)
+{
+    const QRect part = QRectF(QPointF(area.topLeft()) * ratio, QSizeF(area.size()) * ratio)
+                           .toAlignedRect()
+                           .intersected(pixels.rect());
+    painter.save();
+    painter.scale(1 / ratio, 1 / ratio);
+    painter.drawPixmap(part.topLeft(), pixels, part);
+    painter.restore();
+}

@@ -4,6 +4,7 @@
 #include <QSize>
 #include <QString>
 
+class QPainter;
 class QWidget;
 
 // Pictures of the program's own, fitted once to the size they are painted at and then blitted: a
@@ -17,3 +18,8 @@ QPixmap stretchedPicture(const QString &resource, const QSize &size, int margin,
 
 // The picture as large as fits the size (in device pixels), with its proportions.
 QPixmap fittedPicture(const QString &resource, const QSize &size);
+
+// Copies part of a picture that holds the screen's own pixels (with a device pixel ratio of 1): the
+// area is in layout pixels, the painter starts at the picture's corner, the ratio is the screen's.
+// Left to itself, Qt scales such a picture pixel by pixel, be it by 1.
+void copyPixels(QPainter &painter, const QPixmap &pixels, const QRect &area, qreal ratio);

@@ -1,0 +1,399 @@
+#include "common/ui/remotekeys.h"
+#include "data/download.h"
+#include "data/heldanswers.h"
+#include "data/packagemanager.h"
+#include "data/photomanager.h"
+#include "data/testconfig.h"
+#include "network/connection.h"
+#include "platform/devicestate.h"
+#include "support/logcapture.h"
+#include "support/misbehavingserver.h"
+#include "ui/contentpages.h"
+#include "ui/formscrollarea.h"
+#include "ui/formscrollwidget.h"
+#include "ui/homebars.h"
+#include "ui/homewidget.h"
+#include "ui/photoitem.h"
+#include "ui/samplefeeds.h"
+#include "ui/upwidget.h"
+
+#include <QBuffer>
+#include <QKeyEvent>
+#include <QSignalSpy>
+#include <QtTest>
+
+namespace {
+
+const char *const kFeatured = "/data/feed/api/featured";
+const char *const kMyAlbums = "/data/feed/api/user/default";
+const char *const kPeople = "/data/feed/api/user/default/contacts";
+
+MisbehavingServer::Behaviour answer(const QByteArray &feed)
+{
+    return MisbehavingServer::answer(feed);
+}
+
+// Featured photos, as many a page as asked for.
+void answerFeatured(QTcpSocket *socket, const MisbehavingServer::Request &request)
+{
+    const int at = request.path.indexOf("start-index=") + 12;
+    const int first = request.path.mid(at, request.path.indexOf('&', at) - at).toInt();
+    answer(sample::photos("Photo", first, std::min(first + 7, 20), 20))(socket, request);
+}
+
+} // namespace
+
+// The home screen by key presses, against a server of its own.
+class TestHomeWidget : public QObject
+{
+    Q_OBJECT
+
+private slots:
+    void init();
+    void cleanup();
+    void startsWithFeaturedPhotos();
+    void featuredPhotosArePaged();
+    void opensAlbumsAndGoesBack();
+    void opensPeopleAndGoesBack();
+    void anEmptyListLeavesTheMenu();
+    void aFailureCanBeRetried_data();
+    void aFailureCanBeRetried();
+    void aLatePageCanBeLeft();
+    void aStaleAnswerIsIgnored();
+    void keysWhileLoadingAreDropped();
+    void theCacheMayLetGo();
+    void thumbnailsAreShownUndistorted();
+    void redLeadsHomeAndPlayIsOffered();
+    void hostileTextsStayPlain();
+
+private:
+    void open(const QByteArray &settings = QByteArray());
+    void press(std::initializer_list<int> keys);
+    void enterMenu(int entry);
+    QStringList captions() const;
+    int focused() const { return grid()->content()->getIndex(); }
+    FormScrollArea *grid() const { return mHome->findChild<FormScrollArea *>(); }
+    UpWidget *menu() const { return mHome->findChild<UpWidget *>(); }
+    HomeBars *bars() const { return mHome->findChild<HomeBars *>(); }
+    FailurePage *failure() const { return mHome->findChild<FailurePage *>(); }
+    bool isReady() const { return !mHome->isLoading(); }
+
+    TestConfig mConfig;
+    std::unique_ptr<LogCapture> mLog;
+    std::unique_ptr<MisbehavingServer> mServer;
+    std::unique_ptr<HomeWidget> mHome;
+};
+
+void TestHomeWidget::init()
+{
+    NetworkCableStatus = true;
+    mLog = std::make_unique<LogCapture>();
+    mServer = std::make_unique<MisbehavingServer>();
+    mServer->on(kFeatured, answerFeatured);
+    mServer->on(kMyAlbums, answer(sample::albums("me", 11)));
+    mServer->on(kPeople, answer(sample::people(3)));
+    mServer->on("/data/feed/api/user/p2", answer(sample::albums("p2", 2)));
+    mServer->on("/data/feed/api/user/me/albumid/a10", answer(sample::photos("Holiday", 1, 10, 0)));
+}
+
+void TestHomeWidget::cleanup()
+{
+    mHome.reset();
+    PackageManager::clearAll();
+    PhotoManager::clearAll();
+    mServer.reset();
+    mLog.reset();
+}
+
+void TestHomeWidget::open(const QByteArray &settings)
+{
+    mConfig.write("[Max]\nCacheSize=16\n[Service]\nFeedBase=" + mServer->url("").toUtf8() + '\n' +
+                  settings);
+    PhotoManager::init();
+    mHome = std::make_unique<HomeWidget>();
+    mHome->resize(1280, 720);
+    mHome->show();
+    QVERIFY(QTest::qWaitForWindowActive(mHome.get()));
+}
+
+void TestHomeWidget::press(std::initializer_list<int> keys)
+{
+    for (int key : keys)
+        QTest::sendKeyEvent(QTest::Press, QApplication::focusWidget(), Qt::Key(key), QString(), {});
+}
+
+void TestHomeWidget::enterMenu(int entry)
+{
+    press({DEVICE_UP_KEY, DEVICE_UP_KEY});
+    QVERIFY(menu()->hasFocus());
+    while (menu()->focusIndex() < entry)
+        press({DEVICE_RIGHT_KEY});
+    while (menu()->focusIndex() > entry)
+        press({DEVICE_LEFT_KEY});
+    press({DEVICE_SELECT_KEY});
+}
+
+QStringList TestHomeWidget::captions() const
+{
+    QStringList shown;
+    const auto cells = mHome->findChildren<PhotoItem *>();
+    for (const PhotoItem *cell : cells) {
+        if (cell->isVisible())
+            shown << cell->caption();
+    }
+    return shown;
+}
+
+void TestHomeWidget::startsWithFeaturedPhotos()
+{
+    open();
+    QVERIFY(mHome->isLoading());
+    QTRY_VERIFY(isReady());
+    QCOMPARE(captions().size(), 8);
+    QCOMPARE(captions().first(), QString("Photo 1"));
+    QVERIFY(grid()->content()->cell(0)->hasFocus());
+    QVERIFY(bars()->information().contains("<b>Featured Photos</b>1/20<"));
+    press({DEVICE_DOWN_KEY, DEVICE_RIGHT_KEY});
+    QVERIFY(bars()->information().contains("6/20"));
+    QVERIFY(isHomeMenu);
+    QVERIFY(bars()->isKeyShown(DEVICE_PAGEDOWN_KEY));
+    QVERIFY(!bars()->isKeyShown(DEVICE_PAGEUP_KEY));
+}
+
+void TestHomeWidget::featuredPhotosArePaged()
+{
+    open();
+    QTRY_VERIFY(isReady());
+    press({DEVICE_PAGEUP_KEY});
+    QCOMPARE(mHome->startIndex(), 1);
+    press({DEVICE_RIGHT_KEY, DEVICE_PAGEDOWN_KEY});
+    QTRY_VERIFY(isReady());
+    QCOMPARE(captions().first(), QString("Photo 9"));
+    QCOMPARE(focused(), 0);
+    press({DEVICE_PAGEDOWN_KEY});
+    QTRY_VERIFY(isReady());
+    QCOMPARE(captions(), QStringList({"Photo 17", "Photo 18", "Photo 19", "Photo 20"}));
+    press({DEVICE_PAGEDOWN_KEY});
+    QCOMPARE(mHome->startIndex(), 17);
+    press({DEVICE_LEFT_KEY});
+    QTRY_VERIFY(isReady());
+    QCOMPARE(captions().first(), QString("Photo 9"));
+    QCOMPARE(focused(), 7);
+}
+
+void TestHomeWidget::opensAlbumsAndGoesBack()
+{
+    open();
+    QTRY_VERIFY(isReady());
+    enterMenu(UpWidget::MyPhotosEntry);
+    QTRY_VERIFY(isReady());
+    QVERIFY(HomeWidget::mIsSelfPhoto);
+    QCOMPARE(captions().mid(0, 2), QStringList({"Album 1\n1 photo", "Album 2\n2 photos"}));
+    press({DEVICE_PAGEDOWN_KEY, DEVICE_RIGHT_KEY});
+    QVERIFY(isReady()); // from the list that is held
+    press({DEVICE_SELECT_KEY});
+    QTRY_VERIFY(isReady());
+    QCOMPARE(HomeWidget::mAlbumStr, QString("Album 10"));
+    QCOMPARE(captions().first(), QString("Holiday 1"));
+    QCOMPARE(focused(), 0);
+    QVERIFY(bars()->isKeyShown(DEVICE_RETURN_KEY));
+
+    press({DEVICE_RETURN_KEY});
+    QTRY_VERIFY(isReady());
+    QCOMPARE(mHome->packageType(), int(TYPE_ALBUM_LIST));
+    QCOMPARE(captions().value(focused()), QString("Album 10\n10 photos"));
+    QVERIFY(grid()->content()->cell(1)->hasFocus());
+}
+
+void TestHomeWidget::opensPeopleAndGoesBack()
+{
+    open();
+    QTRY_VERIFY(isReady());
+    enterMenu(UpWidget::FavoritesEntry);
+    QTRY_VERIFY(isReady());
+    press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY});
+    QTRY_VERIFY(isReady());
+    QCOMPARE(HomeWidget::mFavoritePeopleName, QString("Person 2"));
+    QVERIFY(!HomeWidget::mIsSelfPhoto);
+    QCOMPARE(captions().size(), 2);
+    press({DEVICE_RETURN_KEY});
+    QTRY_VERIFY(isReady());
+    QCOMPARE(mHome->packageType(), int(TYPE_FAVORITE_PEOPLE));
+    QCOMPARE(focused(), 1);
+    press({DEVICE_RETURN_KEY}); // nothing above: the list stays
+    QCOMPARE(captions().size(), 3);
+}
+
+void TestHomeWidget::anEmptyListLeavesTheMenu()
+{
+    mServer->on(kMyAlbums, answer(sample::albums("me", 0)));
+    open();
+    QTRY_VERIFY(isReady());
+    enterMenu(UpWidget::MyPhotosEntry);
+    QTRY_VERIFY(isReady());
+    QVERIFY(mHome->findChild<NoPhotoAvailableWidget *>()->isVisible());
+    QVERIFY(menu()->hasFocus());
+    press({DEVICE_DOWN_KEY});
+    QVERIFY(menu()->hasFocus());
+}
+
+void TestHomeWidget::aFailureCanBeRetried_data()
+{
+    QTest::addColumn<MisbehavingServer::Behaviour>("behaviour");
+    QTest::newRow("not found") << MisbehavingServer::answer("", 404);
+    QTest::newRow("an empty answer") << MisbehavingServer::answer("");
+    QTest::newRow("no answer at all") << MisbehavingServer::reset();
+}
+
+void TestHomeWidget::aFailureCanBeRetried()
+{
+    QFETCH(MisbehavingServer::Behaviour, behaviour);
+    open();
+    QTRY_VERIFY(isReady());
+    mServer->on(kPeople, behaviour);
+    enterMenu(UpWidget::FavoritesEntry);
+    QTRY_VERIFY(failure()->isVisible());
+    QVERIFY(failure()->hasFocus());
+    QVERIFY(!failure()->reason().isEmpty());
+    mServer->on(kPeople, answer(sample::people(3)));
+    press({DEVICE_SELECT_KEY});
+    QTRY_COMPARE(captions().size(), 3);
+    QVERIFY(grid()->content()->cell(0)->hasFocus());
+}
+
+void TestHomeWidget::aLatePageCanBeLeft()
+{
+    mServer->on("/data/feed/api/user/me/albumid/a1", MisbehavingServer::silence());
+    open("[Network]\nPageSeconds=1\n");
+    QTRY_VERIFY(isReady());
+    enterMenu(UpWidget::MyPhotosEntry);
+    QTRY_VERIFY(isReady());
+    press({DEVICE_SELECT_KEY});
+    QVERIFY(mHome->isLoading());
+    QTRY_VERIFY(failure()->isVisible());
+    press({DEVICE_RETURN_KEY});
+    QTRY_COMPARE(captions().size(), 8);
+    QCOMPARE(mHome->packageType(), int(TYPE_ALBUM_LIST));
+}
+
+void TestHomeWidget::aStaleAnswerIsIgnored()
+{
+    HeldAnswers held;
+    mServer->on(kPeople, held.hold());
+    open("[Network]\nPageSeconds=1\n");
+    QTRY_VERIFY(isReady());
+    enterMenu(UpWidget::FavoritesEntry);
+    QTRY_VERIFY(failure()->isVisible());
+    press({DEVICE_RETURN_KEY});
+    QVERIFY(menu()->hasFocus());
+    enterMenu(UpWidget::MyPhotosEntry);
+    QTRY_COMPARE(captions().size(), 8);
+    held.answerFirst(answer(sample::people(3)));
+    QTRY_VERIFY(LogCapture::lines().filter("try to show CurrentPackage").size() >= 3);
+    QCOMPARE(captions().first(), QString("Album 1\n1 photo"));
+}
+
+void TestHomeWidget::keysWhileLoadingAreDropped()
+{
+    HeldAnswers held;
+    mServer->on(kPeople, held.hold());
+    open();
+    QTRY_VERIFY(isReady());
+    enterMenu(UpWidget::FavoritesEntry);
+    QTRY_COMPARE(held.count(), 1);
+    press({DEVICE_RETURN_KEY, DEVICE_UP_KEY, DEVICE_RED_KEY, DEVICE_SELECT_KEY});
+    QVERIFY(mHome->isLoading());
+    QCOMPARE(mHome->packageType(), int(TYPE_FAVORITE_PEOPLE));
+    QVERIFY(LogCapture::contains(" it is downloading data now, so no key press events!"));
+    held.answerFirst(answer(sample::people(3)));
+    QTRY_VERIFY(isReady());
+    QCOMPARE(captions().size(), 3);
+}
+
+void TestHomeWidget::theCacheMayLetGo()
+{
+    open();
+    QTRY_VERIFY(isReady());
+    enterMenu(UpWidget::MyPhotosEntry);
+    QTRY_VERIFY(isReady());
+    for (int key : {DEVICE_SELECT_KEY, DEVICE_PAGEDOWN_KEY}) {
+        PackageManager::clearAll();
+        QVERIFY(!HomeWidget::mCurrentPackageData);
+        press({key});
+        QTRY_VERIFY(isReady());
+        QVERIFY(HomeWidget::mCurrentPackageData);
+        QCOMPARE(captions().first(), QString("Album 1\n1 photo"));
+    }
+    press({DEVICE_PAGEDOWN_KEY});
+    QCOMPARE(captions().first(), QString("Album 9\n9 photos"));
+}
+
+void TestHomeWidget::thumbnailsAreShownUndistorted()
+{
+    QImage portrait(30, 60, QImage::Format_RGB32);
+    portrait.fill(Qt::red);
+    QByteArray bytes;
+    QBuffer buffer(&bytes);
+    buffer.open(QIODevice::WriteOnly);
+    portrait.save(&buffer, "PNG");
+    mServer->on("/portrait.png", answer(bytes));
+    mServer->on(kFeatured,
+                answer(sample::feed({sample::photo("Tall", mServer->url("/portrait.png"))}, 1)));
+    open();
+    auto *cell = mHome->findChild<PhotoItem *>();
+    QTRY_COMPARE(cell->picture().toImage().pixelColor(cell->imageSize().width() / 2,
+                                                      cell->imageSize().height() / 2),
+                 QColor(Qt::red));
+    const QImage shown = cell->picture().toImage();
+    QCOMPARE(shown.size(), cell->imageSize());
+    int red = 0;
+    for (int x = 0; x < shown.width(); ++x)
+        red += shown.pixelColor(x, shown.height() / 2) == QColor(Qt::red);
+    QVERIFY(qAbs(red - shown.height() / 2) <= 2);
+    QCOMPARE(shown.pixelColor(0, 0).alpha(), 0);
+    QVERIFY(Download::mHomeLabelUrlHash.isEmpty());
+}
+
+void TestHomeWidget::redLeadsHomeAndPlayIsOffered()
+{
+    open();
+    QTRY_VERIFY(isReady());
+    QVERIFY(!bars()->isKeyShown(DEVICE_PLAY_KEY));
+    QSignalSpy played(mHome.get(), &HomeWidget::slidePlay);
+    press({DEVICE_RIGHT_KEY});
+    QVERIFY(bars()->isKeyShown(DEVICE_PLAY_KEY));
+    press({DEVICE_PLAY_KEY});
+    QCOMPARE(played.value(0), QVariantList({1}));
+    enterMenu(UpWidget::MyPhotosEntry);
+    QTRY_VERIFY(isReady());
+    press({DEVICE_PLAY_KEY});
+    QCOMPARE(played.size(), 1);
+    press({DEVICE_RED_KEY});
+    QTRY_VERIFY(isReady());
+    QCOMPARE(mHome->packageType(), int(TYPE_FEATURED_PHOTOS));
+    QVERIFY(grid()->content()->cell(0)->hasFocus());
+    QCOMPARE(menu()->selectedIndex(), int(UpWidget::HomeEntry));
+}
+
+void TestHomeWidget::hostileTextsStayPlain()
+{
+    QString nested = QString("<table>").repeated(5000);
+    mServer->on(kMyAlbums,
+                answer(sample::feed({sample::album("<img src='/etc/passwd'>", 1, "a1"),
+                                     sample::album(nested + QString(200000, 'x'), 2, "a2"),
+                                     sample::album("two\nlines", 3, "a3")},
+                                    3)));
+    mServer->on("/data/feed/api/user/owner/albumid/a1", answer(sample::photos("P", 1, 1, 0)));
+    open();
+    QTRY_VERIFY(isReady());
+    enterMenu(UpWidget::MyPhotosEntry);
+    QTRY_COMPARE(captions().size(), 3);
+    QVERIFY(captions().at(1).size() < 60);
+    QCOMPARE(captions().at(2), QString("two lines\n3 photos"));
+    press({DEVICE_SELECT_KEY});
+    QTRY_VERIFY(isReady());
+    QVERIFY(bars()->information().contains("<b>&lt;img src='/etc/passwd'&gt;</b>"));
+}
+
+QTEST_MAIN(TestHomeWidget)
+#include "tst_homewidget.moc"
