@@ -44,6 +44,7 @@ public:
 
     QString url(const QString &path) const; // absolute, with the port
     const QList<Request> &requests() const { return mRequests; }
+    void forgetRequests() { mRequests.clear(); }
     int connections() const { return mConnections; } // accepted so far
     int openConnections() const;
     void closeConnections(); // from the server's side
