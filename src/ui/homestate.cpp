@@ -26,6 +26,8 @@ bool HomeState::enterMenu(const PackageProperty &property)
     mCurrentProperty = property;
     mInitIndex = -1;
     mInitStart = 1;
+    mIsSearchShown = false;
+    mBlock = 0;
     mIsFromFavorites = property.mType == TYPE_FAVORITE_PEOPLE;
     if (mIsFromFavorites) {
         mSelectedPersonIndex = 0;
@@ -64,8 +66,7 @@ HomeState::Back HomeState::back() const
         return Back::Albums;
     if (type == TYPE_ALBUM_LIST && mIsFromFavorites)
         return Back::People;
-    const bool isSearch = type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
-    return isSearch && mIsSearchShown ? Back::SearchBar : Back::SignOut;
+    return isSearch() && mIsSearchShown ? Back::SearchBar : Back::SignOut;
 }
 
 void HomeState::backToAlbums()
@@ -85,8 +86,54 @@ void HomeState::backToPeople()
     mInitStart = mSelectedPersonStart;
 }
 
+void HomeState::startSearch(const QString &text)
+{
+    mCurrentProperty = PackageProperty();
+    mCurrentProperty.mType = TYPE_SEARCH_PHOTOS;
+    mCurrentProperty.mSearchedStr = text;
+    mIsSearchShown = true;
+    mBlock = 0;
+    mInitStart = 1;
+}
+
+void HomeState::backToSearchBar()
+{
+    mCurrentProperty.mType = TYPE_SEARCH_PHOTOS;
+    mCurrentProperty.mStartIndex = 1;
+    mIsSearchShown = false;
+    mBlock = 0;
+}
+
+bool HomeState::changeBlock(bool next)
+{
+    const int block = paging::neighbourBlock(mBlock, next, mTotalPhotoNum);
+    if (!isSearch() || block == mBlock)
+        return false;
+    mBlock = block;
+    mCurrentProperty.mType = TYPE_SEARCH_MORE_PHOTOS;
+    mCurrentProperty.mStartIndex = paging::blockStart(block);
+    return true;
+}
+
+void HomeState::followTo(int number)
+{
+    int &start = mCurrentProperty.mStartIndex;
+    if (!isSearch()) {
+        start = paging::pageUp(start, number).startIndex;
+        return;
+    }
+    mBlock = (number - 1) / paging::blockSize;
+    const int first = paging::blockStart(mBlock);
+    start = first - 1 + paging::pageUp(1, number - first + 1).startIndex;
+    if (mBlock > 0)
+        mCurrentProperty.mType = TYPE_SEARCH_MORE_PHOTOS;
+}
+
 bool HomeState::pageUp(int arg)
 {
+    const bool startsBlock = isSearch() && mCurrentProperty.mStartIndex % paging::blockSize == 1;
+    if (startsBlock && arg == paging::onePage)
+        return false;
     const paging::Page page = paging::pageUp(mCurrentProperty.mStartIndex, arg);
     if (!page.exists)
         return false;
@@ -98,6 +145,9 @@ bool HomeState::pageUp(int arg)
 
 bool HomeState::pageDown(int arg, const Package *package)
 {
+    if (isSearch() && arg == paging::onePage && package &&
+        recordIndex(paging::pageSize) >= package->count())
+        return false; // the next page is the next block's
     const paging::Page page = paging::pageDown(mCurrentProperty.mStartIndex, total(package), arg);
     if (!page.exists)
         return false;
@@ -136,6 +186,17 @@ void HomeState::restart()
 int HomeState::recordIndex(int cell) const
 {
     return paging::recordIndex(mCurrentProperty.mType, mCurrentProperty.mStartIndex, cell);
+}
+
+int HomeState::firstNumber() const
+{
+    return mCurrentProperty.mStartIndex - recordIndex(0);
+}
+
+bool HomeState::isSearch() const
+{
+    const int type = mCurrentProperty.mType;
+    return type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
 }
 
 int HomeState::total(const Package *package) const

@@ -41,9 +41,19 @@ struct HomeState
     void backToAlbums();
     void backToPeople();
 
+    // Search words are searched for; the results are left for the search bar.
+    void startSearch(const QString &text);
+    void backToSearchBar();
+    // The neighbouring block of search results; false, and unchanged, when there is none.
+    bool changeBlock(bool next);
+
     // A page of the list shown; false, and unchanged, when there is none.
     bool pageUp(int arg);
     bool pageDown(int arg, const Package *package);
+
+    // The page that holds a record, by its number in the whole list. Among search results it may lie
+    // in another block.
+    void followTo(int number);
 
     // The list wanted has come, or a cell of it takes the focus.
     void packageArrived(const Package &package);
@@ -52,6 +62,8 @@ struct HomeState
     void restart();
 
     int recordIndex(int cell) const;
+    int firstNumber() const; // in the whole list, of the first record of the list that is held
+    bool isSearch() const;
     int total(const Package *package) const;
     bool isPhotoList() const;
     bool isWholeList() const; // pages are cut from a list that is held
