@@ -67,6 +67,10 @@ public:
     // Code of the last request, for the owner to ask after its end.
     ErrorCode errorCode() const { return mErrorCode; }
 
+    // Whether the last GET failed because the server wants another sign-in (status 401), which has no
+    // code of its own.
+    bool isSignInRefused() const { return mIsSignInRefused; }
+
     // Synchronous requests: block until the answer is complete, the time-out expires or the program
     // exits (NET_CANCELED).
     ErrorCode post(const QString &url, const char *data, qint64 length);
@@ -130,4 +134,5 @@ private:
     int mHops = 0;                       // redirects of the current request
     QTimer mNextHop;
     bool mIsRemoved = false;
+    bool mIsSignInRefused = false;
 };

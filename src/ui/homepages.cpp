@@ -58,9 +58,9 @@ HomePages::HomePages(QWidget *parent)
     content->setColumn(SystemConfig::scrollAreaMaxColumn());
     mPages->setSizeConstraint(QLayout::SetNoConstraint); // the screen's size is given
     // As Page numbers them.
-    for (QWidget *page : std::initializer_list<QWidget *>{
-             mGrid, mLoadingPage, mNoPhotoPage, mFailurePage, new SearchPage(mSearchBar, this),
-             mDetail})
+    for (QWidget *page :
+         std::initializer_list<QWidget *>{mGrid, mLoadingPage, mNoPhotoPage, mFailurePage,
+                                          new SearchPage(mSearchBar, this), mDetail})
         mPages->addWidget(page);
 
     connect(mFailurePage, &FailurePage::retryRequested, this, &HomePages::retryRequested);

@@ -1,6 +1,7 @@
 #include "ui/homestate.h"
 
 #include "base/log.h"
+#include "ui/detailpaging.h"
 #include "ui/paging.h"
 
 namespace {
@@ -112,19 +113,16 @@ bool HomeState::changeBlock(bool next)
     mBlock = block;
     mCurrentProperty.mType = TYPE_SEARCH_MORE_PHOTOS;
     mCurrentProperty.mStartIndex = paging::blockStart(block);
+    mInitStart = 1;
     return true;
 }
 
 void HomeState::followTo(int number)
 {
-    int &start = mCurrentProperty.mStartIndex;
-    if (!isSearch()) {
-        start = paging::pageUp(start, number).startIndex;
+    mCurrentProperty.mStartIndex = detailpaging::pageStart(mCurrentProperty.mType, number);
+    if (!isSearch())
         return;
-    }
     mBlock = (number - 1) / paging::blockSize;
-    const int first = paging::blockStart(mBlock);
-    start = first - 1 + paging::pageUp(1, number - first + 1).startIndex;
     if (mBlock > 0)
         mCurrentProperty.mType = TYPE_SEARCH_MORE_PHOTOS;
 }
@@ -159,9 +157,10 @@ bool HomeState::pageDown(int arg, const Package *package)
 
 void HomeState::packageArrived(const Package &package)
 {
-    if (hasFeedTotal(mCurrentProperty.mType))
+    const int type = mCurrentProperty.mType;
+    if (hasFeedTotal(type))
         mTotalPhotoNum = package.mTotalCount;
-    else if (mInitStart > 1 && mInitStart <= package.count())
+    if (mInitStart > 1 && paging::recordIndex(type, mInitStart, 0) < package.count())
         mCurrentProperty.mStartIndex = mInitStart;
     mInitStart = 1;
 }
@@ -177,10 +176,10 @@ void HomeState::moveTo(int cell, const Package *package)
 
 void HomeState::restart()
 {
-    if (hasFeedTotal(mCurrentProperty.mType))
+    if (mCurrentProperty.mType == TYPE_FEATURED_PHOTOS)
         return;
     mInitStart = mCurrentProperty.mStartIndex;
-    mCurrentProperty.mStartIndex = 1;
+    mCurrentProperty.mStartIndex = paging::blockStart(mBlock);
 }
 
 int HomeState::recordIndex(int cell) const

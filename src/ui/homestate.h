@@ -51,8 +51,8 @@ struct HomeState
     bool pageUp(int arg);
     bool pageDown(int arg, const Package *package);
 
-    // The page that holds a record, by its number in the whole list. Among search results it may lie
-    // in another block.
+    // The page that holds a record, by its number in the whole list. Among search results it may
+    // lie in another block.
     void followTo(int number);
 
     // The list wanted has come, or a cell of it takes the focus.
