@@ -155,6 +155,20 @@ bool HomeState::pageDown(int arg, const Package *package)
     return true;
 }
 
+bool HomeState::canRestart() const
+{
+    return mCurrentProperty.mStartIndex > 1 && mInitStart == 1;
+}
+
+bool HomeState::turnToMissingPage(const Package &package)
+{
+    if (mCurrentProperty.mType != TYPE_FEATURED_PHOTOS || mInitStart <= package.count() ||
+        package.count() < mCurrentProperty.mStartIndex || package.count() >= package.mTotalCount)
+        return false;
+    mCurrentProperty.mStartIndex = package.count() + 1;
+    return true;
+}
+
 void HomeState::packageArrived(const Package &package)
 {
     const int type = mCurrentProperty.mType;
@@ -176,8 +190,6 @@ void HomeState::moveTo(int cell, const Package *package)
 
 void HomeState::restart()
 {
-    if (mCurrentProperty.mType == TYPE_FEATURED_PHOTOS)
-        return;
     mInitStart = mCurrentProperty.mStartIndex;
     mCurrentProperty.mStartIndex = paging::blockStart(mBlock);
 }

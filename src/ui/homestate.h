@@ -58,8 +58,12 @@ struct HomeState
     // The list wanted has come, or a cell of it takes the focus.
     void packageArrived(const Package &package);
     void moveTo(int cell, const Package *package);
-    // The list is to be fetched anew, to show the same page.
+    // The list is to be fetched anew, to show the same page; useless while that is going on.
     void restart();
+    bool canRestart() const;
+    // Featured photos come page by page: turns to the next one when the page to be shown after a
+    // restart lies behind what is held.
+    bool turnToMissingPage(const Package &package);
 
     int recordIndex(int cell) const;
     int firstNumber() const; // in the whole list, of the first record of the list that is held

@@ -200,7 +200,9 @@ void HomeWidget::tryToShowCurrentPackage(PackageProperty &property)
     if (property.mStartIndex != wanted.mStartIndex)
         logLine("property.mStartIndex do not match");
     mCurrentPackageData = takeUsablePackage();
-    if (mCurrentPackageData) {
+    if (mCurrentPackageData && mState.turnToMissingPage(*mCurrentPackageData)) {
+        tryToDownload(wanted);
+    } else if (mCurrentPackageData) {
         mState.packageArrived(*mCurrentPackageData);
         allPhotoNum = mState.total(mCurrentPackageData);
         pushPackageData();
@@ -208,8 +210,22 @@ void HomeWidget::tryToShowCurrentPackage(PackageProperty &property)
     } else if (property.mStartIndex != wanted.mStartIndex) {
         tryToDownload(wanted); // another page of the list has come, without the one wanted
     } else {
-        showFailure(NET_NO_DATA);
+        fetchAnew();
     }
+}
+
+// A page has come alone, without those before it, which the cache has let go.
+void HomeWidget::fetchAnew()
+{
+    if (mPages->isShown(HomePages::Detail))
+        return; // it fetches what it needs itself
+    if (!mState.canRestart()) {
+        showFailure(NET_NO_DATA);
+        return;
+    }
+    PackageManager::removeCache(mState.mCurrentProperty);
+    mState.restart();
+    requestPage();
 }
 
 // The list from the cache. One that begins later than the page wanted is dropped: only a page

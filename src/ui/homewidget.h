@@ -102,6 +102,7 @@ private:
     void showFailure(ErrorCode code);
     void leaveFailure();
     Package *takeUsablePackage();
+    void fetchAnew();
     void holdPackage();
     void pushPackageData();
     void focusAfterPageDown();
