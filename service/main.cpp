@@ -44,6 +44,12 @@ void addServe(CLI::App &program, ServeOptions &options, int &result)
             [&service](int seconds) { service.scanPause = std::chrono::seconds(seconds); },
             "Seconds between scans of the photo folders (300)")
         ->check(CLI::Range(1, 86'400));
+    command
+        ->add_option_function<int>(
+            "--token-days",
+            [&service](int days) { service.accessLife = std::chrono::hours(days * 24); },
+            "Days for which a sign-in opens the feeds before it is renewed (90)")
+        ->check(CLI::Range(1, 3650));
     command->callback([&] { result = runServe(options); });
 }
 
@@ -55,15 +61,19 @@ void addUsers(CLI::App &program, UserOptions &options, int &result)
     CLI::App *list = users->add_subcommand("list", "Number, mail, name and folder of each user");
     CLI::App *remove = users->add_subcommand("remove", "Forget a user; photo files stay");
     CLI::App *token = users->add_subcommand("token", "Print tokens for a user, valid for 90 days");
-    for (CLI::App *command : {add, list, remove, token})
+    CLI::App *password = users->add_subcommand(
+        "passwd", "Give a user a password, the first line of the input; ends their sign-ins");
+    for (CLI::App *command : {add, list, remove, token, password})
         addData(command, options.data);
-    for (CLI::App *command : {add, remove, token})
+    for (CLI::App *command : {add, remove, token, password})
         command->add_option("mail", options.mail, "The user's mail address")->required();
     add->add_option("--name", options.name, "The name that others see")->required();
     add->add_option("--photos", options.photos, "The user's photo folder");
     add->callback([&] { result = runUserAdd(options); });
+    add->add_flag("--password", options.readsPassword, "Read a password as passwd does");
     list->callback([&] { result = runUserList(options.data); });
     remove->callback([&] { result = runUserRemove(options.data, options.mail); });
+    password->callback([&] { result = runUserPassword(options.data, options.mail); });
     token->callback([&] { result = runUserToken(options.data, options.mail); });
 }
 
@@ -95,7 +105,7 @@ int main(int argc, char **argv)
     const std::string standardData = "orvala-data";
     ServeOptions serve;
     serve.service.data = standardData;
-    UserOptions user{standardData, "", "", ""};
+    UserOptions user{standardData, "", "", "", false};
     std::string data = standardData, file, folder;
     int result = 0;
     addServe(program, serve, result);

@@ -3,11 +3,11 @@
 #include "base/secrets.h"
 #include "feeds/feeds.h"
 #include "feeds/photopictures.h"
-#include "feeds/tokenendpoint.h"
 #include "http/httpserver.h"
 #include "index/database.h"
 #include "pictures/thumbnailstore.h"
 #include "scan/scanner.h"
+#include "signin/signinpages.h"
 
 #include <fcntl.h>
 #include <sys/file.h>
@@ -16,6 +16,8 @@
 #include <filesystem>
 
 namespace {
+
+constexpr std::chrono::minutes codeLife{5};
 
 bool makeDataFolder(const std::string &folder, std::string *error)
 {
@@ -52,6 +54,8 @@ struct Service::Parts
     std::unique_ptr<ThumbnailStore> thumbnails;
     std::unique_ptr<Feeds> feeds;
     std::unique_ptr<PhotoPictures> pictures;
+    AuthorisationCodes codes{codeLife, SteadyClock::now};
+    std::unique_ptr<SignInPages> signIn;
     std::unique_ptr<TokenEndpoint> tokens;
     Router router;
     std::unique_ptr<HttpServer> server;
@@ -87,9 +91,14 @@ bool Service::Parts::startServer(const ServiceSettings &settings, std::string *e
         std::make_unique<ThumbnailStore>(settings.data + "/thumbnails", settings.thumbnailBytes);
     feeds = std::make_unique<Feeds>(*database, settings.withTls ? "https" : "http");
     pictures = std::make_unique<PhotoPictures>(*database, *thumbnails);
-    tokens = std::make_unique<TokenEndpoint>(*database);
+    tokens = std::make_unique<TokenEndpoint>(*database, codes,
+                                             std::chrono::seconds(settings.accessLife).count());
+    SignInPages::Settings pages;
+    pages.withTls = settings.withTls;
+    signIn = std::make_unique<SignInPages>(*database, codes, pages);
     feeds->addRoutes(router);
     pictures->addRoutes(router);
+    signIn->addRoutes(router);
     tokens->addRoutes(router);
     HttpServer::Settings http;
     http.address = settings.listen;

@@ -19,6 +19,7 @@ struct ServiceSettings
     std::string key;         // empty: in the certificate's file
     int threads = 16;
     std::chrono::seconds scanPause{300};
+    std::chrono::hours accessLife{90 * 24}; // of an access token
     std::int64_t thumbnailBytes = std::int64_t(8) << 30;
 };
 

@@ -3,7 +3,15 @@
 #include <sodium.h>
 
 #include <array>
+#include <mutex>
+#include <new>
 #include <vector>
+
+namespace {
+
+std::mutex hashing;
+
+} // namespace
 
 bool initialiseSecrets()
 {
@@ -36,4 +44,21 @@ bool equalSecrets(const std::string &one, const std::string &other)
 {
     const std::string first = fingerprint(one), second = fingerprint(other);
     return sodium_memcmp(first.data(), second.data(), first.size()) == 0;
+}
+
+std::string passwordHash(const std::string &password)
+{
+    const std::lock_guard<std::mutex> lock(hashing);
+    std::array<char, crypto_pwhash_STRBYTES> hash;
+    if (crypto_pwhash_str(hash.data(), password.data(), password.size(),
+                          crypto_pwhash_OPSLIMIT_INTERACTIVE,
+                          crypto_pwhash_MEMLIMIT_INTERACTIVE) != 0)
+        throw std::bad_alloc(); // there is no other way to fail
+    return hash.data();
+}
+
+bool passwordFits(const std::string &hash, const std::string &password)
+{
+    const std::lock_guard<std::mutex> lock(hashing);
+    return crypto_pwhash_str_verify(hash.c_str(), password.data(), password.size()) == 0;
 }

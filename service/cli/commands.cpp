@@ -4,11 +4,15 @@
 #include "index/catalogue.h"
 #include "index/database.h"
 #include "index/imports.h"
+#include "index/passwords.h"
 #include "index/tokens.h"
 #include "index/users.h"
 #include "service.h"
 
 #include <nlohmann/json.hpp>
+
+#include <termios.h>
+#include <unistd.h>
 
 #include <filesystem>
 #include <fstream>
@@ -54,6 +58,26 @@ bool isFolder(const std::string &path)
     return std::filesystem::is_directory(path, code);
 }
 
+// The first line of the input; what is typed at a terminal stays invisible.
+std::string readPassword()
+{
+    termios state{};
+    const bool isTerminal = ::tcgetattr(STDIN_FILENO, &state) == 0;
+    if (isTerminal) {
+        std::cerr << "Password: " << std::flush;
+        termios silent = state;
+        silent.c_lflag &= ~tcflag_t(ECHO);
+        ::tcsetattr(STDIN_FILENO, TCSAFLUSH, &silent);
+    }
+    std::string line;
+    std::getline(std::cin, line);
+    if (isTerminal) {
+        ::tcsetattr(STDIN_FILENO, TCSAFLUSH, &state);
+        std::cerr << "\n";
+    }
+    return line;
+}
+
 } // namespace
 
 int runUserAdd(const UserOptions &options)
@@ -62,9 +86,15 @@ int runUserAdd(const UserOptions &options)
         return fail("\"" + options.mail + "\" is no mail address");
     if (!options.photos.empty() && !isFolder(options.photos))
         return fail("there is no folder " + options.photos);
+    const std::string password = options.readsPassword ? readPassword() : "";
+    const std::string problem = options.readsPassword ? passwordProblem(password) : "";
+    if (!problem.empty())
+        return fail(problem);
     return withIndex(options.data, [&](Database &database) {
         const std::string photos = options.photos.empty() ? "" : absoluteFolder(options.photos);
         saveUser(database, {0, options.mail, options.name, photos});
+        if (options.readsPassword)
+            setPassword(database, options.mail, password);
         return 0;
     });
 }
@@ -84,6 +114,17 @@ int runUserRemove(const std::string &data, const std::string &mail)
 {
     return withIndex(data, [&](Database &database) {
         return removeUser(database, mail) ? 0 : fail("there is no user " + mail);
+    });
+}
+
+int runUserPassword(const std::string &data, const std::string &mail)
+{
+    const std::string password = readPassword();
+    const std::string problem = passwordProblem(password);
+    if (!problem.empty())
+        return fail(problem);
+    return withIndex(data, [&](Database &database) {
+        return setPassword(database, mail, password) ? 0 : fail("there is no user " + mail);
     });
 }
 

@@ -10,11 +10,14 @@ struct UserOptions
     std::string mail;
     std::string name;
     std::string photos;
+    bool readsPassword = false; // from the first line of the input
 };
 
 int runUserAdd(const UserOptions &options);
 int runUserList(const std::string &data);
 int runUserRemove(const std::string &data, const std::string &mail);
+// The new password is the first line of the input.
+int runUserPassword(const std::string &data, const std::string &mail);
 // Prints {"access_token", "refresh_token", "expires_in"}.
 int runUserToken(const std::string &data, const std::string &mail);
 // Paths in the file start at the folder, when one is given.

@@ -1,13 +1,16 @@
 #include "index/imports.h"
 
+#include "base/secrets.h"
 #include "base/texts.h"
 #include "index/database.h"
+#include "index/passwords.h"
 #include "index/photosearch.h"
 #include "index/users.h"
 
 #include <nlohmann/json.hpp>
 
 #include <filesystem>
+#include <map>
 
 using nlohmann::json;
 
@@ -138,6 +141,31 @@ int applyWaiting(Session &session)
     return waiting;
 }
 
+bool checkPasswords(const json &document, std::string *error)
+{
+    for (const json &user : document.value("users", json::array())) {
+        const std::string problem =
+            user.contains("password") ? passwordProblem(textOf(user, "password")) : "";
+        if (problem.empty())
+            continue;
+        *error = textOf(user, "mail") + ": " + problem;
+        return false;
+    }
+    return true;
+}
+
+// By mail, for the users who have no password yet. Hashing takes its time: before the transaction.
+std::map<std::string, std::string> firstPasswords(Database &database, const json &document)
+{
+    std::map<std::string, std::string> hashes;
+    for (const json &user : document.value("users", json::array())) {
+        const std::string mail = textOf(user, "mail");
+        if (user.contains("password") && !hasPassword(database, mail))
+            hashes[mail] = passwordHash(textOf(user, "password"));
+    }
+    return hashes;
+}
+
 bool checkTimes(const json &document, std::string *error)
 {
     for (const json &entry : document.value("comments", json::array())) {
@@ -165,7 +193,7 @@ bool checkShape(const json &document, std::string *error)
     return checkList(document, "users", {"mail", "name"}, error) &&
            checkList(document, "comments", {"photo", "author", "text"}, error) &&
            checkList(document, "tags", {"photo", "author", "tag"}, error) &&
-           checkTimes(document, error);
+           checkTimes(document, error) && checkPasswords(document, error);
 }
 
 void makeAbsolute(json &entry, const char *key, const std::filesystem::path &folder)
@@ -195,11 +223,14 @@ bool importDocument(Database &database, const json &document, ImportResult *resu
 {
     if (!checkShape(document, error))
         return false;
+    const auto hashes = firstPasswords(database, document);
     Database::Writer writer(database);
     for (const json &user : document.value("users", json::array())) {
         saveUser(writer, {0, textOf(user, "mail"), textOf(user, "name"), photosOf(user)});
         ++result->users;
     }
+    for (const auto &[mail, hash] : hashes)
+        setFirstPassword(writer, mail, hash);
     if (!checkAuthors(writer, document, "comments", error) ||
         !checkAuthors(writer, document, "tags", error))
         return false;

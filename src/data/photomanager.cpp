@@ -205,6 +205,18 @@ void PhotoManager::downloadWaitingPhoto(Connection *connection)
     release(free);
 }
 
+void PhotoManager::withdraw(const QString &url, Callback callback)
+{
+    if (mCallbackFunHash.remove(url, callback) == 0 || mCallbackFunHash.contains(url))
+        return;
+    mDownlodingURLHash.remove(url);
+    mNeedDownloadPhotoUrlList.removeAll(url);
+    if (Connection *connection = mDownlodingConnectionHash.take(url)) {
+        release(connection);
+        downloadWaitingPhoto(nullptr);
+    }
+}
+
 void PhotoManager::cancelDownloadWaitingPhoto()
 {
     while (!mNeedDownloadPhotoUrlList.isEmpty()) {

@@ -35,12 +35,11 @@ QString sizeText(const QSize &size)
         .arg(QString::number(size.width()), QString::number(size.height()));
 }
 
-// A name in the middle of a sentence: whatever its direction, the rest keeps its own.
 QString ownerText(const QString &owner)
 {
-    const QString isolated = QChar(0x2068) + owner + QChar(0x2069);
-    const QString sentence = DetailTexts::text(DetailTexts::By);
-    return owner.isEmpty() ? QString() : QString(sentence).replace(QStringLiteral("%1"), isolated);
+    // Not by arg(): a name may hold a place marker.
+    return owner.isEmpty() ? QString()
+                           : DetailTexts::text(DetailTexts::By) + QLatin1Char(' ') + owner;
 }
 
 } // namespace
@@ -125,17 +124,15 @@ void DetailInformation::addComments(const DetailNotes &notes)
         addComment(comment);
 }
 
+// The name comes last, so that one from another script does not turn the line around.
 void DetailInformation::addComment(const DetailComment &comment)
 {
-    const QString created = dateText(comment.created);
-    const QString isolated = QChar(0x2068) + comment.author + QChar(0x2069);
-    mParts << Part{created.isEmpty() ? comment.author : isolated + ", " + created,
-                   16,
-                   false,
-                   kQuiet,
-                   1,
-                   10,
-                   QString()};
+    QStringList heading;
+    if (comment.created.isValid())
+        heading << QLocale::c().toString(comment.created, QStringLiteral("d MMMM yyyy"));
+    if (!comment.author.isEmpty())
+        heading << comment.author;
+    mParts << Part{heading.join(QStringLiteral(", ")), 16, false, kQuiet, 1, 10, QString()};
     mParts << Part{comment.text, 18, false, kPlain, 4, 0, QString()};
 }
 
@@ -156,7 +153,7 @@ void DetailInformation::layOut()
         if (lines < 1)
             break;
         const int left = kMargin + (part.picture.isEmpty() ? 0 : kIndent);
-        const QSize box(std::max(1, width() - left - kMargin), lines * line);
+        const QSize box(std::max(1, width() - left - kMargin), lines * line + line / 3);
         const QString fitted = fitText(part.text, look, box);
         const int needed =
             QFontMetrics(look).boundingRect(QRect(QPoint(), box), Qt::AlignLeft, fitted).height();
@@ -182,12 +179,12 @@ void DetailInformation::paintEvent(QPaintEvent *)
     painter.setPen(Qt::NoPen);
     painter.setBrush(QColor(0x0b, 0x10, 0x16, 0x70));
     painter.drawRoundedRect(rect(), 10, 10);
-    painter.setLayoutDirection(Qt::LayoutDirectionAuto); // each text begins on its own side
     for (const PlacedPart &part : qAsConst(mPlaced)) {
         const int line = QFontMetrics(part.font).lineSpacing();
         if (!part.picture.isEmpty())
             painter.drawPixmap(kMargin, part.area.top() + (line - kPicture) / 2,
                                loadPicture(part.picture, QSize(kPicture, kPicture)));
+        painter.setLayoutDirection(part.text.isRightToLeft() ? Qt::RightToLeft : Qt::LeftToRight);
         painter.setFont(part.font);
         painter.setPen(part.colour);
         painter.drawText(part.area, Qt::AlignLeft | Qt::AlignTop, part.text);

@@ -80,6 +80,8 @@ int DetailList::find(const DetailPhoto &photo)
 
 PackageProperty DetailList::requestFor(int number)
 {
+    mPackageAtRequest = package();
+    mEndAtRequest = heldEnd();
     PackageProperty request = mProperty;
     request.mStartIndex = 1;
     if (type() == TYPE_FEATURED_PHOTOS) {
@@ -96,8 +98,6 @@ PackageProperty DetailList::requestFor(int number)
 
 bool DetailList::take(const PackageProperty &arrived)
 {
-    const Package *before = mPackage;
-    const int endBefore = before ? heldEnd() : 0;
     if (arrived.mType == TYPE_SEARCH_MORE_PHOTOS) {
         PackageProperty block = arrived;
         mPackage = PackageManager::getPackage(block);
@@ -105,7 +105,7 @@ bool DetailList::take(const PackageProperty &arrived)
         mFirstNumber = arrived.mStartIndex;
     }
     const Package *now = package();
-    const bool isNew = now && (now != before || endBefore != heldEnd());
+    const bool isNew = now && (now != mPackageAtRequest || heldEnd() != mEndAtRequest);
     const bool isShortBlock = isSearch(type()) && now && now->count() < paging::blockSize;
     if (!isNew || isShortBlock)
         mEnd = heldEnd(); // the service has less than it says

@@ -27,7 +27,7 @@ public:
 
     // What to download so that the photo is held, or nearer: featured photos come page by page.
     PackageProperty requestFor(int number);
-    // The download has ended well. False when it brought nothing new.
+    // That download has ended well. False when it brought nothing new.
     bool take(const PackageProperty &arrived);
     // Has the page behind the one of this photo fetched ahead, where the list comes in pages.
     void prepareFollowing(int number);
@@ -41,5 +41,7 @@ private:
     QPointer<Package> mPackage;
     int mFirstNumber = 1;
     int mTotal = 0;
+    QPointer<Package> mPackageAtRequest;
+    int mEndAtRequest = 0;
     int mEnd = 0; // where the list ended before its total was reached; 0: nowhere yet
 };

@@ -67,7 +67,7 @@ void DetailPictures::show(const DetailPhoto &photo, const QString &nextUrl)
     mIsFetched = false;
     mSettle.start();
     showPreview();
-    if (!isRushing)
+    if (!isRushing || PhotoManager::getPhoto(photo.imageUrl))
         refit();
 }
 

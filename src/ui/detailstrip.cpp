@@ -9,7 +9,7 @@
 
 namespace {
 
-constexpr QSize kCell(88, 68);
+constexpr QSize kCell(80, 64);
 constexpr int kGap = 8;
 constexpr int kMark = 3; // width of the frame around the photo shown
 

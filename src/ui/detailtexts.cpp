@@ -12,7 +12,7 @@ const QVector<const char *> mDetailString = {
     "Farther",
     "Options",
     "Untitled",
-    "by %1",
+    "by",
     "%1 x %2 pixels",
     "Comments are on their way...",
     "No comments yet",

@@ -14,7 +14,7 @@ public:
         Farther = 4,
         Actions = 5,
         Untitled = 6,
-        By = 7,     // %1: a name
+        By = 7,     // followed by a name
         Pixels = 8, // %1: width, %2: height
         LoadingComments = 9,
         NoComments = 10,

@@ -5,6 +5,7 @@
 #include "ui/formscrollarea.h"
 #include "ui/formscrollwidget.h"
 #include "ui/picturedetailwidget.h"
+#include "ui/qimageslide.h"
 #include "ui/searchwidget.h"
 
 #include <QStackedLayout>
@@ -88,7 +89,7 @@ void HomePages::showLoading()
 {
     mLoadingPage->start();
     show(Loading);
-    mLoadingPage->setFocus();
+    takeFocus();
     if (const int patience = pagePatience())
         mPatience.start(patience);
 }
@@ -97,7 +98,13 @@ void HomePages::showFailure(ErrorCode code)
 {
     mFailurePage->setReason(code);
     show(Failure);
-    mFailurePage->setFocus();
+    takeFocus();
+}
+
+void HomePages::takeFocus()
+{
+    if (!QImageSlide::mIsShowing) // whose keys they are
+        focusPage();
 }
 
 void HomePages::focusPage()

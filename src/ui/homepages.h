@@ -45,6 +45,8 @@ signals:
     void leaveRequested();
 
 private:
+    void takeFocus();
+
     FormScrollArea *mGrid;
     LoadingPage *mLoadingPage;
     NoPhotoAvailableWidget *mNoPhotoPage;

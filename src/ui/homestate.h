@@ -50,6 +50,8 @@ struct HomeState
     // A page of the list shown; false, and unchanged, when there is none.
     bool pageUp(int arg);
     bool pageDown(int arg, const Package *package);
+    // The page of a record of the list held (from 1), to focus its cell.
+    void selectRecord(int number);
 
     // The page that holds a record, by its number in the whole list. Among search results it may
     // lie in another block.

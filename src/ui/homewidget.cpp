@@ -14,6 +14,7 @@
 #include "ui/paging.h"
 #include "ui/photopopups.h"
 #include "ui/picturedetailwidget.h"
+#include "ui/qimageslide.h"
 #include "ui/screentexts.h"
 #include "ui/searchflow.h"
 #include "ui/upwidget.h"
@@ -255,7 +256,7 @@ void HomeWidget::focusAfterPageDown()
     if (mState.mCurrentProperty.mType != TYPE_FEATURED_PHOTOS || !wanted)
         return;
     mState.mIsReturnFromDetail = mState.mIsPageDown = false;
-    if (mPages->isShown(HomePages::Grid))
+    if (mPages->isShown(HomePages::Grid) && mayFocus())
         mCommentArea->updateFocus();
 }
 
@@ -272,7 +273,8 @@ void HomeWidget::pushPackageData()
         return; // the list stays below it
     if (shown == 0) {
         mPages->show(HomePages::NoPhoto);
-        mTitleWidget->setFocus();
+        if (mayFocus())
+            mTitleWidget->setFocus();
         return;
     }
     if (mState.mInitIndex >= 0)
@@ -284,8 +286,18 @@ void HomeWidget::pushPackageData()
     updatePhotoRatio(mCommentArea->content()->getIndex());
 }
 
+// The keys belong to the slide show while it is on the screen.
+bool HomeWidget::mayFocus()
+{
+    if (QImageSlide::mIsShowing)
+        logLine("Do not focus on current widget casue QImageSlide is showing");
+    return !QImageSlide::mIsShowing;
+}
+
 void HomeWidget::focusContent()
 {
+    if (!mayFocus())
+        return;
     mPages->focusPage();
     mTitleWidget->updateFocusMark();
 }

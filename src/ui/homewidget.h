@@ -81,6 +81,8 @@ public slots:
     bool preparePageData(int startIndex, bool nextPage);
     void returnFromLogoutCancel();
     void doLogout();
+    // Shows the page of that record (from 1) with the focus on it.
+    void showRecord(int number);
 
 signals:
     void signedOut(); // nobody is signed in any longer
@@ -114,6 +116,7 @@ private:
     void focusContent();
     void showDetail(int itemIndex, bool isEnterPress);
     void updateInitIndex();
+    static bool mayFocus();
     bool goBack();
     void play();
 

@@ -155,6 +155,18 @@ void HomeWidget::showOtherPage(const char *otherType)
         logLine(otherType, type);
 }
 
+void HomeWidget::showRecord(int number)
+{
+    mState.selectRecord(number);
+    mTitleWidget->clearFocus();
+    if (mPages->isShown(HomePages::Detail))
+        mPages->show(HomePages::Grid); // from where the play began
+    if (mState.mCurrentProperty.mType == TYPE_FEATURED_PHOTOS)
+        requestPage();
+    else
+        reshow();
+}
+
 void HomeWidget::reshow()
 {
     if (mCurrentPackageData) {

@@ -26,9 +26,6 @@ ZoomView::ZoomView(QWidget *parent)
     mKeys->addEntry(DEVICE_SELECT_KEY, DetailTexts::text(DetailTexts::Closer));
     mKeys->addEntry(DEVICE_PAGEDOWN_KEY, DetailTexts::text(DetailTexts::Farther));
     mKeys->addEntry(DEVICE_RETURN_KEY, I18n::shortCut(2));
-    mKeys->setAttribute(Qt::WA_StyledBackground);
-    mKeys->setObjectName(QStringLiteral("zoomKeys"));
-    mKeys->setStyleSheet(QStringLiteral("#zoomKeys{background-color:rgba(11,16,22,200);}"));
     hide();
 }
 
@@ -142,6 +139,7 @@ void ZoomView::paintEvent(QPaintEvent *)
                       seen.width() * x, seen.height() * y);
     painter.setRenderHint(QPainter::SmoothPixmapTransform);
     painter.drawPixmap(seen, mPicture, part);
+    painter.fillRect(0, mKeys->y(), width(), mKeys->height(), QColor(0x0b, 0x10, 0x16, 0xc8));
     paintMap(painter, photo);
 }
 
@@ -167,7 +165,7 @@ void ZoomView::paintMap(QPainter &painter, const QRectF &photo) const
 void ZoomView::resizeEvent(QResizeEvent *event)
 {
     QWidget::resizeEvent(event);
-    mKeys->setGeometry(0, height() - kKeysHeight, width(), kKeysHeight);
+    mKeys->setGeometry(0, height() - kKeysHeight, width() - kMargin, kKeysHeight);
     if (mPicture.isNull())
         return;
     mFitted = zoom::fittedSize(mPhotoSize, size());

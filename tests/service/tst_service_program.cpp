@@ -183,8 +183,14 @@ TEST_F(Program, commandsWorkBesideTheService)
                R"({"tags":[{"photo":"a/x.jpg","author":"ben@orvala.example","tag":"t"}]})");
     EXPECT_NE(run("import " + mFolder.file("import.json") + inData).text.find("1 waiting"),
               std::string::npos);
+    writeBytes(mFolder.file("short"), "short\n");
+    writeBytes(mFolder.file("long"), "long enough\n");
+    const std::string passwd = "user passwd ben@orvala.example" + inData + " < ";
+    EXPECT_EQ(run(passwd + mFolder.file("short")).status, 1);
+    EXPECT_EQ(client.Get(path)->status, 200);
+    EXPECT_EQ(run(passwd + mFolder.file("long")).status, 0);
+    EXPECT_EQ(client.Get(path)->status, 401); // the old sign-ins end
     EXPECT_EQ(run("user remove ben@orvala.example" + inData).status, 0);
-    EXPECT_EQ(client.Get(path)->status, 401);
 }
 
 TEST_F(Program, mistakesAreExplained)
