@@ -22,13 +22,14 @@ constexpr int kWidth = 760;
 constexpr int kHeight = 400;
 constexpr int kPadding = 14;
 constexpr int kDeleteWidth = 110;
+constexpr int kSlack = 6; // for letters of other fonts, which may be higher
 constexpr int kMostLines = 6;
 constexpr int kRowsOfAPage = 4;
 
 const QColor kText(0xf2, 0xf6, 0xf9);
 const QColor kDimmed(0xa2, 0xbb, 0xc9);
-const QColor kMarkGround(0x1d, 0x3a, 0x4d);
-const QColor kMark(0x58, 0xc4, 0xf5);
+const QColor kMarkGround(0x1a, 0x5f, 0x99);
+const QColor kMark(0xf2, 0xf6, 0xf9);
 
 QFont fontOf(int pixels, bool bold = false)
 {
@@ -59,7 +60,8 @@ public:
         const int lines = index.data(TextRole).toString().count(QLatin1Char('\n')) + 1;
         const bool hasHeading = !index.data(HeadingRole).toString().isEmpty();
         const int heading = hasHeading ? QFontMetrics(headingFont()).lineSpacing() : 0;
-        return {0, 2 * kPadding + heading + lines * QFontMetrics(textFont()).lineSpacing()};
+        return {0,
+                2 * kPadding + heading + kSlack + lines * QFontMetrics(textFont()).lineSpacing()};
     }
 
     void paint(QPainter *painter, const QStyleOptionViewItem &option,
@@ -104,7 +106,8 @@ private:
         painter->setFont(textFont());
         painter->setPen(kind == MessageRow ? kDimmed : kText);
         const int alignment = kind == MessageRow ? Qt::AlignHCenter : Qt::AlignLeft;
-        painter->drawText(area, alignment | Qt::AlignTop, index.data(TextRole).toString());
+        painter->drawText(area, alignment | Qt::AlignTop | Qt::TextDontClip,
+                          index.data(TextRole).toString());
     }
 };
 
