@@ -39,6 +39,9 @@ HomeBars::HomeBars(QWidget *parent)
     row->setContentsMargins(10, 0, 10, 0);
     row->setSpacing(24);
     setFixedHeight(32);
+    QSizePolicy policy = sizePolicy();
+    policy.setRetainSizeWhenHidden(true); // nothing else moves when it goes
+    setSizePolicy(policy);
     row->addWidget(mInformation, 1);
     row->addWidget(mShortcuts);
     for (int key : kKeys)
@@ -53,8 +56,6 @@ HomeBars::Hints HomeBars::usefulKeys(const HomeState &state, HomePages::Page pag
     Hints hints;
     if (page == HomePages::Grid)
         hints = gridHints(state, package, canPlay);
-    else if (page == HomePages::Search)
-        hints << qMakePair(int(DEVICE_SELECT_KEY), I18n::shortCut(6));
     else if (page == HomePages::Failure)
         hints << qMakePair(int(DEVICE_SELECT_KEY), ScreenTexts::hint(ScreenTexts::RetryHint));
     if (state.back() != HomeState::Back::SignOut)

@@ -161,7 +161,7 @@ void HomeWidget::tryToDownload(PackageProperty property)
         return;
     }
     logLine("enter NULL == package");
-    if (!PackageManager::downloadPage(property, downloadPackageCB))
+    if (!PackageManager::downloadPage(property, downloadPackageCB) && isLoading())
         showFailure(NET_FAILED);
 }
 
@@ -218,15 +218,17 @@ void HomeWidget::tryToShowCurrentPackage(PackageProperty &property)
 // A page has come alone, without those before it, which the cache has let go.
 void HomeWidget::fetchAnew()
 {
-    if (mPages->isShown(HomePages::Detail))
-        return; // it fetches what it needs itself
-    if (!mState.canRestart()) {
+    const bool isBelow = mPages->isShown(HomePages::Detail);
+    if (mState.canRestart()) {
+        PackageManager::removeCache(mState.mCurrentProperty);
+        mState.restart();
+        if (isBelow)
+            tryToDownload(mState.mCurrentProperty);
+        else
+            requestPage();
+    } else if (!isBelow) {
         showFailure(NET_NO_DATA);
-        return;
     }
-    PackageManager::removeCache(mState.mCurrentProperty);
-    mState.restart();
-    requestPage();
 }
 
 // The list from the cache. One that begins later than the page wanted is dropped: only a page
@@ -352,6 +354,7 @@ void HomeWidget::refreshBars()
     else if (isList && mCurrentPackageData)
         position =
             QStringLiteral("%1/%2").arg(mState.mPhotoIndexInTotal).arg(mState.mPhotoDataCount);
+    mBars->setVisible(!mPages->isShown(HomePages::Search));
     mBars->setInformation(titleOf(mState), position);
     if (isDetail)
         mBars->showHints(mDetail->keyHints());

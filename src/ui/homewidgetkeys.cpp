@@ -126,6 +126,8 @@ bool HomeWidget::preparePageData(int startIndex, bool nextPage)
 
 bool HomeWidget::handlePageUp(int arg)
 {
+    if (mPages->isShown(HomePages::Detail))
+        return preparePageData(arg, false);
     if (!mState.pageUp(arg))
         return arg == paging::onePage && mSearch->changeBlock(false);
     showOtherPage("Page Up, other mCurrentProperty type:");
@@ -135,6 +137,8 @@ bool HomeWidget::handlePageUp(int arg)
 bool HomeWidget::handlePageDown(int arg)
 {
     logLine("enter HomeWidget::handlePageDown()");
+    if (mPages->isShown(HomePages::Detail))
+        return preparePageData(arg, true);
     if (!mCurrentPackageData && mPages->isShown(HomePages::Grid))
         reshow(); // the cache has let go of the list; what it holds is known when it is back
     if (!mState.pageDown(arg, mCurrentPackageData))
@@ -157,10 +161,17 @@ void HomeWidget::showOtherPage(const char *otherType)
 
 void HomeWidget::showRecord(int number)
 {
+    if (mPages->isShown(HomePages::Detail) && mCurrentPackageData) {
+        const int first = mState.firstNumber(); // the play began on the photo screen
+        mState.followTo(first + number - 1);
+        mDetail->showPhoto(number - 1, mCurrentPackageData, mIsSelfPhoto, false, first);
+        mDetail->setFocus();
+        return;
+    }
     mState.selectRecord(number);
     mTitleWidget->clearFocus();
     if (mPages->isShown(HomePages::Detail))
-        mPages->show(HomePages::Grid); // from where the play began
+        mPages->show(HomePages::Grid);
     if (mState.mCurrentProperty.mType == TYPE_FEATURED_PHOTOS)
         requestPage();
     else

@@ -78,7 +78,7 @@ public:
         QRect area = option.rect.adjusted(kPadding, kPadding, -kPadding, -kPadding);
         if (isMarked && index.data(DeleteRole).toBool())
             paintDelete(painter, area);
-        paintTexts(painter, area, index);
+        paintTexts(painter, area, index, isMarked ? kText : kDimmed);
         painter->restore();
     }
 
@@ -93,12 +93,13 @@ private:
         painter->drawText(pill, Qt::AlignCenter, I18n::button(10));
     }
 
-    static void paintTexts(QPainter *painter, QRect area, const QModelIndex &index)
+    static void paintTexts(QPainter *painter, QRect area, const QModelIndex &index,
+                           const QColor &headingColour)
     {
         const QString heading = index.data(HeadingRole).toString();
         if (!heading.isEmpty()) {
             painter->setFont(headingFont());
-            painter->setPen(kDimmed);
+            painter->setPen(headingColour);
             painter->drawText(area, Qt::AlignLeft | Qt::AlignTop, heading);
             area.setTop(area.top() + QFontMetrics(headingFont()).lineSpacing());
         }

@@ -485,6 +485,9 @@ void TestHomeWidget::followsThePhotoScreen()
     QCOMPARE(captions().value(focused()), QString("Photo 10"));
     QVERIFY(grid()->content()->cell(1)->hasFocus());
     press({DEVICE_SELECT_KEY});
+    mHome->showRecord(12); // back from a slide show
+    QCOMPARE(detail->number(), 12);
+    QVERIFY(detail->hasFocus());
     PackageManager::clearAll(); // the cache may let go
     press({DEVICE_RETURN_KEY});
     QTRY_VERIFY(isReady());
