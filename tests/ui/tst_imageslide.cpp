@@ -426,6 +426,7 @@ void TestImageSlide::keysDuringADownload()
     player()->update();
     QVERIFY(LogCapture::contains("Wrong QImageSlide::update()"));
     QTRY_VERIFY(mPage->homeScreen()->isLoading());
+    QTRY_VERIFY(held.count() > 0);
     QVERIFY(player()->hasFocus());
 
     press({DEVICE_SETTING_KEY, DEVICE_RETURN_KEY, DEVICE_LEFT_KEY, DEVICE_PAUSE_KEY});
@@ -439,7 +440,6 @@ void TestImageSlide::keysDuringADownload()
     if (isAnswered)
         return;
     serve(12);
-    QTRY_VERIFY(held.count() > 0);
     held.answerFirst(MisbehavingServer::answer(sample::photos("Photo", 1, 8, 12)));
     QTRY_VERIFY(!mPage->homeScreen()->isLoading());
     press({DEVICE_RETURN_KEY});
