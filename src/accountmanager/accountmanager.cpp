@@ -1,18 +1,25 @@
 #include "accountmanager/accountmanager.h"
 
+#include "accountmanager/accountmanagerhelper.h"
+#include "accountmanager/accounttexts.h"
+#include "accountmanager/errordialog.h"
 #include "accountmanager/loginpage.h"
-#include "accountmanager/screenbackground.h"
 #include "accountmanager/waitwidget.h"
 #include "base/i18n.h"
 #include "base/log.h"
 #include "common/ui/remotekeys.h"
+#include "common/ui/screenbackground.h"
 #include "common/ui/shortcutbar.h"
 #include "network/systemconfig.h"
+#include "oauth/oauthwidget.h"
+#include "oauth/signinplugin.h"
+#include "oauth/signinview.h"
 #include "platform/ipc.h"
 
 #include <QHBoxLayout>
 #include <QKeyEvent>
 #include <QLabel>
+#include <QNetworkProxy>
 
 #include <new>
 
@@ -20,6 +27,21 @@ namespace {
 
 constexpr int kSideSpace = 180;
 constexpr int kLogoHeight = 46;
+
+// What a web sign-in stores an account with, and signs it in with.
+const QString kDefaultPin = QStringLiteral("7305");
+
+// The sign-in page goes through the program's proxy. Setting it drops every open connection.
+void applyProxy()
+{
+    const QStringList parts =
+        SystemConfig::proxyAddress().split(QLatin1Char(':'), Qt::SkipEmptyParts);
+    QNetworkProxy proxy(QNetworkProxy::NoProxy);
+    if (parts.size() >= 2)
+        proxy = QNetworkProxy(QNetworkProxy::HttpProxy, parts.at(0), parts.at(1).toUShort());
+    if (QNetworkProxy::applicationProxy() != proxy)
+        QNetworkProxy::setApplicationProxy(proxy);
+}
 
 } // namespace
 
@@ -49,9 +71,10 @@ AccountManager::AccountManager(QWidget *parent)
 
 AccountManager::~AccountManager()
 {
-    // The main widget keeps it among its pages, where nothing else would end it.
+    // The main widget keeps them among its pages, where nothing else would end them.
     if (mWaitWidget)
         mWaitWidget->deleteLater();
+    dropWizard();
 }
 
 QWidget *AccountManager::makeTitle()
@@ -79,7 +102,117 @@ QWidget *AccountManager::makeTitle()
 void AccountManager::startAuthorize()
 {
     logLine("enter AccountManager::startAuthorize()");
-    mLoginPage->showMessage(I18n::label(29).trimmed());
+    applyProxy();
+    if (!prepareWizard()) {
+        mLoginPage->showMessage(AccountTexts::text(AccountTexts::SignInUnavailable));
+        return;
+    }
+    // A kept widget is connected already; twice would report every result twice.
+    connect(oauthWizard, &OAuthWidget::oauthFinished, this, &AccountManager::authorizeResult,
+            Qt::UniqueConnection);
+    connect(oauthWizard, &OAuthWidget::authorizeConnectTimeout, this,
+            &AccountManager::handleAuthorizeTimeOut, Qt::UniqueConnection);
+    connect(oauthWizard, &OAuthWidget::authorizeCanceled, this,
+            &AccountManager::handleAuthorizeCancel, Qt::UniqueConnection);
+    emit showNewWidget(oauthWizard);
+    oauthWizard->startAuthorizate();
+}
+
+// False when there is no web view to sign in with.
+bool AccountManager::prepareWizard()
+{
+    if (oauthWizard) {
+        logLine("{AccountManager::startAuthorize} NULL != oauthWizard");
+        return true;
+    }
+    logLine("{AccountManager::startAuthorize} NULL == oauthWizard");
+    std::unique_ptr<SignInView> view = SignInPlugin::createView();
+    if (!view)
+        return false;
+    oauthWizard = new OAuthWidget(std::move(view), this);
+    return true;
+}
+
+void AccountManager::authorizeResult(bool allow)
+{
+    logLine("authorizeResult SLOT function is called");
+    if (!allow) {
+        logLine("{AccountManager::authorizeResult} enter authorize failed");
+        emit showNewWidget(this);
+        connect(showError(I18n::prompt(1)), &ErrorDialog::errorExitApp, this,
+                &AccountManager::onReturnClicked);
+        return;
+    }
+    if (!oauthWizard)
+        return;
+    switch (storeAccount(oauthWizard->getAccountMail(), oauthWizard->getOauthAccessToken())) {
+    case SignedIn:
+        emit loginFinished();
+        break;
+    case NotStored:
+        oauthWizard->showMessage(AccountTexts::text(AccountTexts::NotStored));
+        break;
+    case NotSignedIn:
+        // Its PIN is another one, about which nothing is said: it signs in from the list.
+        oauthWizard->showMessage(QString());
+        break;
+    }
+}
+
+AccountManager::Outcome AccountManager::storeAccount(const QString &mail, const QString &token)
+{
+    if (mail.isEmpty() || token.isEmpty())
+        return NotStored;
+    const bool exists = mLoginPage->hasAccount(mail);
+    const AccountManagerHelper::Session session;
+    const bool stored = exists ? AccountManagerHelper::updateToken(mail, token)
+                               : AccountManagerHelper::addAccount(mail, kDefaultPin, token);
+    if (!stored) {
+        if (!exists)
+            logLine(" Add account error: show a error dialog");
+        return NotStored;
+    }
+    if (AccountManagerHelper::login(mail, kDefaultPin))
+        return SignedIn;
+    return AccountManagerHelper::hasFailed() ? NotStored : NotSignedIn;
+}
+
+ErrorDialog *AccountManager::showError(const QString &text)
+{
+    auto *dialog = new ErrorDialog(this);
+    dialog->retranslateUi(I18n::prompt(0), text, false);
+    dialog->show();
+    return dialog;
+}
+
+void AccountManager::handleAuthorizeTimeOut()
+{
+    showAccounts();
+    showError(I18n::prompt(11));
+    dropWizard();
+}
+
+void AccountManager::handleAuthorizeCancel()
+{
+    logLine("handleAthorizeCancel invoked!");
+    showAccounts();
+    dropWizard();
+}
+
+void AccountManager::showAccounts()
+{
+    mLoginPage->reload(); // an account may have been stored although it was not signed in
+    emit showNewWidget(this);
+}
+
+// Later: it is a key or an answer of its own that ends it.
+void AccountManager::dropWizard()
+{
+    if (!oauthWizard)
+        return;
+    oauthWizard->disconnect(this);
+    oauthWizard->deleteLater();
+    oauthWizard.clear();
 }
 
 void AccountManager::startLoading()

@@ -3,18 +3,25 @@
 #include <QPointer>
 #include <QWidget>
 
+class ErrorDialog;
 class LoginPage;
+class OAuthWidget;
 class QLabel;
 class ShortcutBar;
 class WaitWidget;
 
 // The first screen, and the owner of the sign-in:
 //
-//   LoginPage                AccountManager                 main widget
-//   oauthStarted()  ------>  startAuthorize()
+//   LoginPage                AccountManager                    main widget
 //   loginSucessed() ------>  startLoading()
-//                            showNewWidget(wait widget) --> shows it
-//                            loginFinished()            --> goes on to the home screen
+//                            showNewWidget(wait widget) -----> shows it
+//                            loginFinished()            -----> goes on to the home screen
+//   oauthStarted()  ------>  startAuthorize()
+//                            showNewWidget(web sign-in) -----> shows it
+//     allowed                authorizeResult(true): stored, signed in, loginFinished()
+//     refused                authorizeResult(false): an error, then the program ends
+//     no answer              handleAuthorizeTimeOut(): an error on the account list
+//     Return                 handleAuthorizeCancel(): the account list
 //   exitApp(), Return ---->  onReturnClicked(): asks the platform to end the program
 class AccountManager : public QWidget
 {
@@ -32,18 +39,29 @@ signals:
 
 public slots:
     void onReturnClicked();
+    void authorizeResult(bool allow);
     void startAuthorize();
     void startLoading();
+    void handleAuthorizeCancel();
+    void handleAuthorizeTimeOut();
 
 protected:
     void keyPressEvent(QKeyEvent *event) override;
     void resizeEvent(QResizeEvent *event) override;
 
 private:
+    enum Outcome { SignedIn, NotStored, NotSignedIn };
+
     QWidget *makeTitle();
     void showWaitWidget();
+    bool prepareWizard();
+    Outcome storeAccount(const QString &mail, const QString &token);
+    ErrorDialog *showError(const QString &text);
+    void dropWizard();
+    void showAccounts();
 
     LoginPage *mLoginPage;
     ShortcutBar *mShortcutBar;
     QPointer<WaitWidget> mWaitWidget;
+    QPointer<OAuthWidget> oauthWizard;
 };

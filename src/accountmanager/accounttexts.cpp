@@ -9,6 +9,10 @@ const QVector<const char *> mAccountString = {
     "This account is not stored any more. Please choose another one.",
     "This account could not be signed in. Please try again, or choose another one.",
     "The stored accounts cannot be read at the moment. Please try again later.",
+    "Signing in to a new account is not possible: a part of the program is missing or damaged.",
+    "The sign-in went well, but this device could not store the account. Press \"Return\" to go "
+    "back, and try again later.",
+    "This account could not be deleted. Please try again later.",
 };
 
 } // namespace

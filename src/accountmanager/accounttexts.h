@@ -11,6 +11,9 @@ public:
         AccountGone = 1,
         SignInFailed = 2,
         AccountsUnreadable = 3,
+        SignInUnavailable = 4,
+        NotStored = 5,
+        NotDeleted = 6,
     };
 
     // The text, or "Unknown" for an index that has none.

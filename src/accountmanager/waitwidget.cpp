@@ -1,9 +1,9 @@
 #include "accountmanager/waitwidget.h"
 
-#include "accountmanager/screenbackground.h"
 #include "base/i18n.h"
 #include "common/ui/qprogressindicator.h"
 #include "common/ui/remotekeys.h"
+#include "common/ui/screenbackground.h"
 
 #include <QKeyEvent>
 #include <QLabel>

@@ -19,6 +19,7 @@
 #include <unistd.h>
 
 #include <clocale>
+#include <cstdlib>
 
 using netcommon::Ipc;
 using netcommon::IpcThread;
@@ -36,6 +37,8 @@ void prepareProcess()
     // Pictures come and go in large blocks: each is mapped by itself and given back when it goes.
     ::mallopt(M_MMAP_THRESHOLD, LARGE_BLOCK);
     ::mallopt(M_TRIM_THRESHOLD, 2 * LARGE_BLOCK);
+    // Without it the C library looks at the zone file anew for every local time.
+    ::setenv("TZ", ":/etc/localtime", 0);
     // Nothing here is drawn with OpenGL; its libraries would cost half the start on X11.
     qputenv("QT_XCB_GL_INTEGRATION", "none");
     QCoreApplication::addLibraryPath(QStringLiteral(ORVALA_PLUGIN_DIR));

@@ -91,10 +91,24 @@ void MainWidget::buildLayout()
 {
     auto *layout = new QVBoxLayout(this);
     mStackedWidget = new QStackedWidget;
+    // The first page measures its texts only when it is shown: by then the interface's font is set,
+    // and no other font has been looked up and loaded for nothing.
+    if (mAccountManager->layout())
+        mAccountManager->layout()->setEnabled(false);
     mStackedWidget->addWidget(mAccountManager);
     mStackedWidget->setCurrentWidget(mAccountManager);
     layout->addWidget(mStackedWidget);
     layout->setMargin(0);
+}
+
+void MainWidget::showEvent(QShowEvent *event)
+{
+    QLayout *first = mAccountManager ? mAccountManager->layout() : nullptr;
+    if (first && !first->isEnabled()) {
+        first->setEnabled(true);
+        first->activate();
+    }
+    QWidget::showEvent(event);
 }
 
 void MainWidget::endForLackOfMemory(const QString &reason)

@@ -44,6 +44,9 @@ public slots:
     void handleCableStatusChange(bool status);
     void closeStatusDialog();
 
+protected:
+    void showEvent(QShowEvent *event) override;
+
 private:
     void build();
     void connectPlatform();

@@ -81,7 +81,9 @@ OrvalaPhoto::OrvalaPhoto(const JsonObject &entry)
     mThumbnailUrl = lastThumbnailUrl(mediaGroup);
     mKeywords = splitTags(text(mediaGroup, QStringLiteral("media$keywords")));
     mAlbumId = text(entry, QStringLiteral("gphoto$albumid"));
-    mUserId = text(firstAuthor(entry), QStringLiteral("gphoto$user"));
+    const JsonObject &author = firstAuthor(entry);
+    mUserId = text(author, QStringLiteral("gphoto$user"));
+    mNickname = text(author, QStringLiteral("gphoto$nickname"));
 }
 
 Album::Album(const JsonObject &entry)

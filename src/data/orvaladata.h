@@ -46,6 +46,7 @@ public:
     QString photoId() const { return mPhotoId; }
     QStringList keywords() const { return mKeywords; }
     int commentCount() const { return mCommentCount; }
+    QString nickname() const { return mNickname; } // of the photo's owner
 
 private:
     QString mImageUrl;
@@ -57,6 +58,7 @@ private:
     QString mPhotoId;
     QStringList mKeywords;
     int mCommentCount = 0;
+    QString mNickname;
 };
 
 // One album of an album list.

@@ -4,20 +4,20 @@
 #include "data/packageproperty.h"
 
 #include <QList>
+#include <QObject>
 
 // One downloaded list: its request, its records in feed order and the feed's total count. Owned by
-// the package manager's cache; owns its records.
-class Package
+// the package manager's cache; owns its records. It is an object so that a QPointer can tell
+// whether the cache still has it.
+class Package : public QObject
 {
 public:
     Package() = default;
-    ~Package()
+    ~Package() override
     {
         qDeleteAll(mDataList);
         qDeleteAll(mRetiredDataList);
     }
-    Package(const Package &) = delete;
-    Package &operator=(const Package &) = delete;
 
     // The record, or null outside the list or when this list holds records of another kind.
     template <typename Record>

@@ -137,7 +137,9 @@ ErrorCode Connection::startGet(const QUrl &url)
     mErrorCode = NET_SUCCESS;
     if (!mManager)
         return mErrorCode = NET_FAILED;
-    adopt(mManager->get(requestFor(url)));
+    QNetworkRequest request = requestFor(url);
+    request.setTransferTimeout(SystemConfig::silenceSeconds() * 1000);
+    adopt(mManager->get(request));
     const QMetaObject::Connection wires[] = {
         connect(mReply, &QNetworkReply::errorOccurred, this, &Connection::handleError),
         connect(mReply, &QNetworkReply::readyRead, this, &Connection::handleReadyRead),
@@ -158,6 +160,7 @@ void Connection::adopt(QNetworkReply *reply)
     mInflater.reset();
     mBody.clear();
     mTaken = 0;
+    mIsTooLarge = false;
 }
 
 // The reply may be in the middle of a signal: it is silenced at once and deleted later, which also
@@ -188,6 +191,7 @@ bool Connection::takeArrived()
         mInflater->feed(mReply->readAll(), mBody, mMaximumSize);
     if (mTaken + getAvailable() <= mMaximumSize)
         return true;
+    mIsTooLarge = true;
     mReply->abort();
     return false;
 }
@@ -210,7 +214,9 @@ void Connection::handleDownloadProgress(qint64 bytesReceived, qint64 bytesTotal)
 
 void Connection::handleError(QNetworkReply::NetworkError code)
 {
-    fail(code, mReply ? mReply->errorString() : QString());
+    // The toolkit calls it cancelling, too, when it gives up a silent request.
+    const bool isSilent = code == QNetworkReply::OperationCanceledError && !mIsTooLarge;
+    fail(isSilent ? QNetworkReply::TimeoutError : code, mReply ? mReply->errorString() : QString());
 }
 
 void Connection::fail(QNetworkReply::NetworkError code, const QString &text)

@@ -32,7 +32,8 @@ class QNetworkAccessManager;
 //
 // Everything happens on the GUI thread. While a synchronous request waits, other events are
 // delivered: its owner must expect to be re-entered or deleted. Answers are capped (see
-// setMaximumSize): a larger one is aborted and its code is NET_CANCELED.
+// setMaximumSize): a larger one is aborted and its code is NET_CANCELED. A GET that goes without a
+// byte for "Network/SilenceSeconds" is given up with NET_TIMEOUT.
 class Connection : public QObject
 {
     Q_OBJECT
@@ -62,7 +63,7 @@ public:
 
     bool setCallback(Callback callback);
     // Starts an asynchronous GET; NET_SUCCESS, or NET_FAILED when it could not be wired: then no
-    // call-back ever comes. No time-out applies.
+    // call-back ever comes. Without "Network/SilenceSeconds" no time-out applies.
     ErrorCode get(const QString &url);
     // Code of the last request, for the owner to ask after its end.
     ErrorCode errorCode() const { return mErrorCode; }
@@ -129,5 +130,6 @@ private:
     qint64 mTaken = 0;                   // bytes of the current reply that the owner has read
     int mHops = 0;                       // redirects of the current request
     QTimer mNextHop;
+    bool mIsTooLarge = false; // the current reply was aborted for its size
     bool mIsRemoved = false;
 };

@@ -228,7 +228,8 @@ QString SystemConfig::oauthBase()
 
 QString SystemConfig::signInPage()
 {
-    return value(QStringLiteral("Service/SignInPage"), serviceOrigin + QStringLiteral("/signin"));
+    return value(QStringLiteral("Service/SignInPage"),
+                 serviceOrigin + QStringLiteral("/ServiceLogin"));
 }
 
 QString SystemConfig::oauthScope()
@@ -244,6 +245,11 @@ QString SystemConfig::timeServer()
 bool SystemConfig::verifyCertificates()
 {
     return settings().value(QStringLiteral("Network/VerifyCertificates"), false).toBool();
+}
+
+int SystemConfig::silenceSeconds()
+{
+    return qMax(0, integer("Network/SilenceSeconds", 0));
 }
 
 int SystemConfig::idleConnectionSeconds()

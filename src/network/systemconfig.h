@@ -59,6 +59,7 @@ public:
     // Group "Network".
     static QString timeServer();        // empty: no time request
     static bool verifyCertificates();   // false: every certificate is accepted
+    static int silenceSeconds();        // after which a GET is given up; 0: never
     static int idleConnectionSeconds(); // how long a parked connection keeps its sockets
 
     // Layout/Scale: the factor by which the whole interface is scaled, 1 without the key; 0 stands

@@ -107,6 +107,19 @@ bool HomeState::pageDown(int arg, const Package *package)
     return true;
 }
 
+void HomeState::selectRecord(int number)
+{
+    const int indexInPage = (qMax(1, number) - 1) % paging::pageSize;
+    // Further search results are held from the beginning of their block on.
+    const int before = mCurrentProperty.mType == TYPE_SEARCH_MORE_PHOTOS
+                           ? mCurrentProperty.mStartIndex - 1 -
+                                 (mCurrentProperty.mStartIndex - 1) % paging::blockSize
+                           : 0;
+    mIsPageDown = false;
+    mInitIndex = indexInPage;
+    mCurrentProperty.mStartIndex = before + qMax(1, number) - indexInPage;
+}
+
 void HomeState::packageArrived(const Package &package)
 {
     if (hasFeedTotal(mCurrentProperty.mType))

@@ -44,6 +44,8 @@ struct HomeState
     // A page of the list shown; false, and unchanged, when there is none.
     bool pageUp(int arg);
     bool pageDown(int arg, const Package *package);
+    // The page of a record of the list held (from 1), to focus its cell.
+    void selectRecord(int number);
 
     // The list wanted has come, or a cell of it takes the focus.
     void packageArrived(const Package &package);

@@ -11,6 +11,7 @@
 #include "ui/formscrollwidget.h"
 #include "ui/homebars.h"
 #include "ui/paging.h"
+#include "ui/qimageslide.h"
 #include "ui/upwidget.h"
 
 #include <QFrame>
@@ -147,7 +148,8 @@ void HomeWidget::requestPage()
     mCurrentPackageData = nullptr;
     mLoadingPage->start();
     showPage(mLoadingPage);
-    mLoadingPage->setFocus();
+    if (mayFocus())
+        mLoadingPage->setFocus();
     if (const int patience = pagePatience())
         mPageTimer.start(patience);
     tryToDownload(mState.mCurrentProperty);
@@ -195,7 +197,8 @@ void HomeWidget::showFailure(ErrorCode code)
 {
     mFailurePage->setReason(code);
     showPage(mFailurePage);
-    mFailurePage->setFocus();
+    if (mayFocus())
+        mFailurePage->setFocus();
 }
 
 void HomeWidget::tryToShowCurrentPackage(PackageProperty &property)
@@ -239,7 +242,7 @@ void HomeWidget::focusAfterPageDown()
     if (mState.mCurrentProperty.mType != TYPE_FEATURED_PHOTOS || !wanted)
         return;
     mState.mIsReturnFromDetail = mState.mIsPageDown = false;
-    if (mPages->currentWidget() == mCommentArea)
+    if (mPages->currentWidget() == mCommentArea && mayFocus())
         mCommentArea->updateFocus();
 }
 
@@ -254,7 +257,8 @@ void HomeWidget::pushPackageData()
     mState.mCanPlay = true;
     if (shown == 0) {
         showPage(mNoPhotoPage);
-        mTitleWidget->setFocus();
+        if (mayFocus())
+            mTitleWidget->setFocus();
         return;
     }
     if (mState.mInitIndex >= 0)
@@ -266,8 +270,18 @@ void HomeWidget::pushPackageData()
     updatePhotoRatio(mCommentArea->content()->getIndex());
 }
 
+// The keys belong to the slide show while it is on the screen.
+bool HomeWidget::mayFocus()
+{
+    if (QImageSlide::mIsShowing)
+        logLine("Do not focus on current widget casue QImageSlide is showing");
+    return !QImageSlide::mIsShowing;
+}
+
 void HomeWidget::focusContent()
 {
+    if (!mayFocus())
+        return;
     if (mPages->currentWidget() == mCommentArea)
         mCommentArea->initFocus();
     else if (mPages->currentWidget() != mNoPhotoPage)

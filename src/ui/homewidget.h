@@ -70,6 +70,8 @@ public slots:
     void updatePhotoRatio(int index);
     void handleCommentEnter(int itemIndex, bool isEnterPress);
     void returnFromLogoutCancel();
+    // Shows the page of that record (from 1) with the focus on it.
+    void showRecord(int number);
 
 signals:
     void packageReady(PackageProperty &property);
@@ -99,6 +101,7 @@ private:
     void refreshBars();
     QList<int> usefulKeys(bool isList) const;
     void focusContent();
+    static bool mayFocus();
     bool openAlbum(int itemIndex);
     bool openPerson(int itemIndex);
     bool goBack();

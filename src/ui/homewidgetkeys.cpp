@@ -87,6 +87,16 @@ void HomeWidget::showOtherPage(const char *otherType)
         logLine(otherType, type);
 }
 
+void HomeWidget::showRecord(int number)
+{
+    mState.selectRecord(number);
+    mTitleWidget->clearFocus();
+    if (mState.mCurrentProperty.mType == TYPE_FEATURED_PHOTOS)
+        requestPage();
+    else
+        reshow();
+}
+
 void HomeWidget::reshow()
 {
     if (mCurrentPackageData) {

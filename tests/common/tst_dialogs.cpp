@@ -224,6 +224,7 @@ private slots:
         QConfirm question(&screen);
         question.init(QConfirm::SignOut);
         question.show();
+        pressKey(&question, Qt::Key_Tab);
         QCOMPARE(QApplication::focusWidget(), &question);
         screen.setFixedSize(1000, 500);
         QTRY_COMPARE(question.size(), QSize(1000, 500));
@@ -289,6 +290,27 @@ private slots:
         QCOMPARE(returned.size(), 1);
         QVERIFY(form.findChild<QContentFrame *>()->isAncestorOf(list));
         QVERIFY(!log.contains(QStringLiteral("Wrong QPopUpForm::initForm()")));
+    }
+
+    // Whoever shows a pop-up may delete it at once when it answers.
+    void deletedWhileAnswering()
+    {
+        auto *dialog = new QPopupDialog;
+        dialog->initDialog("Title", "Message", {"Close"});
+        connect(dialog, &QPopupDialog::accepted, this, [dialog] { delete dialog; });
+        pressKey(dialog, DEVICE_SELECT_KEY);
+        for (int key : {int(EnterKey), int(DEVICE_RETURN_KEY)}) {
+            QPointer<QPopUpForm> form(new QPopUpForm);
+            form->initForm(QPopUpForm::POPUP_FORM_TEXT_INPUT);
+            connect(form, &QPopUpForm::editFinished, this, [form] { delete form; });
+            connect(form, &QPopUpForm::returnPopUpForm, this, [form] { delete form; });
+            KeyRobot robot(form);
+            if (key == EnterKey)
+                robot.press(key);
+            else
+                robot.remote(key);
+            QVERIFY(!form);
+        }
     }
 
     void wrongForms()

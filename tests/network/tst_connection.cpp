@@ -3,6 +3,7 @@
 #include "support/logcapture.h"
 #include "support/misbehavingserver.h"
 
+#include <QSettings>
 #include <QTemporaryDir>
 #include <QTimer>
 #include <QtTest>
@@ -288,6 +289,23 @@ private slots:
         WAIT_FINISHED();
         if (isError)
             QCOMPARE(count(CALLBACK_ERROR), 1);
+    }
+
+    void silentAnswersAreGivenUp()
+    {
+        const QTemporaryDir folder;
+        QSettings settings(folder.filePath("config.ini"), QSettings::IniFormat);
+        settings.setValue("Network/SilenceSeconds", 1);
+        settings.sync();
+        SystemConfig::setConfigFile(settings.fileName());
+        mServer->on("/x", Server::silence());
+        mServer->on("/drip", Server::drip("0123456789", 1, 150)); // slower, but never silent
+        Connection *connection = start("/x");
+        Connection *slow = start("/drip");
+        QTRY_COMPARE(count(CALLBACK_FINISHED), 2);
+        QCOMPARE(count(CALLBACK_ERROR), 1);
+        QCOMPARE(connection->errorCode(), NET_TIMEOUT);
+        QCOMPARE(body(slow), QByteArray("0123456789"));
     }
 
     void removedInTheCallbackStaysSilent()

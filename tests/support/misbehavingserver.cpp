@@ -142,7 +142,7 @@ MisbehavingServer::Behaviour MisbehavingServer::behaviourFor(const Request &requ
     if (!mQueue.isEmpty())
         return mQueue.takeFirst();
     const QByteArray path = request.path.split('?').first();
-    return mByPath.value(path, answer("not here", 404));
+    return mByPath.value(path, mOtherwise);
 }
 
 MisbehavingServer::Behaviour MisbehavingServer::raw(const QByteArray &bytes, bool close)

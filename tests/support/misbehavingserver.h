@@ -17,8 +17,9 @@ class QTcpSocket;
 //   connection->get(server.url("/feed"));
 //   QTRY_COMPARE(server.requests().size(), 1);
 //
-// Queued behaviours come before those by path; a path without one gets a 404. Connections stay open
-// after an answer unless the behaviour closes them. It runs in the event loop of its thread.
+// Queued behaviours come before those by path; any other path gets a 404, or otherwise().
+// Connections stay open after an answer unless the behaviour closes them. It runs in the event loop
+// of its thread.
 class MisbehavingServer : public QTcpServer
 {
     Q_OBJECT
@@ -38,10 +39,12 @@ public:
     explicit MisbehavingServer(Transport transport = Plain);
 
     void on(const QByteArray &path, const Behaviour &behaviour) { mByPath[path] = behaviour; }
+    void otherwise(const Behaviour &behaviour) { mOtherwise = behaviour; }
     void enqueue(const Behaviour &behaviour) { mQueue.append(behaviour); }
 
     QString url(const QString &path) const; // absolute, with the port
     const QList<Request> &requests() const { return mRequests; }
+    void forgetRequests() { mRequests.clear(); }
     int connections() const { return mConnections; } // accepted so far
     int openConnections() const;
     void closeConnections(); // from the server's side
@@ -78,6 +81,7 @@ private:
     const Transport mTransport;
     QHash<QByteArray, Behaviour> mByPath;
     QList<Behaviour> mQueue;
+    Behaviour mOtherwise = answer("not here", 404);
     QList<Request> mRequests;
     QHash<QTcpSocket *, QByteArray> mBuffers; // of the open connections
     int mConnections = 0;

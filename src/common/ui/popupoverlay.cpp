@@ -108,6 +108,12 @@ void PopupOverlay::keyPressEvent(QKeyEvent *event)
     event->accept();
 }
 
+// Tab must not lead to what lies below; while it hides, the focus may go where Qt puts it.
+bool PopupOverlay::focusNextPrevChild(bool next)
+{
+    return !isVisible() && QWidget::focusNextPrevChild(next);
+}
+
 void setPopupColours(QWidget *widget)
 {
     const QColor text(0xf2, 0xf6, 0xf9);

@@ -28,6 +28,7 @@ protected:
     void hideEvent(QHideEvent *event) override;
     void paintEvent(QPaintEvent *event) override;
     void keyPressEvent(QKeyEvent *event) override;
+    bool focusNextPrevChild(bool next) override;
 
     // Who gets the focus when the overlay is shown; the overlay itself unless told otherwise.
     virtual QWidget *focusReceiver() { return this; }

@@ -16,7 +16,7 @@ namespace {
 
 enum Button { YesButton = 0, NoButton = 1 };
 
-constexpr int kLongestTag = 10000;
+constexpr int kLongestTag = 2000; // characters, far more than are ever shown
 
 DialogPanel::ButtonStyles styles()
 {

@@ -33,61 +33,82 @@ QString plainLines(QString text)
     return text;
 }
 
-// Breaks one paragraph, adding its lines until there are count of them; false when it goes on.
-bool addLines(const QString &paragraph, const QFont &font, int width, int count, QStringList *lines)
+// Breaks text into lines until they fill the height; each is as high as its highest characters,
+// which may come from another font.
+class LineBreaker
 {
-    QTextLayout layout(paragraph, font);
-    QTextOption option;
-    option.setWrapMode(QTextOption::WrapAtWordBoundaryOrAnywhere);
-    layout.setTextOption(option);
-    layout.beginLayout();
-    bool isWhole = true;
-    for (;;) {
-        QTextLine line = layout.createLine();
-        if (!line.isValid())
-            break;
-        if (lines->size() == count) {
-            isWhole = false;
-            break;
-        }
-        line.setLineWidth(width);
-        lines->append(paragraph.mid(line.textStart(), line.textLength()));
+public:
+    LineBreaker(const QFont &font, const QSize &box)
+        : mFont(font)
+        , mMetrics(font)
+        , mBox(box)
+    {
     }
-    layout.endLayout();
-    return isWhole;
-}
 
-QString fitLines(const QString &text, const QFont &font, int width, int count)
-{
-    const QFontMetrics metrics(font);
-    const QStringList paragraphs = text.split(QLatin1Char('\n'));
-    QStringList lines;
-    for (int i = 0; i < paragraphs.size(); ++i) {
-        const bool isWhole = addLines(paragraphs.at(i), font, width, count, &lines);
-        if (isWhole && (lines.size() < count || i + 1 == paragraphs.size()))
-            continue;
-        // Longer than the line by what an ellipsis needs, so that it is elided in any case.
-        lines.last() = metrics.elidedText(lines.last() + kEllipsis, Qt::ElideRight, width);
-        break;
+    // False when the paragraph did not fit, or only a part of it.
+    bool add(const QString &paragraph)
+    {
+        QTextLayout layout(paragraph, mFont);
+        QTextOption option;
+        option.setWrapMode(QTextOption::WrapAtWordBoundaryOrAnywhere);
+        layout.setTextOption(option);
+        layout.beginLayout();
+        bool fits = true;
+        while (fits) {
+            QTextLine line = layout.createLine();
+            if (!line.isValid())
+                break;
+            line.setLineWidth(mBox.width());
+            fits = take(line.height());
+            if (fits)
+                mLines << paragraph.mid(line.textStart(), line.textLength());
+        }
+        layout.endLayout();
+        return fits;
     }
-    return lines.join(QLatin1Char('\n'));
-}
+
+    // The last line tells that there is more.
+    void cut()
+    {
+        // Longer than the line by what an ellipsis needs, so that it is elided in any case.
+        mLines.last() =
+            mMetrics.elidedText(mLines.last() + kEllipsis, Qt::ElideRight, mBox.width());
+    }
+
+    QString text() const { return mLines.join(QLatin1Char('\n')); }
+
+private:
+    bool take(qreal height)
+    {
+        const qreal needed = mLines.isEmpty() ? height : mHeight + mMetrics.leading() + height;
+        if (!mLines.isEmpty() && needed > mBox.height())
+            return false;
+        mHeight = needed;
+        return true;
+    }
+
+    const QFont &mFont;
+    QFontMetrics mMetrics;
+    QSize mBox;
+    QStringList mLines;
+    qreal mHeight = 0;
+};
 
 } // namespace
 
 QString fitText(const QString &text, const QFont &font, const QSize &box)
 {
-    const QFontMetrics metrics(font);
-    int count = qMax(1, box.height() / metrics.lineSpacing());
+    const int lines = qMax(1, box.height() / QFontMetrics(font).height());
     const QString bounded =
-        plainLines(shorten(text, count * qMax(1, box.width() / kNarrowestCharacter)));
-    for (;; --count) {
-        const QString fitted = fitLines(bounded, font, box.width(), count);
-        // Characters that come from another font make a line higher than this one's.
-        const QRect needed = metrics.boundingRect(QRect(QPoint(), box), Qt::AlignLeft, fitted);
-        if (count == 1 || needed.height() <= box.height())
-            return fitted;
+        plainLines(shorten(text, lines * qMax(1, box.width() / kNarrowestCharacter)));
+    LineBreaker breaker(font, box);
+    for (const QString &paragraph : bounded.split(QLatin1Char('\n'))) {
+        if (!breaker.add(paragraph)) {
+            breaker.cut();
+            break;
+        }
     }
+    return breaker.text();
 }
 
 QString buttonText(const QString &text, const QFont &font, int width)

@@ -1,4 +1,4 @@
-#include "accountmanager/screenbackground.h"
+#include "common/ui/screenbackground.h"
 
 #include <QPalette>
 #include <QPixmap>

@@ -1,0 +1,34 @@
+#pragma once
+
+#include <QWebPage>
+
+// A web page that shows nothing but the service's pages: http and https only, no local files, no
+// plug-ins, no Java, no windows or dialogs of its own, nothing kept when it is gone. The engine has
+// no security support any more: load only addresses that are trusted.
+class TrustedPage : public QWebPage
+{
+    Q_OBJECT
+
+public:
+    explicit TrustedPage(QObject *parent = nullptr);
+
+    // A page must not hold up the program: a script that runs on and on is ended.
+    bool shouldInterruptJavaScript() override { return true; }
+
+protected:
+    bool acceptNavigationRequest(QWebFrame *frame, const QNetworkRequest &request,
+                                 NavigationType type) override;
+    QWebPage *createWindow(WebWindowType) override { return nullptr; }
+    QString chooseFile(QWebFrame *, const QString &) override { return QString(); }
+    // Nobody could answer these with the remote.
+    void javaScriptAlert(QWebFrame *, const QString &) override {}
+    bool javaScriptConfirm(QWebFrame *, const QString &) override { return false; }
+    bool javaScriptPrompt(QWebFrame *, const QString &, const QString &, QString *) override
+    {
+        return false;
+    }
+    void javaScriptConsoleMessage(const QString &, int, const QString &) override {}
+
+private:
+    void restrict();
+};

@@ -1,0 +1,153 @@
+#include "ui/settingitem.h"
+
+#include "common/ui/picture.h"
+#include "common/ui/remotekeys.h"
+#include "data/htmlentities.h"
+#include "network/systemconfig.h"
+
+#include <QHBoxLayout>
+#include <QKeyEvent>
+#include <QLabel>
+
+#include <limits>
+
+namespace {
+
+constexpr int kSmallestNumber = 5;
+constexpr int kValueWidth = 150;
+constexpr int kRowHeight = 48;
+
+QLabel *makeText(Qt::Alignment alignment, QWidget *parent)
+{
+    auto *label = new QLabel(parent);
+    label->setTextFormat(Qt::PlainText);
+    label->setAlignment(alignment);
+    QFont font = label->font();
+    font.setPointSize(SystemConfig::messageFont());
+    label->setFont(font);
+    QPalette palette = label->palette();
+    palette.setColor(QPalette::WindowText, QColor(0xf2, 0xf6, 0xf9));
+    label->setPalette(palette);
+    return label;
+}
+
+QLabel *makeArrow(const QString &picture, QWidget *parent)
+{
+    auto *arrow = new QLabel(parent);
+    arrow->setPixmap(loadPicture(picture));
+    arrow->setAlignment(Qt::AlignCenter);
+    return arrow;
+}
+
+} // namespace
+
+SettingItem::SettingItem(const QString &caption, QWidget *parent)
+    : QFrame(parent)
+    , mCaption(makeText(Qt::AlignRight | Qt::AlignVCenter, this))
+    , mValueLabel(makeText(Qt::AlignCenter, this))
+{
+    setFocusPolicy(Qt::StrongFocus);
+    setFixedHeight(kRowHeight);
+    mCaption->setText(unescapeHtml(caption));
+    mValueLabel->setFixedWidth(kValueWidth);
+    auto *row = new QHBoxLayout(this);
+    row->setContentsMargins(12, 0, 12, 0);
+    row->setSpacing(12);
+    row->addWidget(mCaption, 1);
+    auto *value = new QHBoxLayout;
+    value->addWidget(makeArrow(QStringLiteral(":/res/Arrow_Up.png"), this));
+    value->addWidget(mValueLabel);
+    value->addWidget(makeArrow(QStringLiteral(":/res/Arrow_Down.png"), this));
+    row->addLayout(value, 1);
+    showFocus(false);
+}
+
+void SettingItem::setChoices(const QStringList &choices)
+{
+    mChoices = choices;
+    redraw();
+}
+
+void SettingItem::setSuffix(const QString &suffix)
+{
+    mSuffix = suffix;
+    redraw();
+}
+
+void SettingItem::setValue(int kind, int value)
+{
+    mKind = kind;
+    mValue = value;
+    setEditing(false);
+}
+
+QString SettingItem::valueText() const
+{
+    return mKind == Choice ? mChoices.value(mValue) : QString::number(mValue) + mSuffix;
+}
+
+void SettingItem::keyPressEvent(QKeyEvent *event)
+{
+    if (event->key() == DEVICE_SELECT_KEY) {
+        setEditing(!mIsEditing);
+    } else if (mIsEditing && event->key() == DEVICE_DOWN_KEY) {
+        increase();
+    } else if (mIsEditing && event->key() == DEVICE_UP_KEY) {
+        decrease();
+    } else {
+        event->ignore();
+    }
+}
+
+void SettingItem::increase()
+{
+    const int last = mKind == Choice ? mChoices.size() - 1 : std::numeric_limits<int>::max();
+    if (mValue < last)
+        ++mValue;
+    redraw();
+}
+
+void SettingItem::decrease()
+{
+    if (mValue > 0)
+        --mValue;
+    if (mKind == Number && mValue < kSmallestNumber)
+        mValue = kSmallestNumber;
+    redraw();
+}
+
+void SettingItem::setEditing(bool isEditing)
+{
+    mIsEditing = isEditing;
+    mValueLabel->setStyleSheet(
+        isEditing
+            ? QStringLiteral("border-image: url(:/res/InputBox_Normal.png); border-width: 6px;")
+            : QStringLiteral("border-image: none;"));
+    redraw();
+}
+
+void SettingItem::redraw()
+{
+    mValueLabel->setText(valueText());
+}
+
+void SettingItem::focusInEvent(QFocusEvent *event)
+{
+    QFrame::focusInEvent(event);
+    showFocus(true);
+}
+
+void SettingItem::focusOutEvent(QFocusEvent *event)
+{
+    QFrame::focusOutEvent(event);
+    showFocus(false);
+}
+
+void SettingItem::showFocus(bool hasFocus)
+{
+    setStyleSheet(hasFocus ? QStringLiteral("SettingItem { border-image: url(%1); outline-width: "
+                                            "0px; border-width: 6px;}")
+                                 .arg(QStringLiteral(":/res/Button_Normal.png"))
+                           : QStringLiteral("SettingItem {background-color: transparent; border: "
+                                            "0px;}"));
+}

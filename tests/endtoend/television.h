@@ -1,0 +1,54 @@
+#pragma once
+
+#include "app/mainwidget.h"
+#include "platform/fakeshell.h"
+
+#include <QSettings>
+#include <QStringList>
+#include <QTemporaryDir>
+
+#include <memory>
+
+class HomeWidget;
+class FailurePage;
+class PhotoItem;
+
+// The television: the program's own main window on a screen of 1280 x 720, its settings and account
+// file, the remote, and what somebody in front of it sees.
+class Television
+{
+public:
+    Television();
+    ~Television();
+
+    void set(const QString &key, const QVariant &value) { mSettings.setValue(key, value); }
+    // Stores an account with the tokens that the service has given out.
+    bool addAccount(const QString &mail, const QString &name, const QByteArray &tokens);
+    bool switchOn();
+    void press(int key) const;
+    void press(const QList<int> &keys) const;
+
+    // What has the focus: an account's address, the caption of a cell, or the class of the widget.
+    QString focus() const;
+    int menuEntry() const;        // that has the focus; -1 when the menu has not
+    QStringList accounts() const; // addresses, from above
+    HomeWidget *home() const;     // null before the sign-in
+    bool isLoading() const;
+    QStringList captions() const; // of the cells on the screen
+    // Every cell on the screen shows a picture whose middle has about the colour that the table has
+    // for its caption.
+    bool showsColours(const QHash<QString, QColor> &expected) const;
+    QString position() const; // in the list, as "3/23"
+    // The reason on the page for what did not load; empty when it is not shown.
+    QString failure() const;
+
+    FakeShell &shell() { return mShell; }
+
+private:
+    QList<PhotoItem *> cells() const;
+
+    QTemporaryDir mFolder;
+    QSettings mSettings;
+    FakeShell mShell;
+    std::unique_ptr<MainWidget> mWindow;
+};

@@ -1,0 +1,189 @@
+#include "ui/playorder.h"
+
+#include <QtTest>
+
+#include <algorithm>
+#include <numeric>
+
+namespace {
+
+// A small generator of the tests' own, so that a run can be repeated.
+playorder::RandomSource seeded(quint32 seed)
+{
+    return [state = seed]() mutable {
+        state ^= state << 13;
+        state ^= state >> 17;
+        state ^= state << 5;
+        return state;
+    };
+}
+
+QVector<int> records(const PlayArray &array)
+{
+    QVector<int> all;
+    for (int i = 0; i < array.size(); ++i)
+        all << array.at(i);
+    return all;
+}
+
+bool repeatsNeighbour(const PlayArray &array)
+{
+    const QVector<int> all = records(array);
+    return std::adjacent_find(all.begin(), all.end()) != all.end();
+}
+
+bool isPermutation(QVector<int> all)
+{
+    std::sort(all.begin(), all.end());
+    for (int i = 0; i < all.size(); ++i) {
+        if (all.at(i) != i)
+            return false;
+    }
+    return true;
+}
+
+} // namespace
+
+class TestPlayOrder : public QObject
+{
+    Q_OBJECT
+
+private slots:
+    void drawsAreTakenModulo();
+    void randomNeverRepeatsItsNeighbour();
+    void aStuckSourceEnds();
+    void shuffleIsFair();
+    void appendedPagesKeepTheRules();
+    void anotherModeStartsAfresh();
+    void aShorterListStaysValid();
+    void roundsDoNotMeetInTheSamePhoto();
+};
+
+void TestPlayOrder::drawsAreTakenModulo()
+{
+    QVector<quint32> draws{7, 7, 4, 6, 1}; // the second is drawn again
+    const auto source = [&draws] { return draws.takeFirst(); };
+    QVector<int> array{0, 1, 2, 3};
+    playorder::order(array, 0, playorder::Random, source);
+    QCOMPARE(array, QVector<int>({3, 0, 2, 1}));
+
+    draws = {2, 4, 1, 5}; // positions 0 + 2, 1 + 4 % 3, 2 + 1, 3
+    array = {0, 1, 2, 3};
+    playorder::order(array, 0, playorder::Shuffle, source);
+    QCOMPARE(array, QVector<int>({2, 0, 3, 1}));
+}
+
+void TestPlayOrder::randomNeverRepeatsItsNeighbour()
+{
+    for (int count : {1, 2, 3, 50}) {
+        PlayArray array(seeded(17 + count));
+        array.extend(count, playorder::Normal);
+        for (int round = 0; round < 200; ++round) {
+            array.reorder(playorder::Random);
+            QCOMPARE(array.size(), count);
+            QVERIFY(!repeatsNeighbour(array));
+            const QVector<int> all = records(array);
+            QVERIFY(*std::min_element(all.begin(), all.end()) >= 0);
+            QVERIFY(*std::max_element(all.begin(), all.end()) < count);
+        }
+    }
+}
+
+void TestPlayOrder::aStuckSourceEnds()
+{
+    PlayArray array([] { return 4u; });
+    array.extend(5, playorder::Random);
+    QCOMPARE(array.size(), 5);
+    QVERIFY(!repeatsNeighbour(array));
+    array.startOver(playorder::Shuffle, array.at(0));
+    QVERIFY(isPermutation(records(array)));
+}
+
+// Each of the 24 orders of four photos: 1000 times expected, the deviation's squares below the
+// bound that chance exceeds once in a thousand runs (23 degrees of freedom).
+void TestPlayOrder::shuffleIsFair()
+{
+    QMap<QVector<int>, int> seen;
+    PlayArray array(seeded(4711));
+    array.extend(4, playorder::Normal);
+    for (int i = 0; i < 24000; ++i) {
+        array.reorder(playorder::Shuffle);
+        ++seen[records(array)];
+    }
+    QCOMPARE(seen.size(), 24);
+    double squares = 0;
+    for (int times : qAsConst(seen))
+        squares += (times - 1000.0) * (times - 1000.0) / 1000.0;
+    QVERIFY2(squares < 49.73, qPrintable(QString::number(squares)));
+}
+
+void TestPlayOrder::appendedPagesKeepTheRules()
+{
+    PlayArray shuffled(seeded(5));
+    shuffled.extend(8, playorder::Shuffle);
+    const QVector<int> first = records(shuffled);
+    shuffled.extend(24, playorder::Shuffle);
+    QCOMPARE(records(shuffled).mid(0, 8), first);
+    QVERIFY(isPermutation(records(shuffled)));
+    QVERIFY(records(shuffled).mid(8) != [] {
+        QVector<int> plain(16);
+        std::iota(plain.begin(), plain.end(), 8);
+        return plain;
+    }());
+
+    for (quint32 seed = 1; seed < 200; ++seed) {
+        PlayArray random(seeded(seed));
+        random.extend(1, playorder::Random);
+        random.extend(3, playorder::Random);
+        random.extend(8, playorder::Random);
+        QVERIFY(!repeatsNeighbour(random));
+    }
+    PlayArray plain;
+    plain.extend(3, playorder::Normal);
+    plain.extend(5, playorder::Normal);
+    plain.extend(4, playorder::Normal);
+    QCOMPARE(records(plain), QVector<int>({0, 1, 2, 3, 4}));
+    QCOMPARE(plain.at(5), -1);
+}
+
+// A random order holds some photos twice: a shuffle after it must still hold every one.
+void TestPlayOrder::anotherModeStartsAfresh()
+{
+    PlayArray array(seeded(99));
+    array.extend(30, playorder::Random);
+    QVERIFY(!isPermutation(records(array)));
+    array.reorder(playorder::Shuffle);
+    QVERIFY(isPermutation(records(array)));
+    array.reorder(playorder::Normal);
+    QCOMPARE(array.at(29), 29);
+}
+
+void TestPlayOrder::aShorterListStaysValid()
+{
+    for (int mode : {playorder::Normal, playorder::Random, playorder::Shuffle}) {
+        PlayArray array(seeded(3));
+        array.extend(20, mode);
+        array.shrink(6, mode);
+        QCOMPARE(array.size(), 6);
+        const QVector<int> all = records(array);
+        QVERIFY(*std::max_element(all.begin(), all.end()) < 6);
+        array.shrink(0, mode);
+        QCOMPARE(array.size(), 0);
+    }
+}
+
+void TestPlayOrder::roundsDoNotMeetInTheSamePhoto()
+{
+    for (int mode : {playorder::Random, playorder::Shuffle}) {
+        PlayArray array(seeded(8));
+        array.extend(3, mode);
+        for (int round = 0; round < 300; ++round) {
+            const int last = array.at(2);
+            array.startOver(mode, last);
+            QVERIFY(array.at(0) != last);
+        }
+    }
+}
+
+QTEST_APPLESS_MAIN(TestPlayOrder)
+#include "tst_playorder.moc"

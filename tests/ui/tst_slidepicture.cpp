@@ -1,0 +1,154 @@
+#include "data/testconfig.h"
+#include "support/logcapture.h"
+#include "ui/slidelabel.h"
+#include "ui/slidemotion.h"
+#include "ui/slidepicture.h"
+
+#include <QPainter>
+#include <QtTest>
+
+namespace {
+
+const QSize kScreen(320, 180);
+
+QPixmap photo(int width, int height)
+{
+    QPixmap picture(width, height);
+    picture.fill(Qt::red);
+    return picture;
+}
+
+QImage painted(const SlidePicture &slide)
+{
+    QImage screen(slide.screen, QImage::Format_RGB32);
+    screen.fill(Qt::green);
+    QPainter painter(&screen);
+    slide.paint(painter);
+    return screen;
+}
+
+} // namespace
+
+// What the slide show paints, without a player.
+class TestSlidePicture : public QObject
+{
+    Q_OBJECT
+
+private slots:
+    void everyPixelIsPainted_data();
+    void everyPixelIsPainted();
+    void motionNeverUncovers();
+    void textsDrift();
+    void fadesEndAndKeysCut();
+    void slowMachinesAreSpared();
+    void optionsStayInRange();
+};
+
+void TestSlidePicture::everyPixelIsPainted_data()
+{
+    QTest::addColumn<QSize>("size");
+    QTest::addColumn<bool>("isFilled");
+    QTest::addColumn<bool>("hasBands");
+
+    QTest::newRow("portrait") << QSize(101, 180) << false << false;
+    QTest::newRow("portrait, filled") << QSize(101, 180) << true << true;
+    QTest::newRow("panorama, filled") << QSize(320, 9) << true << true;
+    QTest::newRow("fits, filled") << kScreen << true << false;
+    QTest::newRow("a line, filled") << QSize(320, 1) << true << true;
+    QTest::newRow("one pixel, filled") << QSize(1, 1) << true << true;
+}
+
+void TestSlidePicture::everyPixelIsPainted()
+{
+    QFETCH(QSize, size);
+    QFETCH(bool, isFilled);
+    const SlidePicture slide = makeSlide(photo(size.width(), size.height()), kScreen, isFilled);
+    QTEST(!slide.bands.isEmpty(), "hasBands");
+    const QImage screen = painted(slide);
+    for (int y = 0; y < screen.height(); ++y) {
+        for (int x = 0; x < screen.width(); ++x) {
+            const QColor colour = screen.pixelColor(x, y);
+            if (slide.place.contains(x, y))
+                QCOMPARE(colour, QColor(Qt::red));
+            else
+                QVERIFY(colour.green() == 0 && colour.red() < 200);
+        }
+    }
+    const bool isLit = screen.pixelColor(0, 0).red() > 60;
+    QCOMPARE(isLit, !slide.bands.isEmpty() || size == kScreen);
+}
+
+void TestSlidePicture::motionNeverUncovers()
+{
+    for (const QSize &size : {QSize(320, 180), QSize(101, 180), QSize(320, 9)}) {
+        const QRectF rest = slidemotion::centred(size, kScreen);
+        for (int turn = 0; turn < 8; ++turn) {
+            QCOMPARE(slidemotion::moved(size, kScreen, 0, 10, turn), rest);
+            for (qreal moment : {0.01, 0.5, 1.0, 7.0})
+                QVERIFY(slidemotion::moved(size, kScreen, moment, 10, turn).contains(rest));
+        }
+        QVERIFY(slidemotion::moved(size, kScreen, 1, 10, 0) !=
+                slidemotion::moved(size, kScreen, 1, 10, 1));
+    }
+}
+
+void TestSlidePicture::textsDrift()
+{
+    for (int turn = 0; turn < 30; ++turn) {
+        const QPoint now = slidemotion::drift(turn, 4);
+        QVERIFY(qAbs(now.x()) <= 4 && qAbs(now.y()) <= 4);
+        QVERIFY(now != slidemotion::drift(turn + 1, 4));
+    }
+}
+
+void TestSlidePicture::fadesEndAndKeysCut()
+{
+    SlideOptions options;
+    options.fade = 60;
+    SlideLabel label(options);
+    label.resize(kScreen);
+    label.show();
+    label.setImage(photo(320, 180));
+    QVERIFY(!label.isFading());
+    QPixmap blue(320, 180);
+    blue.fill(Qt::blue);
+    const SlidePicture next = makeSlide(blue, kScreen, false);
+    label.showSlide(next, SlideLabel::Change::Fade);
+    QVERIFY(label.isFading());
+    QVERIFY(label.grab().toImage().pixelColor(160, 90).red() > 100);
+    QTRY_VERIFY(!label.isFading());
+    QCOMPARE(label.grab().toImage().pixelColor(160, 90), QColor(Qt::blue));
+
+    label.showSlide(makeSlide(photo(320, 180), kScreen, false), SlideLabel::Change::Fade);
+    label.showSlide(next, SlideLabel::Change::Cut);
+    QVERIFY(!label.isFading());
+    QCOMPARE(label.grab().toImage().pixelColor(160, 90), QColor(Qt::blue));
+}
+
+void TestSlidePicture::slowMachinesAreSpared()
+{
+    SlidePace pace;
+    int frames = 1;
+    while (!pace.isTooSlow(true) && frames < 100)
+        ++frames;
+    QCOMPARE(frames, 16);
+    pace.restart();
+    for (int i = 0; i < 200; ++i)
+        QVERIFY(!pace.isTooSlow(i % 3 == 0)); // a third is late: the decoder was at work
+}
+
+void TestSlidePicture::optionsStayInRange()
+{
+    TestConfig config;
+    const SlideOptions plain = SlideOptions::configured();
+    QVERIFY(plain.fade == 0 && plain.motion == 0 && plain.ahead == 1 && !plain.blurredFill);
+    QVERIFY(!plain.loop && !plain.keysWhileLoading && plain.clock == SlideCorner::None);
+    config.write("[SlideShow]\nFade=99999999\nMotion=-3\nAhead=0\nClock=Top Right\n"
+                 "Caption=bottomLEFT\nLoop=TRUE\nMarksSeconds=soon\n");
+    const SlideOptions odd = SlideOptions::configured();
+    QVERIFY(odd.fade == 5000 && odd.motion == 0 && odd.ahead == 1 && odd.marksSeconds == 0);
+    QVERIFY(odd.loop && odd.clock == SlideCorner::None && odd.caption == SlideCorner::BottomLeft);
+}
+
+QTEST_MAIN(TestSlidePicture)
+#include "tst_slidepicture.moc"

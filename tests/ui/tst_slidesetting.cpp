@@ -1,0 +1,150 @@
+#include "common/ui/remotekeys.h"
+#include "data/testconfig.h"
+#include "ui/settingitem.h"
+#include "ui/slidesetting.h"
+
+#include <QKeyEvent>
+#include <QPushButton>
+#include <QSignalSpy>
+#include <QtTest>
+
+// The panel by key presses.
+class TestSlideSetting : public QObject
+{
+    Q_OBJECT
+
+private slots:
+    void init();
+    void startsOnOk();
+    void focusMoves_data();
+    void focusMoves();
+    void theModeStopsAtBothEnds();
+    void theSpeedHasASmallestValue();
+    void keysWhileEditingStayInTheRow();
+    void buttonsAndReturnAnswer();
+    void aCancelledEditIsForgotten();
+
+private:
+    void press(std::initializer_list<int> keys)
+    {
+        for (int key : keys)
+            QTest::sendKeyEvent(QTest::Press, QApplication::focusWidget(), Qt::Key(key), QString(),
+                                {});
+    }
+    SettingItem *row(int index) const { return mPanel->findChildren<SettingItem *>().at(index); }
+    QString focused() const
+    {
+        if (const auto *button = qobject_cast<QPushButton *>(QApplication::focusWidget()))
+            return button->text();
+        return QApplication::focusWidget() == row(0) ? "mode" : "speed";
+    }
+
+    TestConfig mConfig;
+    std::unique_ptr<SlideSetting> mPanel;
+};
+
+void TestSlideSetting::init()
+{
+    SlideSetting::SlideMode = 0;
+    SlideSetting::SlideSpeed = 6;
+    mPanel = std::make_unique<SlideSetting>();
+    mPanel->resize(1280, 720);
+    mPanel->show();
+    QVERIFY(QTest::qWaitForWindowActive(mPanel.get()));
+    mPanel->load();
+}
+
+void TestSlideSetting::startsOnOk()
+{
+    QCOMPARE(focused(), QString("OK"));
+    QCOMPARE(mPanel->focusIndex(), 2);
+    QCOMPARE(row(0)->valueText(), QString("normal"));
+    QCOMPARE(row(1)->valueText(), QString("6 seconds"));
+}
+
+void TestSlideSetting::focusMoves_data()
+{
+    QTest::addColumn<QVector<int>>("keys");
+    QTest::addColumn<QString>("end");
+
+    const int up = DEVICE_UP_KEY, down = DEVICE_DOWN_KEY;
+    const int left = DEVICE_LEFT_KEY, right = DEVICE_RIGHT_KEY;
+    QTest::newRow("to Cancel") << QVector<int>{right} << "Cancel";
+    QTest::newRow("not beyond Cancel") << QVector<int>{right, right, down} << "Cancel";
+    QTest::newRow("back to OK") << QVector<int>{right, left, left} << "OK";
+    QTest::newRow("up from OK") << QVector<int>{up} << "speed";
+    QTest::newRow("up from Cancel") << QVector<int>{right, up} << "speed";
+    QTest::newRow("to the top") << QVector<int>{up, up, up} << "mode";
+    QTest::newRow("sideways in a row") << QVector<int>{up, left, right} << "speed";
+    QTest::newRow("up and down") << QVector<int>{up, up, down, down} << "OK";
+    QTest::newRow("not below OK") << QVector<int>{down} << "OK";
+}
+
+void TestSlideSetting::focusMoves()
+{
+    QFETCH(QVector<int>, keys);
+    for (int key : qAsConst(keys))
+        press({key});
+    QTEST(focused(), "end");
+    QCOMPARE(row(0)->styleSheet().contains("Button_Normal"), focused() == "mode");
+}
+
+void TestSlideSetting::theModeStopsAtBothEnds()
+{
+    press({DEVICE_UP_KEY, DEVICE_UP_KEY, DEVICE_SELECT_KEY, DEVICE_UP_KEY});
+    QCOMPARE(mPanel->mode(), 0);
+    press({DEVICE_DOWN_KEY, DEVICE_DOWN_KEY, DEVICE_DOWN_KEY});
+    QCOMPARE(row(0)->valueText(), QString("shuffle"));
+    QCOMPARE(mPanel->mode(), 2);
+}
+
+void TestSlideSetting::theSpeedHasASmallestValue()
+{
+    press({DEVICE_UP_KEY, DEVICE_SELECT_KEY, DEVICE_UP_KEY});
+    QCOMPARE(mPanel->speed(), 5);
+    press({DEVICE_UP_KEY});
+    QCOMPARE(mPanel->speed(), 5);
+    press({DEVICE_DOWN_KEY, DEVICE_DOWN_KEY, DEVICE_DOWN_KEY});
+    QCOMPARE(row(1)->valueText(), QString("8 seconds"));
+    row(1)->setValue(SettingItem::Number, INT_MAX);
+    press({DEVICE_SELECT_KEY, DEVICE_DOWN_KEY});
+    QCOMPARE(mPanel->speed(), INT_MAX);
+}
+
+void TestSlideSetting::keysWhileEditingStayInTheRow()
+{
+    press({DEVICE_UP_KEY, DEVICE_SELECT_KEY});
+    QVERIFY(row(1)->isEditing());
+    press({DEVICE_DOWN_KEY});
+    QCOMPARE(focused(), QString("speed"));
+    press({DEVICE_SELECT_KEY, DEVICE_DOWN_KEY});
+    QVERIFY(!row(1)->isEditing());
+    QCOMPARE(focused(), QString("OK"));
+    QCOMPARE(mPanel->speed(), 7);
+}
+
+void TestSlideSetting::buttonsAndReturnAnswer()
+{
+    QSignalSpy confirmed(mPanel.get(), &SlideSetting::clickConfirm);
+    QSignalSpy cancelled(mPanel.get(), &SlideSetting::clickCancel);
+    press({DEVICE_UP_KEY, DEVICE_SELECT_KEY, DEVICE_SELECT_KEY});
+    QVERIFY(confirmed.isEmpty() && cancelled.isEmpty());
+    press({DEVICE_DOWN_KEY, DEVICE_SELECT_KEY});
+    QCOMPARE(confirmed.size(), 1);
+    press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY});
+    QCOMPARE(cancelled.size(), 1);
+    press({DEVICE_RETURN_KEY});
+    QCOMPARE(cancelled.size(), 2);
+}
+
+void TestSlideSetting::aCancelledEditIsForgotten()
+{
+    press({DEVICE_UP_KEY, DEVICE_SELECT_KEY, DEVICE_DOWN_KEY});
+    mPanel->load();
+    QCOMPARE(mPanel->speed(), 6);
+    QVERIFY(!row(1)->isEditing());
+    QCOMPARE(focused(), QString("OK"));
+}
+
+QTEST_MAIN(TestSlideSetting)
+#include "tst_slidesetting.moc"
