@@ -88,19 +88,20 @@ void markFeatured(Database &database, const std::vector<std::int64_t> &photoIds,
                   const std::string &day)
 {
     Database::Writer writer(database);
+    // When all had been shown before today a new round begins, which leaves today's order as it is.
+    Query(writer,
+          "DELETE FROM featuredShown WHERE day < ?1 AND NOT EXISTS "
+          "(SELECT 1 FROM photos p JOIN albums a ON a.id = p.album "
+          "LEFT JOIN featuredShown s ON s.photo = p.id "
+          "WHERE (s.photo IS NULL OR s.day >= ?1) "
+          "AND p.present = 1 AND p.error = '' AND NOT a.private)",
+          day)
+        .run();
     for (const std::int64_t id : photoIds)
         Query(writer,
               "INSERT OR IGNORE INTO featuredShown (photo, day) "
               "SELECT id, ? FROM photos WHERE id = ?",
               day, id)
             .run();
-    // Once all have been shown a new round begins, with what was shown today in it.
-    Query(writer,
-          "DELETE FROM featuredShown WHERE day < ? AND NOT EXISTS "
-          "(SELECT 1 FROM photos p JOIN albums a ON a.id = p.album "
-          "LEFT JOIN featuredShown s ON s.photo = p.id WHERE s.photo IS NULL "
-          "AND p.present = 1 AND p.error = '' AND NOT a.private)",
-          day)
-        .run();
     writer.commit();
 }
