@@ -5,7 +5,6 @@
 
 #include <QKeyEvent>
 #include <QPushButton>
-#include <QSignalSpy>
 #include <QtTest>
 
 // The panel by key presses.
@@ -15,14 +14,9 @@ class TestSlideSetting : public QObject
 
 private slots:
     void init();
-    void startsOnOk();
     void focusMoves_data();
     void focusMoves();
-    void theModeStopsAtBothEnds();
-    void theSpeedHasASmallestValue();
-    void keysWhileEditingStayInTheRow();
-    void buttonsAndReturnAnswer();
-    void aCancelledEditIsForgotten();
+    void valuesStopAtTheirEnds();
 
 private:
     void press(std::initializer_list<int> keys)
@@ -54,14 +48,6 @@ void TestSlideSetting::init()
     mPanel->load();
 }
 
-void TestSlideSetting::startsOnOk()
-{
-    QCOMPARE(focused(), QString("OK"));
-    QCOMPARE(mPanel->focusIndex(), 2);
-    QCOMPARE(row(0)->valueText(), QString("normal"));
-    QCOMPARE(row(1)->valueText(), QString("6 seconds"));
-}
-
 void TestSlideSetting::focusMoves_data()
 {
     QTest::addColumn<QVector<int>>("keys");
@@ -86,64 +72,19 @@ void TestSlideSetting::focusMoves()
     for (int key : qAsConst(keys))
         press({key});
     QTEST(focused(), "end");
-    QCOMPARE(row(0)->styleSheet().contains("Button_Normal"), focused() == "mode");
 }
 
-void TestSlideSetting::theModeStopsAtBothEnds()
+void TestSlideSetting::valuesStopAtTheirEnds()
 {
-    press({DEVICE_UP_KEY, DEVICE_UP_KEY, DEVICE_SELECT_KEY, DEVICE_UP_KEY});
-    QCOMPARE(mPanel->mode(), 0);
-    press({DEVICE_DOWN_KEY, DEVICE_DOWN_KEY, DEVICE_DOWN_KEY});
-    QCOMPARE(row(0)->valueText(), QString("shuffle"));
-    QCOMPARE(mPanel->mode(), 2);
-}
-
-void TestSlideSetting::theSpeedHasASmallestValue()
-{
-    press({DEVICE_UP_KEY, DEVICE_SELECT_KEY, DEVICE_UP_KEY});
+    press({DEVICE_UP_KEY, DEVICE_SELECT_KEY, DEVICE_UP_KEY, DEVICE_UP_KEY});
     QCOMPARE(mPanel->speed(), 5);
-    press({DEVICE_UP_KEY});
-    QCOMPARE(mPanel->speed(), 5);
-    press({DEVICE_DOWN_KEY, DEVICE_DOWN_KEY, DEVICE_DOWN_KEY});
-    QCOMPARE(row(1)->valueText(), QString("8 seconds"));
     row(1)->setValue(SettingItem::Number, INT_MAX);
     press({DEVICE_SELECT_KEY, DEVICE_DOWN_KEY});
     QCOMPARE(mPanel->speed(), INT_MAX);
-}
-
-void TestSlideSetting::keysWhileEditingStayInTheRow()
-{
-    press({DEVICE_UP_KEY, DEVICE_SELECT_KEY});
-    QVERIFY(row(1)->isEditing());
-    press({DEVICE_DOWN_KEY});
-    QCOMPARE(focused(), QString("speed"));
-    press({DEVICE_SELECT_KEY, DEVICE_DOWN_KEY});
-    QVERIFY(!row(1)->isEditing());
-    QCOMPARE(focused(), QString("OK"));
-    QCOMPARE(mPanel->speed(), 7);
-}
-
-void TestSlideSetting::buttonsAndReturnAnswer()
-{
-    QSignalSpy confirmed(mPanel.get(), &SlideSetting::clickConfirm);
-    QSignalSpy cancelled(mPanel.get(), &SlideSetting::clickCancel);
-    press({DEVICE_UP_KEY, DEVICE_SELECT_KEY, DEVICE_SELECT_KEY});
-    QVERIFY(confirmed.isEmpty() && cancelled.isEmpty());
-    press({DEVICE_DOWN_KEY, DEVICE_SELECT_KEY});
-    QCOMPARE(confirmed.size(), 1);
-    press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY});
-    QCOMPARE(cancelled.size(), 1);
-    press({DEVICE_RETURN_KEY});
-    QCOMPARE(cancelled.size(), 2);
-}
-
-void TestSlideSetting::aCancelledEditIsForgotten()
-{
-    press({DEVICE_UP_KEY, DEVICE_SELECT_KEY, DEVICE_DOWN_KEY});
-    mPanel->load();
-    QCOMPARE(mPanel->speed(), 6);
-    QVERIFY(!row(1)->isEditing());
-    QCOMPARE(focused(), QString("OK"));
+    press({DEVICE_SELECT_KEY, DEVICE_UP_KEY, DEVICE_SELECT_KEY, DEVICE_UP_KEY});
+    QCOMPARE(mPanel->mode(), 0);
+    press({DEVICE_DOWN_KEY, DEVICE_DOWN_KEY, DEVICE_DOWN_KEY});
+    QCOMPARE(mPanel->mode(), 2);
 }
 
 QTEST_MAIN(TestSlideSetting)
