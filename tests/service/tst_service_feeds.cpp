@@ -74,14 +74,6 @@ TEST_F(Feeds, photosCarryWhatTheirRecordsRead)
     EXPECT_LE(thumbnails[0]["width"], thumbnails[2]["width"]);
 }
 
-TEST_F(Feeds, aPictureIsFoundAtItsWidth)
-{
-    std::string address = pathOf(album()["entry"][0]["content"]["src"]);
-    EXPECT_EQ(decode(get(address)->body).width, 48);
-    address.insert(address.rfind('/'), "/s24");
-    EXPECT_EQ(decode(get(address)->body).width, 24);
-}
-
 TEST_F(Feeds, featuredPhotosAreAllPublicOnesInAStableOrder)
 {
     const std::string path = std::string(base) +

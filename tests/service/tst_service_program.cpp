@@ -203,9 +203,6 @@ TEST_F(Program, mistakesAreExplained)
         EXPECT_EQ(output.status, 1) << arguments;
         EXPECT_EQ(output.text.rfind("orvala-service: ", 0), 0u) << output.text;
     }
-    for (const char *arguments :
-         {"serve", "user add", "user list", "user remove", "user token", "import", "photos"})
-        EXPECT_EQ(run(std::string(arguments) + " --help").status, 0) << arguments;
     EXPECT_NE(run("serve --port 70000").status, 0);
     writeBytes(mFolder.file("settings"), "[serve]\nport = 70000\n");
     EXPECT_NE(run("--config " + mFolder.file("settings") + " serve").status, 0);
