@@ -2,16 +2,8 @@
 #include "common/ui/qconfirm.h"
 #include "common/ui/qpopupdialog.h"
 #include "common/ui/qpopupform.h"
-#include "common/ui/remotekeys.h"
 #include "data/download.h"
-#include "data/heldanswers.h"
-#include "data/packagemanager.h"
-#include "data/photomanager.h"
-#include "data/testconfig.h"
-#include "data/testpictures.h"
 #include "platform/devicestate.h"
-#include "support/logcapture.h"
-#include "support/misbehavingserver.h"
 #include "ui/contentpages.h"
 #include "ui/formscrollarea.h"
 #include "ui/formscrollwidget.h"
@@ -19,13 +11,9 @@
 #include "ui/homewidget.h"
 #include "ui/photoitem.h"
 #include "ui/picturedetailwidget.h"
-#include "ui/samplefeeds.h"
+#include "ui/screencase.h"
 #include "ui/searchwidget.h"
 #include "ui/upwidget.h"
-
-#include <QKeyEvent>
-#include <QSignalSpy>
-#include <QtTest>
 
 namespace {
 
@@ -57,7 +45,7 @@ void answerSearch(QTcpSocket *socket, const MisbehavingServer::Request &request)
 } // namespace
 
 // The home screen by key presses, against a server of its own.
-class TestHomeWidget : public QObject
+class TestHomeWidget : public ScreenCase
 {
     Q_OBJECT
 
@@ -83,7 +71,6 @@ private slots:
 
 private:
     void open(const QByteArray &settings = QByteArray());
-    void press(std::initializer_list<int> keys);
     void enterMenu(int entry);
     void search(const QString &words);
     QStringList captions() const;
@@ -94,17 +81,13 @@ private:
     FailurePage *failure() const { return mHome->findChild<FailurePage *>(); }
     bool isReady() const { return !mHome->isLoading(); }
 
-    TestConfig mConfig;
-    std::unique_ptr<LogCapture> mLog;
-    std::unique_ptr<MisbehavingServer> mServer;
     std::unique_ptr<HomeWidget> mHome;
 };
 
 void TestHomeWidget::init()
 {
     NetworkCableStatus = true;
-    mLog = std::make_unique<LogCapture>();
-    mServer = std::make_unique<MisbehavingServer>();
+    startServer();
     mServer->on(kFeatured, answerFeatured);
     mServer->on(kMyAlbums, answer(sample::albums("me", 11)));
     mServer->on(kPeople, answer(sample::people(3)));
@@ -114,27 +97,14 @@ void TestHomeWidget::init()
 void TestHomeWidget::cleanup()
 {
     mHome.reset();
-    PackageManager::clearAll();
-    PhotoManager::clearAll();
-    mServer.reset();
-    mLog.reset();
+    forgetAll();
 }
 
 void TestHomeWidget::open(const QByteArray &settings)
 {
-    mConfig.write("[Max]\nCacheSize=16\n[Service]\nFeedBase=" + mServer->url("").toUtf8() + '\n' +
-                  settings);
-    PhotoManager::init();
+    configure(settings);
     mHome = std::make_unique<HomeWidget>();
-    mHome->resize(1280, 720);
-    mHome->show();
-    QVERIFY(QTest::qWaitForWindowActive(mHome.get()));
-}
-
-void TestHomeWidget::press(std::initializer_list<int> keys)
-{
-    for (int key : keys)
-        QTest::sendKeyEvent(QTest::Press, QApplication::focusWidget(), Qt::Key(key), QString(), {});
+    show(mHome.get());
 }
 
 void TestHomeWidget::enterMenu(int entry)

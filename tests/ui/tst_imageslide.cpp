@@ -1,27 +1,16 @@
-#include "common/ui/remotekeys.h"
 #include "data/download.h"
-#include "data/heldanswers.h"
-#include "data/packagemanager.h"
-#include "data/photomanager.h"
-#include "data/testconfig.h"
-#include "data/testpictures.h"
 #include "platform/devicestate.h"
-#include "support/logcapture.h"
-#include "support/misbehavingserver.h"
 #include "ui/formscrollarea.h"
 #include "ui/formscrollwidget.h"
 #include "ui/homewidget.h"
 #include "ui/qimageslide.h"
-#include "ui/samplefeeds.h"
+#include "ui/screencase.h"
 #include "ui/slidemarks.h"
 #include "ui/slidephotos.h"
 #include "ui/slidesetting.h"
 #include "ui/widget.h"
 
-#include <QKeyEvent>
-#include <QSignalSpy>
 #include <QTcpSocket>
-#include <QtTest>
 
 namespace {
 
@@ -40,7 +29,7 @@ QByteArray pathOf(int number)
 
 // The player by key presses, with the home screen and a server of its own. A turn's end is the
 // timer's slot being called.
-class TestImageSlide : public QObject
+class TestImageSlide : public ScreenCase
 {
     Q_OBJECT
 
@@ -71,7 +60,6 @@ private:
     void serve(int total);
     void answerPhotos(int first, int last, const MisbehavingServer::Behaviour &behaviour);
     void open(const QByteArray &slideShow = QByteArray());
-    void press(std::initializer_list<int> keys);
     void play(int index) { emit mPage->homeScreen()->slidePlay(index); }
     void show(int index) { emit mPage->homeScreen()->slideShow(index); }
     QImageSlide *player() const { return mPage->player(); }
@@ -80,9 +68,6 @@ private:
     QVector<int> requestsOf(int number) const;
     bool showsPhoto() const { return label()->placeholder().isEmpty(); }
 
-    TestConfig mConfig;
-    std::unique_ptr<LogCapture> mLog;
-    std::unique_ptr<MisbehavingServer> mServer;
     std::unique_ptr<Widget> mPage;
     std::unique_ptr<QSignalSpy> mReports;
 };
@@ -92,17 +77,13 @@ void TestImageSlide::init()
     NetworkCableStatus = true;
     SlideSetting::SlideMode = 0;
     SlideSetting::SlideSpeed = 3600; // no turn ends by itself
-    mLog = std::make_unique<LogCapture>();
-    mServer = std::make_unique<MisbehavingServer>();
+    startServer();
 }
 
 void TestImageSlide::cleanup()
 {
     mPage.reset();
-    PackageManager::clearAll();
-    PhotoManager::clearAll();
-    mServer.reset();
-    mLog.reset();
+    forgetAll();
 }
 
 // Featured photos 1 to total, as many a page as asked for; their thumbnails do not exist.
@@ -128,21 +109,11 @@ void TestImageSlide::answerPhotos(int first, int last,
 
 void TestImageSlide::open(const QByteArray &slideShow)
 {
-    mConfig.write("[Max]\nCacheSize=16\n[Service]\nFeedBase=" + mServer->url("").toUtf8() +
-                  "\n[SlideShow]\n" + slideShow);
-    PhotoManager::init();
+    configure("[SlideShow]\n" + slideShow);
     mPage = std::make_unique<Widget>();
-    mPage->resize(1280, 720);
-    mPage->show();
-    QVERIFY(QTest::qWaitForWindowActive(mPage.get()));
+    ScreenCase::show(mPage.get());
     QTRY_VERIFY(!mPage->homeScreen()->isLoading());
     mReports = std::make_unique<QSignalSpy>(player(), &QImageSlide::signalUpdatePlaybackinfo);
-}
-
-void TestImageSlide::press(std::initializer_list<int> keys)
-{
-    for (int key : keys)
-        QTest::sendKeyEvent(QTest::Press, QApplication::focusWidget(), Qt::Key(key), QString(), {});
 }
 
 QVector<int> TestImageSlide::requestsOf(int number) const

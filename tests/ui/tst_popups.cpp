@@ -4,22 +4,12 @@
 #include "common/ui/qpopupdialog.h"
 #include "common/ui/qpopupform.h"
 #include "common/ui/qtoastwidget.h"
-#include "common/ui/remotekeys.h"
-#include "data/heldanswers.h"
-#include "data/packagemanager.h"
-#include "data/photomanager.h"
-#include "data/testconfig.h"
-#include "support/logcapture.h"
-#include "support/misbehavingserver.h"
 #include "ui/notelist.h"
 #include "ui/photopopups.h"
 #include "ui/picturedetailwidget.h"
-#include "ui/samplefeeds.h"
+#include "ui/screencase.h"
 #include "ui/screentexts.h"
 #include "ui/sendingnotice.h"
-
-#include <QKeyEvent>
-#include <QtTest>
 
 namespace {
 
@@ -56,7 +46,7 @@ QByteArray tags(const QStringList &names)
 
 // What pops up over the photo screen, by key presses, against a server of its own. The server keys
 // its answers by path: the lists of comments and of tags come in turn.
-class TestPopups : public QObject
+class TestPopups : public ScreenCase
 {
     Q_OBJECT
 
@@ -76,7 +66,6 @@ private slots:
 private:
     void open(bool isSelfPhoto = true);
     void answerNotes(const MisbehavingServer::Behaviour &behaviour);
-    void press(std::initializer_list<int> keys);
     template <typename Type>
     Type *shown() const
     {
@@ -89,28 +78,21 @@ private:
     int count(const QByteArray &method) const;
     QString toast() const { return mScreen->findChild<QToastWidget *>()->text().simplified(); }
 
-    TestConfig mConfig;
-    std::unique_ptr<LogCapture> mLog;
-    std::unique_ptr<MisbehavingServer> mServer;
     std::unique_ptr<QWidget> mScreen;
     PictureDetailWidget *mDetail = nullptr;
 };
 
 void TestPopups::init()
 {
-    mLog = std::make_unique<LogCapture>();
-    mServer = std::make_unique<MisbehavingServer>();
-    mConfig.write("[Service]\nFeedBase=" + mServer->url("").toUtf8() + '\n');
+    startServer();
+    configure();
     AccountManagerHelper::setUserName("Me");
 }
 
 void TestPopups::cleanup()
 {
     mScreen.reset();
-    PackageManager::clearAll();
-    PhotoManager::clearAll();
-    mServer.reset();
-    mLog.reset();
+    forgetAll();
 }
 
 void TestPopups::open(bool isSelfPhoto)
@@ -124,13 +106,11 @@ void TestPopups::open(bool isSelfPhoto)
     QVERIFY(PackageManager::downloadPage(album, nullptr));
     QTRY_VERIFY(PackageManager::getPackage(album));
     mScreen = std::make_unique<QWidget>();
-    mScreen->resize(1280, 720);
     mDetail = new PictureDetailWidget(mScreen.get());
     mDetail->resize(1150, 500);
     new PhotoPopups(mDetail, mScreen.get());
     mDetail->showPhoto(0, PackageManager::getPackage(album), isSelfPhoto, true);
-    mScreen->show();
-    QVERIFY(QTest::qWaitForWindowActive(mScreen.get()));
+    show(mScreen.get());
     mDetail->setFocus();
     QTRY_VERIFY(count("GET") >= 1);
 }
@@ -138,12 +118,6 @@ void TestPopups::open(bool isSelfPhoto)
 void TestPopups::answerNotes(const MisbehavingServer::Behaviour &behaviour)
 {
     mServer->on(kPhoto, behaviour);
-}
-
-void TestPopups::press(std::initializer_list<int> keys)
-{
-    for (int key : keys)
-        QTest::sendKeyEvent(QTest::Press, QApplication::focusWidget(), Qt::Key(key), QString(), {});
 }
 
 int TestPopups::count(const QByteArray &method) const
