@@ -102,6 +102,7 @@ int main(int argc, char **argv)
 {
     CLI::App program("Serves folders of photos to the album browser.", "orvala-service");
     program.require_subcommand(1);
+    program.set_config("--config", "", "Settings from a file, those of serve below a line [serve]");
     const std::string standardData = "orvala-data";
     ServeOptions serve;
     serve.service.data = standardData;

@@ -2,10 +2,12 @@
 
 #include "base/secrets.h"
 #include "feeds/feeds.h"
+#include "feeds/health.h"
 #include "feeds/photopictures.h"
 #include "http/httpserver.h"
 #include "index/database.h"
 #include "pictures/thumbnailstore.h"
+#include "posting/posting.h"
 #include "scan/scanner.h"
 #include "signin/signinpages.h"
 
@@ -54,6 +56,7 @@ struct Service::Parts
     std::unique_ptr<ThumbnailStore> thumbnails;
     std::unique_ptr<Feeds> feeds;
     std::unique_ptr<PhotoPictures> pictures;
+    std::unique_ptr<Posting> posting;
     AuthorisationCodes codes{codeLife, SteadyClock::now};
     std::unique_ptr<SignInPages> signIn;
     std::unique_ptr<TokenEndpoint> tokens;
@@ -89,14 +92,18 @@ bool Service::Parts::startServer(const ServiceSettings &settings, std::string *e
 {
     thumbnails =
         std::make_unique<ThumbnailStore>(settings.data + "/thumbnails", settings.thumbnailBytes);
-    feeds = std::make_unique<Feeds>(*database, settings.withTls ? "https" : "http");
+    const std::string scheme = settings.withTls ? "https" : "http";
+    feeds = std::make_unique<Feeds>(*database, scheme);
+    posting = std::make_unique<Posting>(*database, scheme);
     pictures = std::make_unique<PhotoPictures>(*database, *thumbnails);
     tokens = std::make_unique<TokenEndpoint>(*database, codes,
                                              std::chrono::seconds(settings.accessLife).count());
     SignInPages::Settings pages;
     pages.withTls = settings.withTls;
     signIn = std::make_unique<SignInPages>(*database, codes, pages);
+    addHealthRoute(router, *database);
     feeds->addRoutes(router);
+    posting->addRoutes(router);
     pictures->addRoutes(router);
     signIn->addRoutes(router);
     tokens->addRoutes(router);

@@ -15,6 +15,8 @@
 #include <QJsonArray>
 #include <QJsonDocument>
 
+#include <limits>
+
 namespace {
 
 constexpr int PAGES = 42;
@@ -78,6 +80,19 @@ double longestGap(const HomeScreen &screen, const Label &label)
     return longest;
 }
 
+// The best of three: where others use the machine too, the plain work must not look long.
+double decodeAndFit(const QByteArray &jpeg, Label &label)
+{
+    double best = std::numeric_limits<double>::max();
+    for (int i = 0; i < 3; ++i)
+        best = std::min(best, bench::seconds([&] {
+                            const std::unique_ptr<QPixmap> picture(
+                                PhotoManager::createPhoto(jpeg.constData(), jpeg.size()));
+                            Download::showPicture(&label, *picture);
+                        }));
+    return best;
+}
+
 void measureGaps(HomeScreen &screen, const QByteArray &jpeg)
 {
     const QString url = originalOfFirstPhoto(screen);
@@ -91,11 +106,7 @@ void measureGaps(HomeScreen &screen, const QByteArray &jpeg)
         PhotoManager::downloadPhoto(url, Download::downloadDetailPhotoCB);
         gaps.push_back(longestGap(screen, label));
         screen.waitUntilIdle();
-        decodes.push_back(bench::seconds([&] {
-            const std::unique_ptr<QPixmap> picture(
-                PhotoManager::createPhoto(jpeg.constData(), jpeg.size()));
-            Download::showPicture(&label, *picture);
-        }));
+        decodes.push_back(decodeAndFit(jpeg, label));
         ratios.push_back(gaps.back() / decodes.back());
     }
     bench::row("longest gap while a page and a 1080p photo arrive, against decoding that photo",

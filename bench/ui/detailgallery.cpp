@@ -20,6 +20,7 @@
 #include <QTemporaryDir>
 #include <QtTest>
 
+#include <algorithm>
 #include <cstdio>
 
 namespace {
@@ -58,14 +59,16 @@ protected:
     void paintEvent(QPaintEvent *) override
     {
         QPainter painter(this);
-        painter.drawPixmap(0, 0, loadPicture(":/res/orvala_background.png", size()));
-        painter.drawPixmap(frame().topLeft(), loadPicture(":/res/Content_Bg.png", frame().size()));
+        painter.drawPixmap(0, 0, mBackground);
+        painter.drawPixmap(frame().topLeft(), mFrame);
     }
 
 private:
     static QRect frame() { return QRect(64, 100, 1152, 548); }
 
     PictureDetailWidget *mDetail;
+    const QPixmap mBackground = loadPicture(":/res/orvala_background.png", QSize(1280, 720));
+    const QPixmap mFrame = loadPicture(":/res/Content_Bg.png", frame().size());
 };
 
 class Gallery
@@ -81,6 +84,7 @@ public:
         for (int key : keys)
             QTest::sendKeyEvent(QTest::Press, mHost->detail(), Qt::Key(key), QString(), {});
     }
+    Host *host() { return mHost; }
     void take(const QString &name)
     {
         const auto *stage = mHost->findChild<DetailStage *>();
@@ -109,6 +113,34 @@ void takeStates(Gallery &gallery)
     gallery.press({DEVICE_SELECT_KEY, DEVICE_UP_KEY});
     gallery.take("without-information");
     gallery.press({DEVICE_DOWN_KEY, DEVICE_SELECT_KEY, DEVICE_UP_KEY});
+}
+
+// The last step of zoom and the far end of the photo.
+void takeClosest(Gallery &gallery)
+{
+    gallery.press({DEVICE_DOWN_KEY, DEVICE_LEFT_KEY, DEVICE_LEFT_KEY, DEVICE_LEFT_KEY,
+                   DEVICE_LEFT_KEY, DEVICE_LEFT_KEY, DEVICE_LEFT_KEY, DEVICE_RIGHT_KEY,
+                   DEVICE_SELECT_KEY});
+    for (int i = 0; i < 40; ++i)
+        gallery.press({i < 6 ? DEVICE_PAGEUP_KEY : DEVICE_RIGHT_KEY});
+    QTest::qWait(1000);
+    gallery.take("zoom-closest");
+}
+
+// From a key to the picture that it leads to.
+void measure(Gallery &gallery, const char *what, int key, int count)
+{
+    QVector<double> milliseconds;
+    for (int i = 0; i < count; ++i) {
+        QElapsedTimer timer;
+        timer.start();
+        gallery.press({key});
+        gallery.host()->repaint();
+        milliseconds << timer.nsecsElapsed() / 1e6;
+    }
+    std::sort(milliseconds.begin(), milliseconds.end());
+    std::printf("%s: median %.1f ms, worst %.1f ms\n", what,
+                milliseconds.at(milliseconds.size() / 2), milliseconds.last());
 }
 
 } // namespace
@@ -144,7 +176,12 @@ int main(int argc, char **argv)
         gallery.take(QString("photo%1").arg(i, 2, 10, QChar('0')));
         if (i == 1)
             takeStates(gallery);
+        if (i == count)
+            takeClosest(gallery);
         gallery.press({DEVICE_RIGHT_KEY});
     }
+    measure(gallery, "move in the magnified photo", DEVICE_LEFT_KEY, 10);
+    gallery.press({DEVICE_RETURN_KEY});
+    measure(gallery, "photo before, which is there", DEVICE_PRE_KEY, qMax(1, count - 1));
     return 0;
 }

@@ -191,3 +191,13 @@ std::string absoluteFolder(const std::string &folder)
         path.pop_back();
     return path;
 }
+
+bool liesWithin(const std::string &folder, const std::string &path)
+{
+    std::error_code code, pathCode;
+    const std::string start = std::filesystem::canonical(folder, code).string();
+    const std::string end = std::filesystem::canonical(path, pathCode).string();
+    if (code || pathCode)
+        return false;
+    return start == "/" || end == start || end.rfind(start + "/", 0) == 0;
+}

@@ -29,5 +29,8 @@ std::optional<std::int64_t> parseTime(const std::string &text);
 // A file name without its extension; a name that is only an extension stays whole.
 std::string withoutExtension(const std::string &name);
 
+// Whether a file is below a folder when all links are followed; false when it is not there.
+bool liesWithin(const std::string &folder, const std::string &path);
+
 // The absolute form of a folder without a slash at its end.
 std::string absoluteFolder(const std::string &folder);

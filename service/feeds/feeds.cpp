@@ -1,19 +1,14 @@
 #include "feeds/feeds.h"
 
-#include "base/texts.h"
-#include "feeds/feedrequest.h"
-#include "feeds/feedwriter.h"
+#include "feeds/asked.h"
 #include "index/catalogue.h"
 #include "index/database.h"
-#include "index/tokens.h"
 #include "index/users.h"
 
 namespace {
 
 constexpr PageLimits pagedLimits = {25, 1000};
 constexpr PageLimits listLimits = {10'000, 10'000}; // for clients that read a whole list at once
-constexpr int forbidden = 403;
-constexpr int notFound = 404;
 
 FeedJson photoEntries(const std::vector<PhotoRecord> &photos, const std::string &origin)
 {
@@ -36,69 +31,12 @@ std::optional<PhotoRecord> coverOf(Session &session, const AlbumRecord &album)
     return album.cover ? photoWithId(session, *album.cover) : std::nullopt;
 }
 
-// "default" is the one who asks; anybody else goes by number or mail.
-std::optional<UserRecord> userNamed(Session &session, const std::string &name,
-                                    const UserRecord &asking)
-{
-    if (name == "default")
-        return asking;
-    if (const auto id = parseNumber(name))
-        return userWithId(session, *id);
-    return userWithMail(session, name);
-}
-
 } // namespace
-
-struct Feeds::Asked
-{
-    Session &session;
-    const Router::Call &call;
-    httplib::Response &response;
-    std::string origin;
-    UserRecord asking; // with a token only
-    UserRecord owner;  // of the feed; with a token only
-
-    void refuse(int status, const std::string &message) { answerError(response, status, message); }
-    std::optional<Page> page(const PageLimits &limits)
-    {
-        auto page = pageOf(call.request, limits);
-        if (!page)
-            refuse(400, "start-index and max-results take numbers");
-        return page;
-    }
-    // The album of the address, if the one who asks may see it.
-    std::optional<AlbumRecord> album()
-    {
-        const auto id = parseNumber(call.pieces[1]);
-        auto album = id ? albumWithId(session, owner.id, *id) : std::nullopt;
-        if (!album)
-            refuse(notFound, "there is no such album");
-        else if (album->isPrivate && owner.id != asking.id) {
-            refuse(forbidden, "this album is private");
-            album.reset();
-        }
-        return album;
-    }
-    void send(const std::string &title, const Page &page, std::int64_t total, FeedJson entries)
-    {
-        const std::string &target = call.request.target;
-        FeedHead head{origin + target.substr(0, target.find('?')), title, total, page, nullptr};
-        if (owner.id != 0)
-            head.owner = &owner;
-        response.set_content(feedDocument(head, std::move(entries)),
-                             "application/json; charset=UTF-8");
-    }
-    // A list that is always sent whole.
-    void sendAll(const std::string &title, FeedJson entries)
-    {
-        const auto count = static_cast<std::int64_t>(entries.size());
-        send(title, {1, count}, count, std::move(entries));
-    }
-};
 
 Feeds::Feeds(Database &database, std::string scheme)
     : mDatabase(database)
     , mScheme(std::move(scheme))
+    , mFeatured(database)
 {
 }
 
@@ -127,27 +65,9 @@ Router::Handler Feeds::withToken(Answer answer)
     return [this, answer](const Router::Call &call, httplib::Response &response) {
         auto reader = mDatabase.read();
         Asked asked{reader, call, response, originOf(call.request, mScheme), {}, {}};
-        if (identify(asked))
+        if (asked.identify())
             (this->*answer)(asked);
     };
-}
-
-bool Feeds::identify(Asked &asked) const
-{
-    const auto asking = userOfToken(asked.session, accessTokenOf(asked.call.request));
-    if (!asking) {
-        asked.response.set_header("WWW-Authenticate", "Bearer");
-        asked.refuse(401, "the access token is missing, unknown or has expired");
-        return false;
-    }
-    const auto owner = userNamed(asked.session, asked.call.pieces[0], *asking);
-    if (!owner) {
-        asked.refuse(notFound, "there is no such user");
-        return false;
-    }
-    asked.asking = *asking;
-    asked.owner = *owner;
-    return true;
 }
 
 void Feeds::featured(Asked &asked)
@@ -156,7 +76,9 @@ void Feeds::featured(Asked &asked)
     if (!page)
         return;
     const FeaturedList::Ids ids = mFeatured.photos(asked.session);
-    const auto photos = photosWithIds(asked.session, slice(*ids, *page));
+    const std::vector<std::int64_t> shown = slice(*ids, *page);
+    const auto photos = photosWithIds(asked.session, shown);
+    mFeatured.noteShown(shown);
     asked.send("Featured photos", *page, ids->size(), photoEntries(photos, asked.origin));
 }
 
@@ -200,13 +122,9 @@ void Feeds::albumPhotos(Asked &asked)
 
 void Feeds::aboutPhoto(Asked &asked)
 {
-    const auto album = asked.album();
-    if (!album)
+    const auto photo = asked.photo();
+    if (!photo)
         return;
-    const auto id = parseNumber(asked.call.pieces[2]);
-    const auto photo = id ? photoWithId(asked.session, *id) : std::nullopt;
-    if (!photo || photo->albumId != album->id)
-        return asked.refuse(notFound, "there is no such photo");
     const std::string kind = asked.call.request.get_param_value("kind");
     if (kind == "comment")
         comments(asked, *photo);

@@ -5,7 +5,7 @@
 #include "index/records.h"
 
 class Database;
-class Session;
+struct Asked;
 
 // Answers the feed addresses from the index. `scheme` ("https" or "http") begins the addresses that
 // the feeds name; the rest of their origin is the host that the client asked for.
@@ -16,13 +16,10 @@ public:
     void addRoutes(Router &router);
 
 private:
-    // One request: its session, who asks and what feeds need of it.
-    struct Asked;
     using Answer = void (Feeds::*)(Asked &);
 
     Router::Handler openToAll(Answer answer);
     Router::Handler withToken(Answer answer);
-    bool identify(Asked &asked) const;
 
     void featured(Asked &asked);
     void search(Asked &asked);

@@ -218,3 +218,10 @@ std::string feedDocument(const FeedHead &head, FeedJson entries)
         {"version", "1.0"}, {"encoding", "UTF-8"}, {"feed", std::move(feed)}};
     return document.dump(-1, ' ', false, FeedJson::error_handler_t::replace);
 }
+
+std::string entryDocument(FeedJson entry)
+{
+    const FeedJson document = {
+        {"version", "1.0"}, {"encoding", "UTF-8"}, {"entry", std::move(entry)}};
+    return document.dump(-1, ' ', false, FeedJson::error_handler_t::replace);
+}

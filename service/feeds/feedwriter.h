@@ -38,6 +38,9 @@ struct FeedHead
 // The feed's text.
 std::string feedDocument(const FeedHead &head, FeedJson entries);
 
+// One entry alone, as the answer to what was posted.
+std::string entryDocument(FeedJson entry);
+
 // Where the picture of a photo is fetched; "/s" and a width go in front of the last "/" for a
 // smaller one.
 std::string pictureAddress(const PhotoRecord &photo, const std::string &origin);

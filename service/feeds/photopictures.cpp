@@ -69,7 +69,7 @@ void PhotoPictures::answer(const std::string &key, int width, const httplib::Req
         auto reader = mDatabase.read(); // not kept while the picture is made
         file = fileWithKey(reader, key);
     }
-    if (!file)
+    if (!file || !liesWithin(file->folder, file->path))
         return answerError(response, notFound, "there is no such photo");
     const std::string tag =
         '"' + fingerprint(file->identity).substr(0, 32) + "-" + std::to_string(width) + '"';

@@ -13,6 +13,8 @@ namespace {
 
 constexpr std::size_t inputBytes = 16 * 1024;
 constexpr std::size_t outputBytes = 64 * 1024;
+constexpr std::chrono::seconds drainTime{5};
+constexpr int drainSilence = 500; // milliseconds
 
 void addressOf(const sockaddr_storage &address, std::string &ip, int &port)
 {
@@ -55,6 +57,8 @@ ClientStream::~ClientStream()
         SSL_shutdown(mSsl); // says goodbye and does not wait for the answer
     SSL_free(mSsl);
     ::shutdown(mSocket, SHUT_WR);
+    if (mHasUnread)
+        drain();
     ::close(mSocket);
 }
 
@@ -73,11 +77,12 @@ bool ClientStream::handshake()
 void ClientStream::beginRequest()
 {
     mDeadline = Clock::now() + mLimits.head;
-    mBytesLeft = mLimits.requestBytes;
+    mBytesLeft = mLimits.headBytes;
 }
 
-void ClientStream::headArrived()
+void ClientStream::headArrived(std::size_t bodyBytes)
 {
+    mBytesLeft = bodyBytes;
     mDeadline = Clock::now() + mLimits.body;
 }
 
@@ -85,6 +90,7 @@ void ClientStream::closeAfterAnswer()
 {
     mBytesLeft = 0;
     mBroken = true;
+    mHasUnread = true;
 }
 
 bool ClientStream::hasInput() const
@@ -237,4 +243,17 @@ bool ClientStream::fail()
 {
     mBroken = true;
     return false;
+}
+
+// Closing with bytes unread would reset the connection and take the answer with it, so what a
+// client is still sending is read and dropped, for a while.
+void ClientStream::drain()
+{
+    const Clock::time_point end = Clock::now() + drainTime;
+    std::string bytes(outputBytes, '\0');
+    pollfd descriptors[2] = {{mSocket, POLLIN, 0}, {mStopEvent, POLLIN, 0}};
+    while (Clock::now() < end && ::poll(descriptors, 2, drainSilence) > 0 &&
+           descriptors[1].revents == 0 &&
+           ::recv(mSocket, bytes.data(), bytes.size(), MSG_DONTWAIT) > 0) {
+    }
 }

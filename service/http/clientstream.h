@@ -18,7 +18,7 @@ public:
         std::chrono::seconds head{10};    // from its first byte to the end of the header lines
         std::chrono::seconds body{600};   // for the rest of the request and the answer
         std::chrono::seconds silence{20}; // without a byte in either direction
-        std::size_t requestBytes = 0;     // header lines and body together
+        std::size_t headBytes = 0;        // header lines
     };
 
     // Takes the socket over. `stopEvent` is a descriptor that becomes readable when every wait has
@@ -31,7 +31,8 @@ public:
     // Completes the TLS handshake, once; false when the client does not manage it.
     bool handshake();
     void beginRequest();
-    void headArrived();
+    // The rest of the request has at most so many bytes.
+    void headArrived(std::size_t bodyBytes);
     // Bytes of a next request are here already, or come within a moment.
     bool hasInput() const;
     bool awaitsInput(std::chrono::milliseconds moment);
@@ -58,6 +59,7 @@ private:
     ssize_t send(const char *bytes, std::size_t size);
     bool fill();
     bool fail();
+    void drain();
 
     const int mSocket;
     const int mStopEvent;
@@ -65,6 +67,7 @@ private:
     SSL *mSsl = nullptr;
     bool mHandshakeDone = false;
     bool mBroken = false;
+    bool mHasUnread = false;
     Clock::time_point mDeadline;
     std::size_t mBytesLeft = 0;
     std::string mInput;

@@ -11,6 +11,8 @@
 namespace {
 
 constexpr std::size_t headBytes = 64 * 1024;
+constexpr std::size_t chunkBytes = 64 * 1024; // what a body in chunks has beside its content
+constexpr std::size_t largestBody = 128 * 1024 * 1024; // the router sets lower limits
 constexpr std::size_t longestPath = 1024; // matching by regular expression recurses once per byte
 constexpr int waitingConnections = 128;
 // A client that fetches a page sends the next request at once: a worker that stays for it saves
@@ -105,14 +107,14 @@ void HttpServer::setUp()
     });
     set_keep_alive_timeout(keepAliveSeconds);
     set_keep_alive_max_count(keepAliveRequests);
-    set_payload_max_length(mSettings.bodyBytes);
+    set_payload_max_length(largestBody);
     set_pre_routing_handler([this](const httplib::Request &request, httplib::Response &response) {
         if (request.path.size() > longestPath)
             answerError(response, 414, messageOf(414));
         else if (!takesBody(request))
             mRouter.answer(request, response);
         else
-            return HandlerResponse::Unhandled; // its body has to be read first
+            return takeBody(request, response);
         return HandlerResponse::Handled;
     });
     const Handler answer = [this](const httplib::Request &request, httplib::Response &response) {
@@ -122,6 +124,21 @@ void HttpServer::setUp()
     set_error_handler(Handler(explainFailure));
     set_exception_handler(handleException);
     set_logger(logRequest);
+}
+
+// A body has to be read first, if it is not too long.
+HttpServer::HandlerResponse HttpServer::takeBody(const httplib::Request &request,
+                                                 httplib::Response &response)
+{
+    httplib::Response refusal;
+    if (!isTooLarge(request, mRouter.bodyLimit(request, refusal)))
+        return HandlerResponse::Unhandled;
+    if (refusal.body.empty())
+        answerError(refusal, 413, messageOf(413));
+    response.status = refusal.status;
+    response.body = std::move(refusal.body);
+    response.headers.insert(refusal.headers.begin(), refusal.headers.end());
+    return HandlerResponse::Handled;
 }
 
 bool HttpServer::start()
@@ -159,7 +176,7 @@ void HttpServer::stop()
 bool HttpServer::process_and_close_socket(socket_t socket)
 {
     ClientStream::Limits limits;
-    limits.requestBytes = headBytes + mSettings.bodyBytes;
+    limits.headBytes = headBytes;
     ::fcntl(socket, F_SETFL, ::fcntl(socket, F_GETFL) | O_NONBLOCK);
     mParking->park(std::make_shared<ClientStream>(socket, mSettings.context, mStopEvent, limits));
     return true;
@@ -192,11 +209,13 @@ bool HttpServer::serveRequest(ClientStream &client)
         false; // after lines that are no request, nothing can be told from what follows
     const auto headArrived = [this, &client, &isUnderstood](httplib::Request &request) {
         isUnderstood = true;
-        client.headArrived();
+        httplib::Response refusal;
+        const std::size_t limit = mRouter.bodyLimit(request, refusal);
+        client.headArrived(limit + chunkBytes);
         simplify(request);
         noteRequestStart();
         // Bytes that nobody reads would be taken for the next request.
-        if (isTooLarge(request, mSettings.bodyBytes) ||
+        if (isTooLarge(request, limit) ||
             (hasBody(request) && (!takesBody(request) || request.path.size() > longestPath)))
             client.closeAfterAnswer();
     };

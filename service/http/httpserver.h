@@ -22,7 +22,6 @@ public:
         std::string address;
         int port = 0; // 0: a free one
         int threads = 16;
-        std::size_t bodyBytes = 1024 * 1024;
         SSL_CTX *context = nullptr; // no TLS without one
     };
 
@@ -41,7 +40,7 @@ private:
     void setUp();
     void serve(const Client &client);
     bool serveRequest(ClientStream &client);
-    void answerRequest(const httplib::Request &request, httplib::Response &response);
+    HandlerResponse takeBody(const httplib::Request &request, httplib::Response &response);
 
     const Router &mRouter;
     const Settings mSettings;

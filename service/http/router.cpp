@@ -46,28 +46,45 @@ std::optional<std::vector<std::string>> match(const std::vector<std::string> &pa
 
 } // namespace
 
-void Router::add(const std::string &method, const std::string &pattern, Handler handler)
+void Router::add(const std::string &method, const std::string &pattern, Handler handler,
+                 BodyLimit limit)
 {
-    mRoutes.push_back({method, splitPath("/" + pattern), std::move(handler)});
+    mRoutes.push_back({method, splitPath("/" + pattern), std::move(handler), std::move(limit)});
 }
 
-void Router::answer(const httplib::Request &request, httplib::Response &response) const
+Router::Found Router::find(const httplib::Request &request) const
 {
     const std::vector<std::string> pieces = piecesOf(request.target);
     const std::string method = request.method == "HEAD" ? "GET" : request.method;
-    bool isKnownPath = false;
+    Found found;
     for (const Route &route : mRoutes) {
         auto places = match(route.pattern, pieces);
         if (!places)
             continue;
+        found.isKnownPath = true;
         if (route.method == method)
-            return route.handler({request, std::move(*places)}, response);
-        isKnownPath = true;
+            return {&route, true, std::move(*places)};
     }
-    if (isKnownPath)
-        answerError(response, 405, "this address does not take " + method);
+    return found;
+}
+
+void Router::answer(const httplib::Request &request, httplib::Response &response) const
+{
+    Found found = find(request);
+    if (found.route)
+        found.route->handler({request, std::move(found.places)}, response);
+    else if (found.isKnownPath)
+        answerError(response, 405, "this address does not take " + request.method);
     else
         answerError(response, 404, "there is nothing at this address");
+}
+
+std::size_t Router::bodyLimit(const httplib::Request &request, httplib::Response &response) const
+{
+    Found found = find(request);
+    if (!found.route || !found.route->limit)
+        return standardBody;
+    return found.route->limit({request, std::move(found.places)}, response);
 }
 
 void answerError(httplib::Response &response, int status, const std::string &message)

@@ -45,7 +45,9 @@ std::int64_t writePhoto(Session &session, std::int64_t albumId, const FoundFile 
           "height, title, caption, published, latitude, longitude) "
           "VALUES (?1, ?2, ?3, ?4, ?5, 1, ?6, ?7, ?8, ?9, ?10, ?11, ?12, ?13, ?14) "
           "ON CONFLICT (album, name) DO UPDATE SET size = ?4, changed = ?5, present = 1, "
-          "error = ?6, mimeType = ?7, width = ?8, height = ?9, title = ?10, caption = ?11, "
+          "error = ?6, mimeType = ?7, width = ?8, height = ?9, "
+          "title = CASE givenTitle WHEN '' THEN ?10 ELSE givenTitle END, "
+          "caption = CASE givenCaption WHEN '' THEN ?11 ELSE givenCaption END, "
           "published = ?12, latitude = ?13, longitude = ?14",
           albumId, file.name, randomText(keyBytes), file.size, file.changed, file.error,
           metadata.mimeType, metadata.width, metadata.height, titleOf(file), metadata.caption,
@@ -134,6 +136,31 @@ std::int64_t presentPhotos(Session &session, std::int64_t userId)
 {
     Query query(session, "SELECT coalesce(sum(photoCount), 0) FROM albums WHERE user = ?", userId);
     return query.next() ? query.number(0) : 0;
+}
+
+std::int64_t addPhoto(Database &database, const FolderState &state, const FoundFile &file,
+                      const GivenTexts &texts)
+{
+    Database::Writer writer(database);
+    writeFolder(writer, {state, {file}, {}, {}});
+    std::int64_t photoId = 0;
+    {
+        Query query(writer,
+                    "SELECT p.id FROM photos p JOIN albums a ON a.id = p.album "
+                    "WHERE a.user = ? AND a.folder = ? AND p.name = ?",
+                    state.userId, state.folder, file.name);
+        photoId = query.next() ? query.number(0) : 0;
+    }
+    Query(writer,
+          "UPDATE photos SET givenTitle = ?2, givenCaption = ?3, "
+          "title = CASE ?2 WHEN '' THEN title ELSE ?2 END, "
+          "caption = CASE ?3 WHEN '' THEN caption ELSE ?3 END WHERE id = ?1",
+          photoId, texts.title, texts.caption)
+        .run();
+    refreshPhotoSearch(writer, photoId);
+    raiseRevision(writer, Revision::Photos);
+    writer.commit();
+    return photoId;
 }
 
 void writeChanges(Database &database, const std::vector<FolderChanges> &changes)

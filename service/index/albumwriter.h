@@ -55,5 +55,15 @@ std::map<std::string, KnownAlbum> knownAlbums(Session &session, std::int64_t use
 std::map<std::string, KnownFile> knownFiles(Session &session, std::int64_t albumId);
 std::int64_t presentPhotos(Session &session, std::int64_t userId);
 
+// A photo that is new in its folder, with texts that stand above those in the file (empty: none).
+// The result is its id.
+struct GivenTexts
+{
+    std::string title;
+    std::string caption;
+};
+std::int64_t addPhoto(Database &database, const FolderState &state, const FoundFile &file,
+                      const GivenTexts &texts);
+
 // Writes the changes in one transaction.
 void writeChanges(Database &database, const std::vector<FolderChanges> &changes);

@@ -106,6 +106,14 @@ std::optional<AlbumRecord> albumWithId(Session &session, std::int64_t userId, st
     return albumAt(query);
 }
 
+std::optional<std::string> folderOfAlbum(Session &session, std::int64_t albumId)
+{
+    Query query(session, "SELECT folder FROM albums WHERE id = ?", albumId);
+    if (!query.next())
+        return std::nullopt;
+    return query.text(0);
+}
+
 std::vector<PhotoRecord> photosOf(Session &session, std::int64_t albumId, const Page &page)
 {
     std::vector<PhotoRecord> photos;
@@ -134,14 +142,6 @@ std::vector<PhotoRecord> photosWithIds(Session &session, const std::vector<std::
             photos.push_back(std::move(*photo));
     }
     return photos;
-}
-
-std::vector<std::int64_t> featuredOrder(Session &session)
-{
-    // Keys are random and stay: their order is a shuffle that every page agrees on.
-    return numbersOf(Query(session, "SELECT p.id FROM photos p JOIN albums a ON a.id = p.album "
-                                    "WHERE p.present = 1 AND p.error = '' AND NOT a.private "
-                                    "ORDER BY p.key"));
 }
 
 std::string searchExpression(const std::string &text)
@@ -213,13 +213,14 @@ std::optional<PhotoRecord> portraitOf(Session &session, std::int64_t userId)
 std::optional<PhotoFile> fileWithKey(Session &session, const std::string &key)
 {
     Query query(session,
-                "SELECT " PATH_OF_PHOTO ", p.id, p.size, p.changed FROM photos p "
+                "SELECT " PATH_OF_PHOTO ", p.id, p.size, p.changed, u.photos FROM photos p "
                 "JOIN albums a ON a.id = p.album JOIN users u ON u.id = a.user "
                 "WHERE p.key = ? AND p.present = 1",
                 key);
     if (!query.next())
         return std::nullopt;
-    return PhotoFile{query.text(0), query.text(1) + "-" + query.text(2) + "-" + query.text(3)};
+    return PhotoFile{query.text(0), query.text(1) + "-" + query.text(2) + "-" + query.text(3),
+                     query.text(4)};
 }
 
 std::vector<UnreadablePhoto> unreadablePhotos(Session &session)

@@ -18,13 +18,13 @@ std::vector<AlbumRecord> albumsOf(Session &session, const AlbumFilter &filter, c
 std::int64_t albumCount(Session &session, const AlbumFilter &filter);
 std::optional<AlbumRecord> albumWithId(Session &session, std::int64_t userId, std::int64_t albumId);
 
+// The album's folder below its user's; nothing if there is no such album.
+std::optional<std::string> folderOfAlbum(Session &session, std::int64_t albumId);
+
 // In the order in which they were taken.
 std::vector<PhotoRecord> photosOf(Session &session, std::int64_t albumId, const Page &page);
 std::optional<PhotoRecord> photoWithId(Session &session, std::int64_t photoId);
 std::vector<PhotoRecord> photosWithIds(Session &session, const std::vector<std::int64_t> &ids);
-
-// All photos for everybody, in an order that mixes people and albums and stays as it is.
-std::vector<std::int64_t> featuredOrder(Session &session);
 
 // A MATCH expression for photos that hold a word beginning with each word of the text; empty for a
 // text without a word.

@@ -62,6 +62,7 @@ struct PhotoFile
 {
     std::string path;
     std::string identity; // changes with the file
+    std::string folder;   // of its owner
 };
 
 // A part of a list: `start` counts from 1.

@@ -92,7 +92,24 @@ CREATE VIRTUAL TABLE photoSearch USING fts5 (
 );
 )sql";
 
-const char *const steps[] = {firstVersion};
+// Texts that came with an uploaded photo; they stand above those in its file.
+const char givenTexts[] = R"sql(
+ALTER TABLE photos ADD COLUMN givenTitle TEXT NOT NULL DEFAULT '';
+ALTER TABLE photos ADD COLUMN givenCaption TEXT NOT NULL DEFAULT '';
+)sql";
+
+// What has been featured since all photos had been, and when.
+const char featuredMemory[] = R"sql(
+CREATE TABLE featuredShown (
+    photo INTEGER PRIMARY KEY REFERENCES photos (id) ON DELETE CASCADE,
+    day TEXT NOT NULL
+);
+DROP INDEX showablePhotos;
+CREATE INDEX showablePhotos ON photos (album, published, key, present, error)
+    WHERE present = 1 AND error = '';
+)sql";
+
+const char *const steps[] = {firstVersion, givenTexts, featuredMemory};
 constexpr int newestVersion = sizeof steps / sizeof steps[0];
 
 } // namespace

@@ -29,13 +29,25 @@ bool mayMatter(const dirent &entry)
     return entry.d_type == DT_DIR || entry.d_type == DT_LNK || entry.d_type == DT_UNKNOWN;
 }
 
-void addEntry(FolderListing &listing, const char *name, const struct stat &status)
+bool isLink(int folder, const dirent &entry)
+{
+    struct stat status
+    {
+    };
+    if (entry.d_type != DT_UNKNOWN)
+        return entry.d_type == DT_LNK;
+    return ::fstatat(folder, entry.d_name, &status, AT_SYMLINK_NOFOLLOW) == 0 &&
+           S_ISLNK(status.st_mode);
+}
+
+void addEntry(FolderListing &listing, const char *name, const struct stat &status, bool isLink)
 {
     if (S_ISDIR(status.st_mode))
-        listing.folders.push_back({name, status.st_dev, status.st_ino});
+        listing.folders.push_back({name, status.st_dev, status.st_ino, isLink});
     else if (S_ISREG(status.st_mode) && hasPhotoName(name))
-        listing.files.push_back(
-            {name, status.st_size, status.st_mtim.tv_sec * nanoseconds + status.st_mtim.tv_nsec});
+        listing.files.push_back({name, status.st_size,
+                                 status.st_mtim.tv_sec * nanoseconds + status.st_mtim.tv_nsec,
+                                 isLink});
 }
 
 template <typename Entries>
@@ -62,7 +74,7 @@ std::optional<FolderListing> listFolder(const std::string &path)
         };
         if (name[0] != '.' && mayMatter(*entry) &&
             ::fstatat(::dirfd(folder.get()), entry->d_name, &status, 0) == 0)
-            addEntry(listing, entry->d_name, status);
+            addEntry(listing, entry->d_name, status, isLink(::dirfd(folder.get()), *entry));
     }
     sortByName(listing.files);
     sortByName(listing.folders);

@@ -12,6 +12,7 @@ struct ListedFile
     std::string name;
     std::int64_t size = 0;
     std::int64_t changed = 0; // nanoseconds since 1970
+    bool isLink = false;
 };
 
 struct ListedFolder
@@ -20,6 +21,7 @@ struct ListedFolder
     // Device and number: the same folder under another name, as a link makes it, is the same here.
     std::uint64_t device = 0;
     std::uint64_t number = 0;
+    bool isLink = false;
 };
 
 struct FolderListing

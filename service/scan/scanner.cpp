@@ -10,20 +10,13 @@
 
 namespace {
 
+using Clock = std::chrono::steady_clock;
+
 constexpr std::chrono::seconds lookPause{1}; // between looks whether users have changed
 
-void scanUser(Database &database, const UserRecord &user, const std::atomic<bool> &stop)
+void logScan(const std::string &folder, const UserScan::Totals &totals, Clock::time_point start)
 {
-    const auto start = std::chrono::steady_clock::now();
-    UserScan scan(database, user, stop);
-    const std::string folder = validUtf8(user.photos);
-    if (!scan.run()) {
-        spdlog::warn("{} cannot be read or is empty; {}'s photos stay as they were", folder,
-                     user.mail);
-        return;
-    }
-    const std::chrono::duration<double> took = std::chrono::steady_clock::now() - start;
-    const UserScan::Totals &totals = scan.totals();
+    const std::chrono::duration<double> took = Clock::now() - start;
     spdlog::info("scanned {}: {} folders, {} photos, {} read, {} unreadable, {} gone, {:.1f} s",
                  folder, totals.folders, totals.files, totals.read, totals.unreadable, totals.gone,
                  took.count());
@@ -34,6 +27,7 @@ void scanUser(Database &database, const UserRecord &user, const std::atomic<bool
 Scanner::Scanner(Database &database, std::chrono::seconds pause)
     : mDatabase(database)
     , mPause(pause)
+    , mWatch([this] { requestScan(); })
 {
 }
 
@@ -103,14 +97,31 @@ void Scanner::scanAll()
             mUsersRevision = usersRevision(reader);
             users = allUsers(reader);
         }
+        bool isNewlyWatched = false;
         for (const UserRecord &user : users) {
             if (!user.photos.empty() && !mStop)
-                scanUser(mDatabase, user, mStop);
+                isNewlyWatched |= scanUser(user);
         }
         applyImports(mDatabase);
+        if (isNewlyWatched)
+            requestScan(); // for what has changed between the look and the watch
     } catch (const SQLite::Exception &exception) {
         spdlog::error("the scan was cut short: {}", exception.what());
     }
+}
+
+// True when folders are watched that were not before.
+bool Scanner::scanUser(const UserRecord &user)
+{
+    const Clock::time_point start = Clock::now();
+    UserScan scan(mDatabase, user, mStop);
+    const std::string folder = validUtf8(user.photos);
+    if (scan.run())
+        logScan(folder, scan.totals(), start);
+    else
+        spdlog::warn("{} cannot be read or is empty; {}'s photos stay as they were", folder,
+                     user.mail);
+    return mWatch.add(scan.walkedFolders());
 }
 
 bool Scanner::haveUsersChanged()

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "scan/folderwatch.h"
+
 #include <atomic>
 #include <chrono>
 #include <condition_variable>
@@ -8,9 +10,11 @@
 #include <thread>
 
 class Database;
+struct UserRecord;
 
 // Keeps the index true to the users' folders: on a thread of its own it walks them all at the
-// start, then from time to time, when somebody asks and when users come or change.
+// start, then from time to time, when somebody asks, when users come or change and when something
+// in the folders changes.
 class Scanner
 {
 public:
@@ -29,6 +33,7 @@ public:
 private:
     void run();
     void scanAll();
+    bool scanUser(const UserRecord &user);
     bool haveUsersChanged();
     void waitUntilDue();
 
@@ -40,5 +45,6 @@ private:
     std::uint64_t mRequested = 1; // walks asked for, the first by the start
     std::uint64_t mDone = 0;      // the last request that a finished walk has served
     std::int64_t mUsersRevision = -1;
+    FolderWatch mWatch;
     std::thread mThread;
 };

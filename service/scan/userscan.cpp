@@ -71,10 +71,11 @@ void UserScan::walk(const Place &place, const FolderListing &listing)
 // Links may lead in circles: each folder is entered once.
 void UserScan::enter(const Place &parent, const ListedFolder &folder)
 {
-    if (!mEntered.emplace(folder.device, folder.number).second)
-        return;
     const std::string path =
         parent.folder.empty() ? folder.name : parent.folder + "/" + folder.name;
+    if (isForeignLink(folder.isLink, path) ||
+        !mEntered.emplace(folder.device, folder.number).second)
+        return;
     const auto listing = listFolder(pathOf(path));
     if (listing) {
         walk({path, parent.isPrivate || listing->isMarkedPrivate}, *listing);
@@ -99,6 +100,8 @@ void UserScan::compare(const Place &place, const FolderListing &listing)
     for (const ListedFile &file : listing.files) {
         if (mStop)
             return;
+        if (isForeignLink(file.isLink, place.folder + "/" + file.name))
+            continue;
         const auto entry = known.find(file.name);
         compareFile(changes, place.folder, file, entry == known.end() ? nullptr : &entry->second);
         if (entry != known.end())
@@ -169,6 +172,20 @@ FolderState UserScan::stateOf(const Place &place) const
 std::string UserScan::pathOf(const std::string &folder) const
 {
     return folder.empty() ? mUser.photos : mUser.photos + "/" + folder;
+}
+
+std::set<std::string> UserScan::walkedFolders() const
+{
+    std::set<std::string> folders;
+    for (const std::string &folder : mSeenFolders)
+        folders.insert(pathOf(folder));
+    return folders;
+}
+
+// What is shown lies in the user's folder, whatever links say.
+bool UserScan::isForeignLink(bool isLink, const std::string &path) const
+{
+    return isLink && !liesWithin(mUser.photos, pathOf(path));
 }
 
 void UserScan::add(FolderChanges changes, bool isChanged)

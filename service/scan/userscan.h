@@ -31,6 +31,8 @@ public:
     // disk is likely to be away, so everything stays as it was.
     bool run();
     const Totals &totals() const { return mTotals; }
+    // With their whole paths.
+    std::set<std::string> walkedFolders() const;
 
 private:
     struct Place
@@ -50,6 +52,7 @@ private:
     bool isBelowUnreadable(const std::string &folder) const;
     FolderState stateOf(const Place &place) const;
     std::string pathOf(const std::string &folder) const;
+    bool isForeignLink(bool isLink, const std::string &path) const;
     void add(FolderChanges changes, bool isChanged);
     void write();
 

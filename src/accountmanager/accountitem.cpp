@@ -1,5 +1,8 @@
 #include "accountmanager/accountitem.h"
 
+#include "accountmanager/pagebutton.h"
+#include "base/i18n.h"
+
 #include <QMouseEvent>
 #include <QPainter>
 #include <QStyle>
@@ -12,6 +15,8 @@ constexpr int kDisc = 46;
 constexpr int kPadding = 14;
 constexpr int kNameHeight = 24; // pixels of the font
 constexpr int kMailHeight = 20;
+constexpr int kDeleteWidth = 110;
+constexpr int kDeleteHeight = 46;
 constexpr int kLongest = 1000; // characters that are measured at most
 
 QFont fontOf(const QWidget *widget, int height)
@@ -35,10 +40,28 @@ AccountItem::AccountItem(const QString &mail, const QString &name, QWidget *pare
     : QWidget(parent)
     , mMail(mail)
     , mName(name)
+    , mDelete(new PageButton(I18n::button(10), this))
 {
     setFocusPolicy(Qt::StrongFocus);
     setFixedHeight(rowHeight);
     setAccessibleName(mail);
+    connect(mDelete, &QAbstractButton::clicked, this, &AccountItem::clickedDelBut);
+}
+
+void AccountItem::focusDelete()
+{
+    mDelete->setFocus();
+}
+
+bool AccountItem::hasDeleteFocus() const
+{
+    return mDelete->hasFocus();
+}
+
+void AccountItem::resizeEvent(QResizeEvent *)
+{
+    mDelete->setGeometry(width() - kPadding - kDeleteWidth, (height() - kDeleteHeight) / 2,
+                         kDeleteWidth, kDeleteHeight);
 }
 
 QSize AccountItem::sizeHint() const
@@ -90,7 +113,7 @@ void AccountItem::paintDisc(QPainter *painter) const
 void AccountItem::paintTexts(QPainter *painter) const
 {
     const int left = 2 * kPadding + kDisc;
-    const QRect row(left, 0, width() - left - kPadding, height());
+    const QRect row(left, 0, mDelete->x() - left - kPadding, height());
     const QString mail = mMail.left(kLongest);
     painter->setPen(Qt::white);
     if (mName.trimmed().isEmpty()) {

@@ -4,9 +4,11 @@
 #include <QString>
 #include <QWidget>
 
+class QAbstractButton;
+
 // One stored account in the list: its initial in a coloured disc, the display name and the e-mail
-// address, each cut with an ellipsis where the row ends. It takes the focus and leaves every key to
-// the page.
+// address, each cut with an ellipsis where the row's button Delete begins. Row and button take the
+// focus and leave every key to the page.
 class AccountItem : public QWidget
 {
     Q_OBJECT
@@ -23,14 +25,19 @@ public:
     // The same colour for an account at every start; white text on it is readable.
     static QColor colourOf(const QString &mail);
 
+    void focusDelete();
+    bool hasDeleteFocus() const;
+
     QSize sizeHint() const override;
 
 signals:
     void selectItem();
+    void clickedDelBut();
 
 protected:
     void paintEvent(QPaintEvent *event) override;
     void mouseReleaseEvent(QMouseEvent *event) override;
+    void resizeEvent(QResizeEvent *event) override;
 
 private:
     void paintDisc(QPainter *painter) const;
@@ -38,4 +45,5 @@ private:
 
     QString mMail;
     QString mName;
+    QAbstractButton *mDelete;
 };

@@ -89,7 +89,9 @@ QWidget *AccountManager::makeTitle()
     auto *text = new QLabel(title);
     text->setTextFormat(Qt::PlainText);
     text->setText(I18n::login(0));
-    text->setStyleSheet(QStringLiteral("color: white; font-size: 32px;"));
+    QFont font = text->font();
+    font.setPixelSize(32);
+    text->setFont(font);
 
     auto *row = new QHBoxLayout(title);
     row->setContentsMargins(0, 0, 0, 0);

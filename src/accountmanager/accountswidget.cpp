@@ -41,7 +41,7 @@ void AccountsWidget::setAccounts(const QVector<Account> &accounts)
     const QString current = currentAccount();
     qDeleteAll(mItems);
     mItems.clear();
-    mCurrent = 0;
+    mCurrent = qBound(0, mCurrent, std::max(0, accounts.size() - 1));
     for (const Account &account : accounts) {
         if (account.mail == current)
             mCurrent = mItems.size();
@@ -57,6 +57,10 @@ void AccountsWidget::addRow(const Account &account)
     connect(item, &AccountItem::selectItem, this, [this, row] {
         mCurrent = row;
         emit selectItem();
+    });
+    connect(item, &AccountItem::clickedDelBut, this, [this, row] {
+        mCurrent = row;
+        emit clickedDelBut();
     });
     mRows->insertWidget(row, item);
     item->show(); // at once: a hidden row takes no focus
@@ -82,12 +86,21 @@ void AccountsWidget::focusCurrent()
     ensureWidgetVisible(mItems.at(mCurrent), 0, 0);
 }
 
+void AccountsWidget::focusDelete()
+{
+    if (!mItems.isEmpty())
+        mItems.at(mCurrent)->focusDelete();
+}
+
 void AccountsWidget::moveFocus(int rows)
 {
     if (mItems.isEmpty())
         return;
+    const bool isOnDelete = hasDeleteFocus();
     mCurrent = qBound(0, mCurrent + rows, mItems.size() - 1);
     focusCurrent();
+    if (isOnDelete)
+        focusDelete();
 }
 
 void AccountsWidget::movePage(int pages)
@@ -98,6 +111,11 @@ void AccountsWidget::movePage(int pages)
 bool AccountsWidget::hasRowFocus() const
 {
     return !mItems.isEmpty() && mItems.at(mCurrent)->hasFocus();
+}
+
+bool AccountsWidget::hasDeleteFocus() const
+{
+    return !mItems.isEmpty() && mItems.at(mCurrent)->hasDeleteFocus();
 }
 
 void AccountsWidget::keyPressEvent(QKeyEvent *event)

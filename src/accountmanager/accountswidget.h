@@ -23,7 +23,7 @@ public:
     explicit AccountsWidget(QWidget *parent = nullptr);
 
     // Replaces the rows; the current account stays the current one if it is still there, else the
-    // first becomes it.
+    // one that has taken its place becomes it.
     void setAccounts(const QVector<Account> &accounts);
     bool contains(const QString &mail) const;
     int count() const { return mItems.size(); }
@@ -31,16 +31,20 @@ public:
     // The row that has the focus or had it last; an empty address when there is none.
     QString currentAccount() const;
     void focusCurrent();
-    // Moves the focus by so many rows, as far as there are rows.
+    void focusDelete(); // the current row's button
+    // Moves the focus by so many rows, as far as there are rows, on the buttons from one to
+    // another.
     void moveFocus(int rows);
     void movePage(int pages);
     bool hasRowFocus() const;
+    bool hasDeleteFocus() const;
 
     QSize sizeHint() const override;
 
 signals:
-    // The current row was chosen with the pointer.
+    // The current row, or its button, was chosen with the pointer.
     void selectItem();
+    void clickedDelBut();
 
 protected:
     void keyPressEvent(QKeyEvent *event) override;

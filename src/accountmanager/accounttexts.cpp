@@ -13,7 +13,6 @@ const QVector<const char *> mAccountString = {
     "The sign-in went well, but this device could not store the account. Press \"Return\" to go "
     "back, and try again later.",
     "This account could not be deleted. Please try again later.",
-    "Please enter your login ID first.",
 };
 
 } // namespace

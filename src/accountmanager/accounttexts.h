@@ -14,7 +14,6 @@ public:
         SignInUnavailable = 4,
         NotStored = 5,
         NotDeleted = 6,
-        NoLoginId = 7,
     };
 
     // The text, or "Unknown" for an index that has none.

@@ -3,14 +3,15 @@
 #include "accountmanager/accountmanagerhelper.h"
 #include "accountmanager/accountswidget.h"
 #include "accountmanager/accounttexts.h"
+#include "accountmanager/pagebutton.h"
 #include "base/i18n.h"
 #include "base/log.h"
+#include "common/ui/qconfirm.h"
 #include "common/ui/remotekeys.h"
 
 #include <QHBoxLayout>
 #include <QKeyEvent>
 #include <QLabel>
-#include <QPushButton>
 #include <QVBoxLayout>
 
 namespace {
@@ -30,17 +31,6 @@ const QString kStyle = QStringLiteral(
     "QScrollBar:vertical {width: 10px; background: #1c2730; border-radius: 5px;}"
     "QScrollBar::handle:vertical {min-height: 40px; background: #c9d5dd; border-radius: 5px;}"
     "QScrollBar::add-line, QScrollBar::sub-line {height: 0px;}");
-
-// A button that leaves every key to the page.
-class PageButton : public QPushButton
-{
-public:
-    using QPushButton::QPushButton;
-
-protected:
-    void keyPressEvent(QKeyEvent *event) override { event->ignore(); }
-    void keyReleaseEvent(QKeyEvent *event) override { event->ignore(); }
-};
 
 QLabel *makeLabel(QWidget *parent, const char *name, const QString &text)
 {
@@ -78,9 +68,9 @@ LoginPage::LoginPage(QWidget *parent)
     , mHint(makeLabel(this, "hint", AccountTexts::text(AccountTexts::NoAccounts)))
     , mMessage(makeLabel(this, "message", QString()))
 {
-    setStyleSheet(kStyle);
     buildLayout();
     connect(mAccounts, &AccountsWidget::selectItem, this, &LoginPage::handleSelectIndex);
+    connect(mAccounts, &AccountsWidget::clickedDelBut, this, &LoginPage::popupConfirmDialog);
     reload();
 }
 
@@ -120,6 +110,7 @@ QAbstractButton *LoginPage::makeButton(QVBoxLayout *column, const QString &text)
 
 void LoginPage::reload()
 {
+    QWidget *button = focusWidget(); // where the user comes back to
     QVector<AccountsWidget::Account> accounts;
     const bool readable = readAccounts(&accounts);
     if (readable)
@@ -129,7 +120,10 @@ void LoginPage::reload()
     mHint->setVisible(empty);
     mHint->setText(
         AccountTexts::text(readable ? AccountTexts::NoAccounts : AccountTexts::AccountsUnreadable));
-    restoreFocus();
+    if (button && (button == mNewButton || button == mExitButton))
+        button->setFocus();
+    else
+        restoreFocus();
 }
 
 void LoginPage::restoreFocus()
@@ -153,6 +147,9 @@ void LoginPage::showMessage(const QString &text)
 void LoginPage::showEvent(QShowEvent *event)
 {
     QWidget::showEvent(event);
+    // Not before: a style sheet that sets a text size keeps the family that was the program's then.
+    if (styleSheet().isEmpty())
+        setStyleSheet(kStyle);
     // Where it was before, also when another page or window has it at the moment.
     if (QWidget *last = focusWidget())
         last->setFocus();
@@ -174,11 +171,16 @@ void LoginPage::keyPressEvent(QKeyEvent *event)
         break;
     case DEVICE_LEFT_KEY:
         logLine("enter DEVICE_LEFT_KEY");
-        mAccounts->focusCurrent();
+        if (mAccounts->hasDeleteFocus())
+            mAccounts->focusCurrent();
+        else if (!mAccounts->hasRowFocus())
+            mAccounts->focusDelete();
         break;
     case DEVICE_RIGHT_KEY:
         logLine("enter DEVICE_RIGHT_KEY");
         if (mAccounts->hasRowFocus())
+            mAccounts->focusDelete();
+        else if (mAccounts->hasDeleteFocus())
             mNewButton->setFocus();
         break;
     case DEVICE_PAGEUP_KEY:
@@ -196,7 +198,7 @@ void LoginPage::keyPressEvent(QKeyEvent *event)
 
 void LoginPage::handleUpOrDown(int rows)
 {
-    if (mAccounts->hasRowFocus())
+    if (mAccounts->hasRowFocus() || mAccounts->hasDeleteFocus())
         mAccounts->moveFocus(rows);
     else
         (rows < 0 ? mNewButton : mExitButton)->setFocus();
@@ -208,6 +210,8 @@ void LoginPage::handleSelect()
         startOauth();
     else if (mExitButton->hasFocus())
         leave();
+    else if (mAccounts->hasDeleteFocus())
+        popupConfirmDialog();
     else
         handleSelectIndex();
 }
@@ -243,4 +247,51 @@ void LoginPage::handleSelectIndex()
     reload();
     showMessage(AccountTexts::text(hasAccount(mail) ? AccountTexts::SignInFailed
                                                     : AccountTexts::AccountGone));
+}
+
+void LoginPage::popupConfirmDialog()
+{
+    if (mConfirm || mAccounts->currentAccount().isEmpty())
+        return;
+    mConfirm = new QConfirm(parentWidget() ? parentWidget() : this);
+    mConfirm->init(QConfirm::DeleteAccount);
+    mConfirm->installEventFilter(this);
+    connect(mConfirm, &QConfirm::clickConfirm, this, &LoginPage::handleDeleteAccount);
+    connect(mConfirm, &QConfirm::clickCancel, this, &LoginPage::handleDelCancel);
+    mConfirm->show();
+}
+
+// The question itself knows no Return, which leads back everywhere.
+bool LoginPage::eventFilter(QObject *watched, QEvent *event)
+{
+    const bool isReturn = watched == mConfirm && event->type() == QEvent::KeyPress &&
+                          static_cast<QKeyEvent *>(event)->key() == DEVICE_RETURN_KEY;
+    if (isReturn)
+        handleDelCancel();
+    return isReturn || QWidget::eventFilter(watched, event);
+}
+
+void LoginPage::handleDelCancel()
+{
+    if (!mConfirm)
+        return;
+    mConfirm->hide(); // the focus goes back to where it was
+    mConfirm->deleteLater();
+    mConfirm.clear();
+}
+
+void LoginPage::handleDeleteAccount()
+{
+    handleDelCancel();
+    const QString mail = mAccounts->currentAccount();
+    if (mail.isEmpty())
+        return;
+    bool isDeleted = false;
+    {
+        const AccountManagerHelper::Session session;
+        isDeleted = AccountManagerHelper::removeAccount(mail);
+    }
+    reload();
+    if (!isDeleted)
+        showMessage(AccountTexts::text(AccountTexts::NotDeleted));
 }

@@ -1,14 +1,16 @@
 #pragma once
 
+#include <QPointer>
 #include <QWidget>
 
 class AccountsWidget;
 class QAbstractButton;
+class QConfirm;
 class QLabel;
 class QVBoxLayout;
 
 // The account list: the stored accounts, the one used last first, beside the buttons New and Exit.
-// Select on an account signs it in with its stored PIN.
+// Select on an account signs it in with its stored PIN; its button Delete asks first.
 class LoginPage : public QWidget
 {
     Q_OBJECT
@@ -30,6 +32,12 @@ signals:
 public slots:
     // Signs the current account in: loginSucessed(), or a message on the page.
     void handleSelectIndex();
+    // Asks whether the current account is to go, over the whole of the parent.
+    void popupConfirmDialog();
+    void handleDeleteAccount();
+    void handleDelCancel();
+
+    bool eventFilter(QObject *watched, QEvent *event) override;
 
 protected:
     void keyPressEvent(QKeyEvent *event) override;
@@ -50,4 +58,5 @@ private:
     QAbstractButton *mExitButton = nullptr;
     QLabel *mHint; // in place of the list when it is empty
     QLabel *mMessage;
+    QPointer<QConfirm> mConfirm;
 };

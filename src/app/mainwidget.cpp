@@ -12,6 +12,7 @@
 #include "oauth/oauthutil.h"
 #include "platform/devicestate.h"
 #include "platform/ipcthread.h"
+#include "ui/homewidget.h"
 #include "ui/widget.h"
 
 #include <QMessageBox>
@@ -134,14 +135,30 @@ void MainWidget::enterPersonalPage()
     logLine("MainWidget enterPersonalPage!!");
     if (!mAccountManager)
         return;
-    auto *tokens = new OAuthUtil(this);
+    mPersonalPage = new Widget;
+    auto *tokens = new OAuthUtil(mPersonalPage); // whose tokens end with it
     tokens->scheduleRefresh(AccountManagerHelper::getExpires() == 0);
-    auto *page = new Widget;
+    connect(mPersonalPage->homeScreen(), &HomeWidget::signedOut, this,
+            &MainWidget::returnToAccounts);
     mStackedWidget->removeWidget(mAccountManager);
     mAccountManager->deleteLater();
     mAccountManager = nullptr;
-    mStackedWidget->addWidget(page);
-    mStackedWidget->setCurrentWidget(page);
+    mStackedWidget->addWidget(mPersonalPage);
+    mStackedWidget->setCurrentWidget(mPersonalPage);
+}
+
+void MainWidget::returnToAccounts()
+{
+    if (mAccountManager || !mPersonalPage)
+        return;
+    mAccountManager = new AccountManager(this);
+    connectAccountManager();
+    mStackedWidget->addWidget(mAccountManager);
+    mStackedWidget->setCurrentWidget(mAccountManager);
+    mStackedWidget->removeWidget(mPersonalPage);
+    mPersonalPage->hide();
+    mPersonalPage->deleteLater();
+    mPersonalPage = nullptr;
 }
 
 void MainWidget::exitOrvala(bool isFromParent, bool isSystemError)

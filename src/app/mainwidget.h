@@ -9,8 +9,10 @@
 class AccountManager;
 class QPopupDialog;
 class QStackedWidget;
+class Widget;
 
-// The top-level window: a stack of pages, first the account manager, then the personal page. It
+// The top-level window: a stack of pages, first the account manager, then the personal page, and
+// the account manager again after signing out. It
 // also keeps the device's state that the screens read (devicestate.h): the network cable, about
 // which it tells the user in a dialog, the time zone and the clock.
 class MainWidget : public QWidget
@@ -31,8 +33,10 @@ signals:
 public slots:
     // Shows a page; the first time it joins the stack, which owns it from then on.
     void switchWidget(QWidget *w);
-    // Leaves the sign-in for good.
+    // Leaves the sign-in for the personal page, until the user signs out.
     void enterPersonalPage();
+    // Nobody is signed in any longer: ends the personal page and shows the accounts.
+    void returnToAccounts();
     // The platform's word: ends the event loop when it comes from the menu shell.
     void exitOrvala(bool isFromParent, bool isSystemError);
 
@@ -58,7 +62,8 @@ private:
     static MainWidget *mMainInstance; // null until built
 
     QStackedWidget *mStackedWidget = nullptr;
-    AccountManager *mAccountManager = nullptr;
+    AccountManager *mAccountManager = nullptr; // null while the personal page is shown
+    Widget *mPersonalPage = nullptr;
     QPointer<QPopupDialog> mStatusDialog;
     TimeRequest mTimeRequest;
 };

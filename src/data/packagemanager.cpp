@@ -10,6 +10,7 @@
 #include <malloc.h>
 
 PackageManager::RemovalHook PackageManager::mRemovalHook = nullptr;
+bool PackageManager::mIsSignInRefused = false;
 QHash<QString, Package *> PackageManager::mCachedPackageHash;
 QHash<QString, QPointer<Connection>> PackageManager::mDownlodingConnectionHash;
 QHash<QString, PackageProperty> PackageManager::mDownlodingPropertyHash;
@@ -171,6 +172,7 @@ void PackageManager::handleDownloadFinished(const QString &url)
     const ReplyBody body = ReplyBody::read(*request.connection, "PackageManager");
     release(request.connection);
 
+    mIsSignInRefused = false;
     ErrorCode code = body.code();
     if (code == NET_SUCCESS)
         code = storeFeed(property, body.bytes());
@@ -211,6 +213,7 @@ void PackageManager::handleDownloadError(const QString &url)
     if (!request.connection)
         return;
     const ErrorCode code = request.connection->errorCode();
+    mIsSignInRefused = request.connection->isSignInRefused();
     Connection::removeConnection(request.connection);
     if (request.property.mType == INVALID_LIST)
         return;

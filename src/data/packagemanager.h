@@ -29,6 +29,9 @@ public:
     static Package *getPackage(PackageProperty &property);
     // True when a request for this list is running afterwards; false calls nothing.
     static bool downloadPage(PackageProperty &property, Callback callback);
+    // Whether the page that failed last was refused because the sign-in has expired; for a
+    // call-back to ask.
+    static bool isSignInRefused() { return mIsSignInRefused; }
     static void prepareNextDatas(PackageProperty property, int startIndex);
 
     static void networkCallback(QString url, CallbackType type, int param);
@@ -66,6 +69,7 @@ private:
     static void discard(Package *package);
 
     static RemovalHook mRemovalHook;
+    static bool mIsSignInRefused;
     static QHash<QString, Package *> mCachedPackageHash;
     static QHash<QString, QPointer<Connection>> mDownlodingConnectionHash;
     static QHash<QString, PackageProperty> mDownlodingPropertyHash;

@@ -20,7 +20,8 @@ int PhotoManager::mClearCount = 0;
 namespace {
 
 const qint64 maximumPictureBytes = 64 * 1024 * 1024;
-const int mappedBlockBytes = 256 * 1024;
+// Above thumbnails, which come and go by the page and would cost most of their time in new memory.
+const int mappedBlockBytes = 640 * 1024;
 
 int clampedToInt(qint64 value)
 {
@@ -45,7 +46,7 @@ void release(Connection *connection)
 void PhotoManager::init()
 {
     mPhotoCache.setMaxCost(clampedToInt(SystemConfig::imageCacheSize()));
-    // Pictures get memory of their own from the system, which has it back as soon as the cache
+    // Photos get memory of their own from the system, which has it back as soon as the cache
     // drops them. Left to itself the allocator would soon keep them in a heap full of holes.
     mallopt(M_MMAP_THRESHOLD, mappedBlockBytes);
 }
@@ -146,6 +147,8 @@ ErrorCode PhotoManager::takePicture(const QString &url, QPointer<Connection> &co
     QPixmap *picture = createPhoto(bytes.constData(), bytes.size());
     if (!picture)
         return NET_REJECTED;
+    // As labels want it; set when it is shown, it would cost a copy each time.
+    picture->setDevicePixelRatio(SystemConfig::scale());
     const int cost = costOf(*picture);
     if (!mPhotoCache.insert(url, picture, cost))
         logLine("failed to cache photo:", url, "; result :", "false", "; size = ", cost);

@@ -28,8 +28,8 @@ public:
     // The call-back no longer waits for the URL; a download for which nobody waits is ended, and
     // the next queued one begins.
     static void withdraw(const QString &url, Callback callback);
-    // The cached picture or null. The cache may delete it with the next picture that arrives: never
-    // keep the pointer over the event loop.
+    // The cached picture, with the device pixel ratio of the interface's scale, or null. The cache
+    // may delete it with the next picture that arrives: never keep the pointer over the event loop.
     static QPixmap *getPhoto(const QString &url);
 
     static void networkCallback(QString url, CallbackType type, int param);

@@ -222,6 +222,7 @@ void Connection::handleError(QNetworkReply::NetworkError code)
 void Connection::fail(QNetworkReply::NetworkError code, const QString &text)
 {
     mErrorCode = asynchronousErrorCode(code);
+    mIsSignInRefused = code == QNetworkReply::AuthenticationRequiredError;
     logLine("Network connection has an error occur:", text, "code=", int(code));
     if (code == QNetworkReply::UnknownContentError) {
         logLine("Connection::handleError ignor : QNetworkReply::UnknownContentError");

@@ -68,6 +68,10 @@ public:
     // Code of the last request, for the owner to ask after its end.
     ErrorCode errorCode() const { return mErrorCode; }
 
+    // Whether the last GET failed because the server wants another sign-in (status 401), which has
+    // no code of its own.
+    bool isSignInRefused() const { return mIsSignInRefused; }
+
     // Synchronous requests: block until the answer is complete, the time-out expires or the program
     // exits (NET_CANCELED).
     ErrorCode post(const QString &url, const char *data, qint64 length);
@@ -132,4 +136,5 @@ private:
     QTimer mNextHop;
     bool mIsTooLarge = false; // the current reply was aborted for its size
     bool mIsRemoved = false;
+    bool mIsSignInRefused = false;
 };

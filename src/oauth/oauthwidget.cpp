@@ -101,13 +101,13 @@ QWidget *OAuthWidget::makeBottomBar()
     auto *bar = new QWidget(this);
     mBusy = new QProgressIndicator(bar);
     mBusy->setFixedSize(kBusySize, kBusySize);
-    auto *hints = new ShortcutBar(bar);
-    hints->addEntry(DEVICE_SELECT_KEY, I18n::shortCut(6));
-    hints->addEntry(DEVICE_RETURN_KEY, I18n::shortCut(2));
+    mHints = new ShortcutBar(bar);
+    mHints->addEntry(DEVICE_SELECT_KEY, I18n::shortCut(6));
+    mHints->addEntry(DEVICE_RETURN_KEY, I18n::shortCut(2));
     auto *row = new QHBoxLayout(bar);
     row->setContentsMargins(0, 0, 0, 0);
     row->addWidget(mBusy);
-    row->addWidget(hints, 1);
+    row->addWidget(mHints, 1);
     return bar;
 }
 
@@ -148,8 +148,7 @@ void OAuthWidget::startLoading()
     closeInputDialog();
     mBusy->stopAnimation();
     mRing->startAnimation();
-    mStack->setCurrentWidget(mLoadingPage);
-    takeFocus();
+    showPage(mLoadingPage);
     mStallTimer.stop();
     mUtil->startLoadingTimer(loadingMilliseconds());
 }
@@ -190,8 +189,14 @@ void OAuthWidget::showWebView()
 {
     stopTimers();
     stopAnimation();
-    mStack->setCurrentWidget(mPage->widget());
     mPage->widget()->show(); // it has been closed if this is the second time
+    showPage(mPage->widget());
+}
+
+void OAuthWidget::showPage(QWidget *page)
+{
+    mStack->setCurrentWidget(page);
+    mHints->setShown(DEVICE_SELECT_KEY, page == mPage->widget());
     takeFocus();
 }
 
@@ -257,8 +262,7 @@ void OAuthWidget::showMessage(const QString &text)
     stopTimers();
     stopAnimation();
     mMessage->setText(text);
-    mStack->setCurrentWidget(mMessage);
-    takeFocus();
+    showPage(mMessage);
 }
 
 void OAuthWidget::handleLoadingTimeout()

@@ -69,6 +69,7 @@ private:
     void stopTimers();
     void handleLoadStarted();
     void handleLoadFinished(bool finished);
+    void showPage(QWidget *page);
     void takeFocus();
 
     std::unique_ptr<SignInView> mPage;
@@ -78,6 +79,7 @@ private:
     QWidget *mLoadingPage = nullptr;
     QProgressIndicator *mRing = nullptr;
     QProgressIndicator *mBusy = nullptr; // beside a page that loads the next one
+    ShortcutBar *mHints = nullptr;
     QLabel *mMessage = nullptr;
     QPointer<QPopUpForm> mInputForm;
     // Any title stops the sign-in's own timer, also that of a page of which the rest never comes.

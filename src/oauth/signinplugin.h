@@ -6,8 +6,8 @@
 
 class SignInView;
 
-// Loads the web view's plug-in when it is first needed; it stays loaded. That takes some hundred
-// milliseconds, in which nothing else happens.
+// Loads the web view's plug-in when it is first needed; it stays loaded. The first time blocks
+// until the browser is in memory.
 class SignInPlugin
 {
 public:

@@ -16,6 +16,9 @@ namespace {
 constexpr int kMargin = 16;
 constexpr int kPicture = 20; // side of the small pictures
 constexpr int kIndent = 30;  // of a text beside one
+constexpr int kMostComments = 10;
+constexpr int kLinesOfEach = 4; // of a comment among others
+constexpr int kLinesOfOne = 12;
 
 const QColor kBright(0xf2, 0xf6, 0xf9);
 const QColor kPlain(0xe6, 0xed, 0xf2);
@@ -120,12 +123,13 @@ void DetailInformation::addComments(const DetailNotes &notes)
         state = DetailTexts::text(DetailTexts::PhotoGone);
     }
     mParts << Part{state, 18, false, kQuiet, 2, 4, QString()};
-    for (const DetailComment &comment : notes.comments().mid(0, 10))
-        addComment(comment);
+    const QVector<DetailComment> newest = notes.comments().mid(0, kMostComments);
+    for (const DetailComment &comment : newest)
+        addComment(comment, newest.size() == 1 ? kLinesOfOne : kLinesOfEach);
 }
 
 // The name comes last, so that one from another script does not turn the line around.
-void DetailInformation::addComment(const DetailComment &comment)
+void DetailInformation::addComment(const DetailComment &comment, int mostLines)
 {
     QStringList heading;
     if (comment.created.isValid())
@@ -133,7 +137,7 @@ void DetailInformation::addComment(const DetailComment &comment)
     if (!comment.author.isEmpty())
         heading << comment.author;
     mParts << Part{heading.join(QStringLiteral(", ")), 16, false, kQuiet, 1, 10, QString()};
-    mParts << Part{comment.text, 18, false, kPlain, 4, 0, QString()};
+    mParts << Part{comment.text, 18, false, kPlain, mostLines, 0, QString()};
 }
 
 // From the top down, until the room is used up.

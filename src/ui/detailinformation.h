@@ -52,7 +52,7 @@ private:
     void addFacts(const DetailPhoto &photo, const QString &position);
     void addTags(const DetailNotes &notes);
     void addComments(const DetailNotes &notes);
-    void addComment(const DetailComment &comment);
+    void addComment(const DetailComment &comment, int mostLines);
     void layOut();
 
     QVector<Part> mParts;

@@ -9,7 +9,8 @@
 
 namespace {
 
-constexpr int kFrame = 4;            // room for the mark around the photo
+constexpr int kFrame = 4; // room for the mark around the photo
+constexpr int kMark = 3;
 constexpr int kIndicatorDelay = 600; // milliseconds
 constexpr int kMessageHeight = 20;   // pixels of the font
 constexpr QSize kArrow(48, 96);
@@ -20,6 +21,13 @@ bool areAlike(const QSize &a, const QSize &b)
     const qreal ratio =
         qreal(a.width()) * b.height() / qMax(qreal(1), qreal(a.height()) * b.width());
     return ratio > 0.95 && ratio < 1.05;
+}
+
+// The nearest place at which a picture's pixels fall on the screen's.
+QPointF onPixels(const QPainter &painter, const QPointF &point)
+{
+    const QTransform toDevice = painter.deviceTransform();
+    return toDevice.inverted().map(QPointF(toDevice.map(point).toPoint()));
 }
 
 } // namespace
@@ -115,8 +123,6 @@ QRect DetailStage::pictureArea() const
     if (mIsPreview) {
         const bool useRecord = !mPhotoSize.isEmpty() && areAlike(mPhotoSize, mPicture.size());
         shown = (useRecord ? mPhotoSize : mPicture.size()).scaled(room, Qt::KeepAspectRatio);
-    } else if (shown.width() > room.width() || shown.height() > room.height()) {
-        shown.scale(room, Qt::KeepAspectRatio);
     }
     shown = shown.expandedTo(QSize(1, 1));
     return {QPoint((width() - shown.width()) / 2, (height() - shown.height()) / 2), shown};
@@ -127,12 +133,13 @@ void DetailStage::paintEvent(QPaintEvent *)
     QPainter painter(this);
     if (!mPicture.isNull()) {
         const QRect area = pictureArea();
-        painter.setRenderHint(QPainter::SmoothPixmapTransform);
-        painter.drawPixmap(area, mPicture);
-        if (mMarked) {
-            painter.setPen(QPen(QColor(0xf2, 0xf6, 0xf9), 3));
-            painter.setBrush(Qt::NoBrush);
-            painter.drawRect(area.adjusted(-2, -2, 1, 1));
+        if (mMarked)
+            painter.fillRect(area.adjusted(-kMark, -kMark, kMark, kMark), QColor(0xf2, 0xf6, 0xf9));
+        if (mIsPreview) {
+            painter.setRenderHint(QPainter::SmoothPixmapTransform);
+            painter.drawPixmap(area, mPicture);
+        } else {
+            painter.drawPixmap(onPixels(painter, area.topLeft()), mPicture);
         }
     }
     if (mMarked)

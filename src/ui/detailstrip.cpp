@@ -74,7 +74,7 @@ QSize DetailStrip::sizeHint() const
     return {7 * (kCell.width() + kGap) - kGap, kCell.height() + 2 * kMark};
 }
 
-void DetailStrip::show(const QVector<Neighbour> &neighbours)
+void DetailStrip::showNeighbours(const QVector<Neighbour> &neighbours)
 {
     QHash<QString, QPixmap> known;
     for (const auto &cell : mCells)

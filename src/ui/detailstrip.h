@@ -27,7 +27,7 @@ public:
 
     int places() const; // as many as the strip is wide for
     // Shows these photos and asks for the pictures that are not there yet.
-    void show(const QVector<Neighbour> &neighbours);
+    void showNeighbours(const QVector<Neighbour> &neighbours);
     // No picture is waited for any longer.
     void cancel();
     int pictureCount() const; // of the places that have their picture

@@ -1,7 +1,9 @@
 #pragma once
 
+#include "ui/homepages.h"
 #include "ui/homestate.h"
 
+#include <QPair>
 #include <QWidget>
 
 class InformationLine;
@@ -20,7 +22,12 @@ public:
     void setInformation(const QString &title, const QString &position);
     QString information() const; // the line as rich text
 
-    void showKeys(const QList<int> &keys);
+    // Keys, and what each does now.
+    using Hints = QList<QPair<int, QString>>;
+    void showHints(const Hints &hints);
+    // The keys that lead somewhere on a page of the home screen.
+    static Hints usefulKeys(const HomeState &state, HomePages::Page page, const Package *package,
+                            bool canPlay);
     bool isKeyShown(int key) const;
 
 private:

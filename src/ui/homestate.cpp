@@ -1,6 +1,7 @@
 #include "ui/homestate.h"
 
 #include "base/log.h"
+#include "ui/detailpaging.h"
 #include "ui/paging.h"
 
 namespace {
@@ -26,6 +27,8 @@ bool HomeState::enterMenu(const PackageProperty &property)
     mCurrentProperty = property;
     mInitIndex = -1;
     mInitStart = 1;
+    mIsSearchShown = false;
+    mBlock = 0;
     mIsFromFavorites = property.mType == TYPE_FAVORITE_PEOPLE;
     if (mIsFromFavorites) {
         mSelectedPersonIndex = 0;
@@ -64,8 +67,7 @@ HomeState::Back HomeState::back() const
         return Back::Albums;
     if (type == TYPE_ALBUM_LIST && mIsFromFavorites)
         return Back::People;
-    const bool isSearch = type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
-    return isSearch && mIsSearchShown ? Back::SearchBar : Back::SignOut;
+    return isSearch() && mIsSearchShown ? Back::SearchBar : Back::SignOut;
 }
 
 void HomeState::backToAlbums()
@@ -85,8 +87,51 @@ void HomeState::backToPeople()
     mInitStart = mSelectedPersonStart;
 }
 
+void HomeState::startSearch(const QString &text)
+{
+    mCurrentProperty = PackageProperty();
+    mCurrentProperty.mType = TYPE_SEARCH_PHOTOS;
+    mCurrentProperty.mSearchedStr = text;
+    mIsSearchShown = true;
+    mBlock = 0;
+    mInitStart = 1;
+}
+
+void HomeState::backToSearchBar()
+{
+    mCurrentProperty.mType = TYPE_SEARCH_PHOTOS;
+    mCurrentProperty.mStartIndex = 1;
+    mIsSearchShown = false;
+    mBlock = 0;
+}
+
+bool HomeState::changeBlock(bool next)
+{
+    const int block = paging::neighbourBlock(mBlock, next, mTotalPhotoNum);
+    if (!isSearch() || block == mBlock)
+        return false;
+    mBlock = block;
+    mCurrentProperty.mType = TYPE_SEARCH_MORE_PHOTOS;
+    mCurrentProperty.mStartIndex = paging::blockStart(block);
+    mInitStart = 1;
+    return true;
+}
+
+void HomeState::followTo(int number)
+{
+    mCurrentProperty.mStartIndex = detailpaging::pageStart(mCurrentProperty.mType, number);
+    if (!isSearch())
+        return;
+    mBlock = (number - 1) / paging::blockSize;
+    if (mBlock > 0)
+        mCurrentProperty.mType = TYPE_SEARCH_MORE_PHOTOS;
+}
+
 bool HomeState::pageUp(int arg)
 {
+    const bool startsBlock = isSearch() && mCurrentProperty.mStartIndex % paging::blockSize == 1;
+    if (startsBlock && arg == paging::onePage)
+        return false;
     const paging::Page page = paging::pageUp(mCurrentProperty.mStartIndex, arg);
     if (!page.exists)
         return false;
@@ -98,12 +143,29 @@ bool HomeState::pageUp(int arg)
 
 bool HomeState::pageDown(int arg, const Package *package)
 {
+    if (isSearch() && arg == paging::onePage && package &&
+        recordIndex(paging::pageSize) >= package->count())
+        return false; // the next page is the next block's
     const paging::Page page = paging::pageDown(mCurrentProperty.mStartIndex, total(package), arg);
     if (!page.exists)
         return false;
     mIsPageDown = true;
     mIndexInPage = page.indexInPage;
     mCurrentProperty.mStartIndex = page.startIndex;
+    return true;
+}
+
+bool HomeState::canRestart() const
+{
+    return mCurrentProperty.mStartIndex > 1 && mInitStart == 1;
+}
+
+bool HomeState::turnToMissingPage(const Package &package)
+{
+    if (mCurrentProperty.mType != TYPE_FEATURED_PHOTOS || mInitStart <= package.count() ||
+        package.count() < mCurrentProperty.mStartIndex || package.count() >= package.mTotalCount)
+        return false;
+    mCurrentProperty.mStartIndex = package.count() + 1;
     return true;
 }
 
@@ -122,9 +184,10 @@ void HomeState::selectRecord(int number)
 
 void HomeState::packageArrived(const Package &package)
 {
-    if (hasFeedTotal(mCurrentProperty.mType))
+    const int type = mCurrentProperty.mType;
+    if (hasFeedTotal(type))
         mTotalPhotoNum = package.mTotalCount;
-    else if (mInitStart > 1 && mInitStart <= package.count())
+    if (mInitStart > 1 && paging::recordIndex(type, mInitStart, 0) < package.count())
         mCurrentProperty.mStartIndex = mInitStart;
     mInitStart = 1;
 }
@@ -140,15 +203,24 @@ void HomeState::moveTo(int cell, const Package *package)
 
 void HomeState::restart()
 {
-    if (hasFeedTotal(mCurrentProperty.mType))
-        return;
     mInitStart = mCurrentProperty.mStartIndex;
-    mCurrentProperty.mStartIndex = 1;
+    mCurrentProperty.mStartIndex = paging::blockStart(mBlock);
 }
 
 int HomeState::recordIndex(int cell) const
 {
     return paging::recordIndex(mCurrentProperty.mType, mCurrentProperty.mStartIndex, cell);
+}
+
+int HomeState::firstNumber() const
+{
+    return mCurrentProperty.mStartIndex - recordIndex(0);
+}
+
+bool HomeState::isSearch() const
+{
+    const int type = mCurrentProperty.mType;
+    return type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
 }
 
 int HomeState::total(const Package *package) const

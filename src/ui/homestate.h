@@ -41,19 +41,35 @@ struct HomeState
     void backToAlbums();
     void backToPeople();
 
+    // Search words are searched for; the results are left for the search bar.
+    void startSearch(const QString &text);
+    void backToSearchBar();
+    // The neighbouring block of search results; false, and unchanged, when there is none.
+    bool changeBlock(bool next);
+
     // A page of the list shown; false, and unchanged, when there is none.
     bool pageUp(int arg);
     bool pageDown(int arg, const Package *package);
     // The page of a record of the list held (from 1), to focus its cell.
     void selectRecord(int number);
 
+    // The page that holds a record, by its number in the whole list. Among search results it may
+    // lie in another block.
+    void followTo(int number);
+
     // The list wanted has come, or a cell of it takes the focus.
     void packageArrived(const Package &package);
     void moveTo(int cell, const Package *package);
-    // The list is to be fetched anew, to show the same page.
+    // The list is to be fetched anew, to show the same page; useless while that is going on.
     void restart();
+    bool canRestart() const;
+    // Featured photos come page by page: turns to the next one when the page to be shown after a
+    // restart lies behind what is held.
+    bool turnToMissingPage(const Package &package);
 
     int recordIndex(int cell) const;
+    int firstNumber() const; // in the whole list, of the first record of the list that is held
+    bool isSearch() const;
     int total(const Package *package) const;
     bool isPhotoList() const;
     bool isWholeList() const; // pages are cut from a list that is held

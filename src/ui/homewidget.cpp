@@ -3,23 +3,26 @@
 #include "accountmanager/accountmanagerhelper.h"
 #include "base/i18n.h"
 #include "base/log.h"
-#include "common/ui/remotekeys.h"
 #include "data/packagemanager.h"
+#include "data/photomanager.h"
 #include "network/systemconfig.h"
-#include "ui/contentpages.h"
+#include "ui/accountquestions.h"
 #include "ui/formscrollarea.h"
 #include "ui/formscrollwidget.h"
 #include "ui/homebars.h"
+#include "ui/homepages.h"
 #include "ui/paging.h"
+#include "ui/photopopups.h"
+#include "ui/picturedetailwidget.h"
 #include "ui/qimageslide.h"
+#include "ui/screentexts.h"
+#include "ui/searchflow.h"
 #include "ui/upwidget.h"
 
-#include <QFrame>
 #include <QMetaMethod>
 #include <QPaintEvent>
 #include <QPainter>
 #include <QScrollBar>
-#include <QStackedLayout>
 #include <QVBoxLayout>
 
 #include <algorithm>
@@ -34,13 +37,6 @@ bool HomeWidget::mIsMainMenuHide = false;
 int HomeWidget::allPhotoNum = 0;
 
 namespace {
-
-// Milliseconds after which a page that has not come counts as failed; 0: never.
-int pagePatience()
-{
-    return SystemConfig::value(QStringLiteral("Network/PageSeconds"), QStringLiteral("0")).toInt() *
-           1000;
-}
 
 void forgetRemovedPackage(const Package *package)
 {
@@ -69,8 +65,14 @@ QString titleOf(const HomeState &state)
 HomeWidget::HomeWidget(QWidget *parent)
     : QWidget(parent)
     , mTitleWidget(new UpWidget(this))
-    , mFrame(new QFrame(this))
+    , mPages(new HomePages(this))
+    , mCommentArea(mPages->grid())
+    , mDetail(mPages->detail())
     , mBars(new HomeBars(this))
+    , mCells(std::make_unique<CellFiller>(mCommentArea->content(), this))
+    , mSearch(new SearchFlow(&mState, mPages, this))
+    , mPopups(new PhotoPopups(mDetail, this))
+    , mQuestions(new AccountQuestions(this))
 {
     mWidgetInst = this;
     mCurrentPackageData = nullptr;
@@ -83,10 +85,10 @@ HomeWidget::HomeWidget(QWidget *parent)
     column->setSpacing(4);
     column->setSizeConstraint(QLayout::SetNoConstraint); // the screen's size is given
     column->addWidget(mTitleWidget);
-    column->addWidget(mFrame, 1);
+    column->addWidget(mPages, 1);
     column->addWidget(mBars);
-    buildPages(mFrame);
     connectParts();
+    connectDetail();
     mTitleWidget->setUserName(AccountManagerHelper::getUserName());
     mTitleWidget->handleHomeEnterEvent();
 }
@@ -99,41 +101,42 @@ HomeWidget::~HomeWidget()
     mWidgetInst = nullptr;
 }
 
-void HomeWidget::buildPages(QWidget *frame)
-{
-    mPages = new QStackedLayout(frame);
-    mCommentArea = new FormScrollArea(frame);
-    auto *content = new FormScrollWidget(mCommentArea);
-    mCommentArea->setWidget(content);
-    content->setColumn(SystemConfig::scrollAreaMaxColumn());
-    mCells = std::make_unique<CellFiller>(content, this);
-
-    mLoadingPage = new LoadingPage(frame);
-    mNoPhotoPage = new NoPhotoAvailableWidget(frame);
-    mFailurePage = new FailurePage(frame);
-    for (QWidget *page :
-         {static_cast<QWidget *>(mCommentArea), static_cast<QWidget *>(mLoadingPage),
-          static_cast<QWidget *>(mNoPhotoPage), static_cast<QWidget *>(mFailurePage)})
-        mPages->addWidget(page);
-}
-
 void HomeWidget::connectParts()
 {
     connect(mCommentArea, &FormScrollArea::enterPress, this, &HomeWidget::handleCommentEnter);
     connect(mCommentArea, &FormScrollArea::selectChanged, this, &HomeWidget::updatePhotoRatio);
     connect(mTitleWidget, &UpWidget::pressEnter, this, &HomeWidget::handleUpWidgetEnter);
     connect(mTitleWidget, &UpWidget::keyPassedOn, this, &HomeWidget::keyPressEvent);
-    connect(mTitleWidget, &UpWidget::signOutRequested, this, &HomeWidget::confirmSignOut);
+    connect(mTitleWidget, &UpWidget::signOutRequested, mQuestions, &AccountQuestions::askToSignOut);
+    connect(mQuestions, &AccountQuestions::confirmed, this, &HomeWidget::doLogout);
+    connect(mQuestions, &AccountQuestions::canceled, this, &HomeWidget::returnFromLogoutCancel);
     connect(this, &HomeWidget::packageReady, this, &HomeWidget::tryToShowCurrentPackage);
-    connect(mFailurePage, &FailurePage::retryRequested, this, &HomeWidget::requestPage);
-    connect(mFailurePage, &FailurePage::leaveRequested, this, &HomeWidget::leaveFailure);
-    mPageTimer.setSingleShot(true);
-    connect(&mPageTimer, &QTimer::timeout, this, [this] { showFailure(NET_TIMEOUT); });
+    connect(mPages, &HomePages::pageChanged, this, &HomeWidget::refreshBars);
+    connect(mPages, &HomePages::retryRequested, this, &HomeWidget::requestPage);
+    connect(mPages, &HomePages::leaveRequested, this, &HomeWidget::leaveFailure);
+    connect(mSearch, &SearchFlow::resultsWanted, this, &HomeWidget::openList);
+}
+
+void HomeWidget::connectDetail()
+{
+    connect(mDetail, &PictureDetailWidget::backSignal, this, &HomeWidget::returnFromDetail);
+    connect(mDetail, &PictureDetailWidget::handleDetailPageChange, this,
+            &HomeWidget::preparePageData);
+    connect(mDetail, &PictureDetailWidget::viewChanged, this, &HomeWidget::refreshBars);
+    connect(this, &HomeWidget::packageReady, mDetail, &PictureDetailWidget::updateList);
+    connect(mDetail, &PictureDetailWidget::slidePlay, this, [this](int index) {
+        holdPackage();
+        emit slidePlay(index);
+    });
+    connect(mDetail, &PictureDetailWidget::slideShow, this, [this](int index) {
+        holdPackage();
+        emit slideShow(index);
+    });
 }
 
 bool HomeWidget::isLoading() const
 {
-    return mPages->currentWidget() == mLoadingPage;
+    return mPages->isShown(HomePages::Loading);
 }
 
 int HomeWidget::recordCount() const
@@ -146,12 +149,7 @@ void HomeWidget::requestPage()
 {
     CellFiller::cancelThumbnails();
     mCurrentPackageData = nullptr;
-    mLoadingPage->start();
-    showPage(mLoadingPage);
-    if (mayFocus())
-        mLoadingPage->setFocus();
-    if (const int patience = pagePatience())
-        mPageTimer.start(patience);
+    mPages->showLoading();
     tryToDownload(mState.mCurrentProperty);
 }
 
@@ -163,7 +161,7 @@ void HomeWidget::tryToDownload(PackageProperty property)
         return;
     }
     logLine("enter NULL == package");
-    if (!PackageManager::downloadPage(property, downloadPackageCB))
+    if (!PackageManager::downloadPage(property, downloadPackageCB) && isLoading())
         showFailure(NET_FAILED);
 }
 
@@ -183,34 +181,29 @@ void HomeWidget::downloadPackageCB(PackageProperty &property, ErrorCode code)
         mWidgetInst->showFailure(code);
 }
 
-void HomeWidget::showPage(QWidget *page)
-{
-    if (page != mLoadingPage) {
-        mPageTimer.stop();
-        mLoadingPage->stop();
-    }
-    mPages->setCurrentWidget(page);
-    refreshBars();
-}
-
+// A page refused, or a sign-in that has expired, may need another sign-in.
 void HomeWidget::showFailure(ErrorCode code)
 {
-    mFailurePage->setReason(code);
-    showPage(mFailurePage);
-    if (mayFocus())
-        mFailurePage->setFocus();
+    const bool isExpired = code == NET_FAILED && PackageManager::isSignInRefused();
+    mPages->showFailure(isExpired ? NET_NOT_PERMITTED : code);
+    if (isExpired)
+        mQuestions->askAfterRefusal(ScreenTexts::question(ScreenTexts::SignInExpired));
+    else if (code == NET_CONTENT_ERROR)
+        mQuestions->askAfterRefusal(ScreenTexts::failure(ScreenTexts::PageNotFound));
 }
 
 void HomeWidget::tryToShowCurrentPackage(PackageProperty &property)
 {
     logLine("try to show CurrentPackage");
     PackageProperty &wanted = mState.mCurrentProperty;
-    if (property != wanted)
+    if (property != wanted || (mState.isSearch() && !mState.mIsSearchShown))
         return;
     if (property.mStartIndex != wanted.mStartIndex)
         logLine("property.mStartIndex do not match");
     mCurrentPackageData = takeUsablePackage();
-    if (mCurrentPackageData) {
+    if (mCurrentPackageData && mState.turnToMissingPage(*mCurrentPackageData)) {
+        tryToDownload(wanted);
+    } else if (mCurrentPackageData) {
         mState.packageArrived(*mCurrentPackageData);
         allPhotoNum = mState.total(mCurrentPackageData);
         pushPackageData();
@@ -218,6 +211,22 @@ void HomeWidget::tryToShowCurrentPackage(PackageProperty &property)
     } else if (property.mStartIndex != wanted.mStartIndex) {
         tryToDownload(wanted); // another page of the list has come, without the one wanted
     } else {
+        fetchAnew();
+    }
+}
+
+// A page has come alone, without those before it, which the cache has let go.
+void HomeWidget::fetchAnew()
+{
+    const bool isBelow = mPages->isShown(HomePages::Detail);
+    if (mState.canRestart()) {
+        PackageManager::removeCache(mState.mCurrentProperty);
+        mState.restart();
+        if (isBelow)
+            tryToDownload(mState.mCurrentProperty);
+        else
+            requestPage();
+    } else if (!isBelow) {
         showFailure(NET_NO_DATA);
     }
 }
@@ -236,13 +245,20 @@ Package *HomeWidget::takeUsablePackage()
     return nullptr;
 }
 
+// After the cache may have let go of it.
+void HomeWidget::holdPackage()
+{
+    if (!mCurrentPackageData)
+        mCurrentPackageData = takeUsablePackage();
+}
+
 void HomeWidget::focusAfterPageDown()
 {
     const bool wanted = mState.mIsReturnFromDetail || mState.mIsPageDown;
     if (mState.mCurrentProperty.mType != TYPE_FEATURED_PHOTOS || !wanted)
         return;
     mState.mIsReturnFromDetail = mState.mIsPageDown = false;
-    if (mPages->currentWidget() == mCommentArea && mayFocus())
+    if (mPages->isShown(HomePages::Grid) && mayFocus())
         mCommentArea->updateFocus();
 }
 
@@ -255,8 +271,10 @@ void HomeWidget::pushPackageData()
     const bool toContent = !mTitleWidget->hasFocus();
     const int shown = mCells->fill(*mCurrentPackageData, mState.recordIndex(0));
     mState.mCanPlay = true;
+    if (mPages->isShown(HomePages::Detail))
+        return; // the list stays below it
     if (shown == 0) {
-        showPage(mNoPhotoPage);
+        mPages->show(HomePages::NoPhoto);
         if (mayFocus())
             mTitleWidget->setFocus();
         return;
@@ -264,7 +282,7 @@ void HomeWidget::pushPackageData()
     if (mState.mInitIndex >= 0)
         mCommentArea->content()->setIndex(std::min(mState.mInitIndex, shown - 1));
     mState.mInitIndex = -1;
-    showPage(mCommentArea);
+    mPages->show(HomePages::Grid);
     if (toContent)
         focusContent();
     updatePhotoRatio(mCommentArea->content()->getIndex());
@@ -282,33 +300,34 @@ void HomeWidget::focusContent()
 {
     if (!mayFocus())
         return;
-    if (mPages->currentWidget() == mCommentArea)
-        mCommentArea->initFocus();
-    else if (mPages->currentWidget() != mNoPhotoPage)
-        mPages->currentWidget()->setFocus();
+    mPages->focusPage();
     mTitleWidget->updateFocusMark();
 }
 
 void HomeWidget::handleUpWidgetEnter(PackageProperty &property)
 {
     logLine("enter HomeWidget::handleUpWidgetEnter()");
-    const int type = property.mType;
-    if (type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS) {
-        logLine("{HomeWidget::handleUpWidgetEnter} search is refused");
-        mTitleWidget->takeSelectionBack();
-        return;
-    }
-    if (type != TYPE_FEATURED_PHOTOS && type != TYPE_ALBUM_LIST && type != TYPE_FAVORITE_PEOPLE) {
+    const PackageProperty wanted = property; // may be the state's own, which changes
+    const int type = wanted.mType;
+    const bool isSearch = type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
+    if (!isSearch && type != TYPE_FEATURED_PHOTOS && type != TYPE_ALBUM_LIST &&
+        type != TYPE_FAVORITE_PEOPLE) {
         logLine("Wrong can not go here HomeWidget::handleUpWidgetEnter");
         return;
     }
+    CellFiller::cancelThumbnails();
+    if (mPages->isShown(HomePages::Detail))
+        returnFromDetail(1);
     mAlbumStr.clear();
-    if (mState.enterMenu(PackageProperty(property)) || type == TYPE_FEATURED_PHOTOS)
+    if (mState.enterMenu(wanted) || type == TYPE_FEATURED_PHOTOS)
         startAtFirstCell();
     mCommentArea->verticalScrollBar()->setValue(0);
     isHomeMenu = type == TYPE_FEATURED_PHOTOS;
     mIsSelfPhoto = type == TYPE_ALBUM_LIST;
-    requestPage();
+    if (isSearch)
+        mSearch->open();
+    else
+        requestPage();
 }
 
 // Now, so that a key which pages back can still move on from there; later, when no cell is shown.
@@ -326,33 +345,22 @@ void HomeWidget::updatePhotoRatio(int index)
 
 void HomeWidget::refreshBars()
 {
-    const bool isList = mPages->currentWidget() == mCommentArea;
-    const QString position =
-        isList && mCurrentPackageData
-            ? QStringLiteral("%1/%2").arg(mState.mPhotoIndexInTotal).arg(mState.mPhotoDataCount)
-            : QString();
+    const bool canPlay = isSignalConnected(QMetaMethod::fromSignal(&HomeWidget::slidePlay));
+    const bool isDetail = mPages->isShown(HomePages::Detail);
+    const bool isList = mPages->isShown(HomePages::Grid);
+    QString position;
+    if (isDetail)
+        position = QStringLiteral("%1/%2").arg(mDetail->number()).arg(mDetail->total());
+    else if (isList && mCurrentPackageData)
+        position =
+            QStringLiteral("%1/%2").arg(mState.mPhotoIndexInTotal).arg(mState.mPhotoDataCount);
+    mBars->setVisible(!mPages->isShown(HomePages::Search));
     mBars->setInformation(titleOf(mState), position);
-    mBars->showKeys(isLoading() ? QList<int>() : usefulKeys(isList));
-}
-
-// The keys that lead somewhere now.
-QList<int> HomeWidget::usefulKeys(bool isList) const
-{
-    QList<int> keys{DEVICE_RED_KEY};
-    const int start = mState.mCurrentProperty.mStartIndex;
-    if (mState.back() != HomeState::Back::SignOut)
-        keys << DEVICE_RETURN_KEY;
-    if (!isList)
-        return keys;
-    if (!mState.isPhotoList())
-        keys << DEVICE_SELECT_KEY;
-    else if (isSignalConnected(QMetaMethod::fromSignal(&HomeWidget::slidePlay)))
-        keys << DEVICE_PLAY_KEY;
-    if (paging::pageUp(start, paging::onePage).exists)
-        keys << DEVICE_PAGEUP_KEY;
-    if (paging::pageDown(start, mState.total(mCurrentPackageData), paging::onePage).exists)
-        keys << DEVICE_PAGEDOWN_KEY;
-    return keys;
+    if (isDetail)
+        mBars->showHints(mDetail->keyHints());
+    else
+        mBars->showHints(
+            HomeBars::usefulKeys(mState, mPages->page(), mCurrentPackageData, canPlay));
 }
 
 void HomeWidget::showEvent(QShowEvent *event)
@@ -365,5 +373,5 @@ void HomeWidget::showEvent(QShowEvent *event)
 void HomeWidget::paintEvent(QPaintEvent *event)
 {
     QPainter painter(this);
-    mBackdrop.paint(painter, event->region(), size(), mFrame->geometry());
+    mBackdrop.paint(painter, event->region(), size(), mPages->geometry());
 }

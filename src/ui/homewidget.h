@@ -7,17 +7,17 @@
 #include "ui/gridowner.h"
 #include "ui/homestate.h"
 
-#include <QTimer>
 #include <QWidget>
 
 #include <memory>
 
-class FailurePage;
+class AccountQuestions;
 class FormScrollArea;
 class HomeBars;
-class LoadingPage;
-class NoPhotoAvailableWidget;
-class QStackedLayout;
+class HomePages;
+class PhotoPopups;
+class PictureDetailWidget;
+class SearchFlow;
 class UpWidget;
 
 extern bool isHomeMenu; // featured photos are shown
@@ -30,7 +30,11 @@ extern bool isHomeMenu; // featured photos are shown
 //       else PackageManager --> downloadPackageCB --> packageReady, or the failure page
 //
 // A page that fails, or does not come within "Network/PageSeconds", ends in the failure page; an
-// answer to what is no longer wanted is left alone.
+// answer to what is no longer wanted is left alone. While the photo screen is up the list moves on
+// below it: whoever returns finds the page, and the cell, of the photo shown last.
+//
+// Searching, what pops up over the photo screen, and the questions before signing out are objects
+// of their own: SearchFlow, PhotoPopups, AccountQuestions.
 class HomeWidget : public QWidget, public GridOwner
 {
     Q_OBJECT
@@ -68,12 +72,20 @@ public slots:
     void handleUpWidgetEnter(PackageProperty &property);
     void tryToShowCurrentPackage(PackageProperty &property);
     void updatePhotoRatio(int index);
-    void handleCommentEnter(int itemIndex, bool isEnterPress);
+    void handleCommentEnter(int itemIndex, bool isEnterPress = false);
+    // Leaves the photo screen; the index, of the record shown last, is only for the log.
+    void returnFromDetail(int index);
+    // The photo screen or the slide show has come to the record with this number in the whole list:
+    // moves the page there, without showing it, and has the records fetched that are not held.
+    // False when there is no such record or nothing could be fetched.
+    bool preparePageData(int startIndex, bool nextPage);
     void returnFromLogoutCancel();
+    void doLogout();
     // Shows the page of that record (from 1) with the focus on it.
     void showRecord(int number);
 
 signals:
+    void signedOut(); // nobody is signed in any longer
     void packageReady(PackageProperty &property);
     void slideShow(int index);
     void slidePlay(int index);
@@ -84,40 +96,39 @@ protected:
     void showEvent(QShowEvent *event) override;
 
 private:
-    void buildPages(QWidget *frame);
     void connectParts();
+    void connectDetail();
 
     void requestPage();
     void tryToDownload(PackageProperty property);
-    void showPage(QWidget *page);
     void showFailure(ErrorCode code);
     void leaveFailure();
     Package *takeUsablePackage();
+    void fetchAnew();
+    void holdPackage();
     void pushPackageData();
     void focusAfterPageDown();
     void startAtFirstCell();
+    void openList();
     void showOtherPage(const char *otherType);
     void reshow();
     void refreshBars();
-    QList<int> usefulKeys(bool isList) const;
     void focusContent();
+    void showDetail(int itemIndex, bool isEnterPress);
+    void updateInitIndex();
     static bool mayFocus();
-    bool openAlbum(int itemIndex);
-    bool openPerson(int itemIndex);
     bool goBack();
     void play();
-    void confirmSignOut();
 
     HomeState mState;
     UpWidget *mTitleWidget;
+    HomePages *mPages;
     FormScrollArea *mCommentArea;
-    std::unique_ptr<CellFiller> mCells;
-    QWidget *mFrame;
-    QStackedLayout *mPages;
-    LoadingPage *mLoadingPage;
-    NoPhotoAvailableWidget *mNoPhotoPage;
-    FailurePage *mFailurePage;
+    PictureDetailWidget *mDetail;
     HomeBars *mBars;
-    QTimer mPageTimer;
+    std::unique_ptr<CellFiller> mCells;
+    SearchFlow *mSearch;
+    PhotoPopups *mPopups;
+    AccountQuestions *mQuestions;
     Backdrop mBackdrop;
 };

@@ -2,64 +2,134 @@
 
 #include "ui/homewidget.h"
 
+#include "accountmanager/accountmanagerhelper.h"
 #include "base/log.h"
 #include "common/ui/remotekeys.h"
-#include "ui/contentpages.h"
+#include "data/packagemanager.h"
+#include "data/photomanager.h"
+#include "ui/accountquestions.h"
 #include "ui/formscrollarea.h"
 #include "ui/formscrollwidget.h"
+#include "ui/homepages.h"
 #include "ui/paging.h"
+#include "ui/picturedetailwidget.h"
+#include "ui/searchflow.h"
 #include "ui/upwidget.h"
 
 #include <QKeyEvent>
 #include <QScrollBar>
-#include <QStackedLayout>
 
-void HomeWidget::handleCommentEnter(int itemIndex, bool)
+namespace {
+
+bool openAlbum(HomeState &state, const Package &package, int cell)
+{
+    const auto *album = package.record<Album>(state.recordIndex(cell));
+    if (!album) {
+        logLine("Wrong iAlbum HomeWidget::handleCommentEnter");
+        return false;
+    }
+    state.openAlbum(cell, *album);
+    HomeWidget::mAlbumStr = album->title();
+    return true;
+}
+
+bool openPerson(HomeState &state, const Package &package, int cell)
+{
+    const auto *person = package.record<FavoritePeople>(state.recordIndex(cell));
+    if (!person) {
+        logLine("Wrong favorite people HomeWidget::handleCommentEnter");
+        return false;
+    }
+    state.openPerson(cell, *person);
+    HomeWidget::mFavoritePeopleName = person->nickname();
+    return true;
+}
+
+} // namespace
+
+void HomeWidget::handleCommentEnter(int itemIndex, bool isEnterPress)
 {
     if (!mCurrentPackageData) {
         reshow(); // the cache has let go of the list
         return;
     }
-    bool opened = false;
-    if (mState.mCurrentProperty.mType == TYPE_ALBUM_LIST)
-        opened = openAlbum(itemIndex);
-    else if (mState.mCurrentProperty.mType == TYPE_FAVORITE_PEOPLE)
-        opened = openPerson(itemIndex);
-    if (!opened)
-        return;
+    const int type = mState.mCurrentProperty.mType;
+    if (mState.isPhotoList())
+        showDetail(itemIndex, isEnterPress);
+    else if (type == TYPE_ALBUM_LIST ? openAlbum(mState, *mCurrentPackageData, itemIndex)
+                                     : openPerson(mState, *mCurrentPackageData, itemIndex))
+        openList();
+}
+
+// Shows the list that the state has turned to, from its first cell on.
+void HomeWidget::openList()
+{
     startAtFirstCell();
     mCommentArea->verticalScrollBar()->setValue(0);
     requestPage();
 }
 
-bool HomeWidget::openAlbum(int itemIndex)
+void HomeWidget::showDetail(int itemIndex, bool isEnterPress)
 {
-    const auto *album = mCurrentPackageData->record<Album>(mState.recordIndex(itemIndex));
-    if (!album) {
-        logLine("Wrong iAlbum HomeWidget::handleCommentEnter");
-        return false;
-    }
-    mState.openAlbum(itemIndex, *album);
-    mAlbumStr = album->title();
-    return true;
+    CellFiller::cancelThumbnails();
+    mPages->show(HomePages::Detail);
+    mDetail->showPhoto(mState.recordIndex(itemIndex), mCurrentPackageData, mIsSelfPhoto,
+                       isEnterPress, mState.firstNumber());
+    mDetail->setFocus();
 }
 
-bool HomeWidget::openPerson(int itemIndex)
+void HomeWidget::returnFromDetail(int index)
 {
-    const auto *person = mCurrentPackageData->record<FavoritePeople>(mState.recordIndex(itemIndex));
-    if (!person) {
-        logLine("Wrong favorite people HomeWidget::handleCommentEnter");
+    logLine("enter HomeWidget::returnFromDetail(), index = ", index);
+    if (!mPages->isShown(HomePages::Detail))
+        return;
+    updateInitIndex();
+    mPages->show(HomePages::Grid);
+    if (mState.isSearch())
+        mCurrentPackageData = nullptr; // may be another block by now
+    holdPackage();
+    mState.mIsReturnFromDetail = !mCurrentPackageData;
+    reshow();
+}
+
+void HomeWidget::updateInitIndex()
+{
+    const int number = mDetail->number();
+    if (number < 1)
+        return;
+    const int before = mState.mCurrentProperty.mStartIndex;
+    mState.followTo(number);
+    const int start = mState.mCurrentProperty.mStartIndex;
+    if (start > before)
+        logLine("HomeWidget::updateInitIndex() Page DOWN!!!");
+    else if (start < before)
+        logLine("HomeWidget::updateInitIndex() Page UP!!!");
+    else
+        logLine("HomeWidget::updateInitIndex() do not switch page");
+    mState.mInitIndex = number - start;
+}
+
+bool HomeWidget::preparePageData(int startIndex, bool nextPage)
+{
+    logLine("{HomeWidget::preparePageData} startIndex = ", startIndex, " nextPage = ", nextPage);
+    if (startIndex < 1 || !mState.isPhotoList())
         return false;
-    }
-    mState.openPerson(itemIndex, *person);
-    mFavoritePeopleName = person->nickname();
+    mState.followTo(startIndex);
+    PackageProperty &wanted = mState.mCurrentProperty;
+    const bool isHeld = mCurrentPackageData && mState.recordIndex(0) < recordCount();
+    if (!isHeld)
+        return PackageManager::downloadPage(wanted, downloadPackageCB);
+    if (nextPage && wanted.mType == TYPE_FEATURED_PHOTOS)
+        PackageManager::getPackage(wanted); // has the page behind it fetched ahead
     return true;
 }
 
 bool HomeWidget::handlePageUp(int arg)
 {
+    if (mPages->isShown(HomePages::Detail))
+        return preparePageData(arg, false);
     if (!mState.pageUp(arg))
-        return false;
+        return arg == paging::onePage && mSearch->changeBlock(false);
     showOtherPage("Page Up, other mCurrentProperty type:");
     return true;
 }
@@ -67,10 +137,12 @@ bool HomeWidget::handlePageUp(int arg)
 bool HomeWidget::handlePageDown(int arg)
 {
     logLine("enter HomeWidget::handlePageDown()");
-    if (!mCurrentPackageData && mPages->currentWidget() == mCommentArea)
+    if (mPages->isShown(HomePages::Detail))
+        return preparePageData(arg, true);
+    if (!mCurrentPackageData && mPages->isShown(HomePages::Grid))
         reshow(); // the cache has let go of the list; what it holds is known when it is back
     if (!mState.pageDown(arg, mCurrentPackageData))
-        return false;
+        return arg == paging::onePage && mSearch->changeBlock(true);
     showOtherPage("Page Down, other mCurrentProperty type:");
     return true;
 }
@@ -89,8 +161,17 @@ void HomeWidget::showOtherPage(const char *otherType)
 
 void HomeWidget::showRecord(int number)
 {
+    if (mPages->isShown(HomePages::Detail) && mCurrentPackageData) {
+        const int first = mState.firstNumber(); // the play began on the photo screen
+        mState.followTo(first + number - 1);
+        mDetail->showPhoto(number - 1, mCurrentPackageData, mIsSelfPhoto, false, first);
+        mDetail->setFocus();
+        return;
+    }
     mState.selectRecord(number);
     mTitleWidget->clearFocus();
+    if (mPages->isShown(HomePages::Detail))
+        mPages->show(HomePages::Grid);
     if (mState.mCurrentProperty.mType == TYPE_FEATURED_PHOTOS)
         requestPage();
     else
@@ -108,9 +189,9 @@ void HomeWidget::reshow()
     requestPage();
 }
 
-void HomeWidget::changeBlock(bool)
+void HomeWidget::changeBlock(bool next)
 {
-    // Blocks are a matter of search results, which have no page here yet.
+    mSearch->changeBlock(next);
 }
 
 void HomeWidget::keyPressEvent(QKeyEvent *event)
@@ -120,11 +201,12 @@ void HomeWidget::keyPressEvent(QKeyEvent *event)
         logLine(" it is downloading data now, so no key press events!");
         return;
     }
-    const bool failed = mPages->currentWidget() == mFailurePage;
     switch (event->key()) {
     case DEVICE_RETURN_KEY:
-        if (!goBack())
-            confirmSignOut();
+        if (!goBack()) {
+            logLine("Exit app");
+            mQuestions->askToSignOut();
+        }
         break;
     case DEVICE_DOWN_KEY:
         logLine("<DEVICE_DOWN_KEY> setFocus()");
@@ -143,11 +225,11 @@ void HomeWidget::keyPressEvent(QKeyEvent *event)
         updatePhotoRatio(0);
         break;
     case DEVICE_PAGEUP_KEY:
-        if (!failed)
+        if (mPages->isShown(HomePages::Grid))
             handlePageUp(paging::onePage);
         break;
     case DEVICE_PAGEDOWN_KEY:
-        if (!failed)
+        if (mPages->isShown(HomePages::Grid))
             handlePageDown(paging::onePage);
         break;
     default:
@@ -157,7 +239,15 @@ void HomeWidget::keyPressEvent(QKeyEvent *event)
 
 bool HomeWidget::goBack()
 {
+    if (mPages->isShown(HomePages::Detail)) {
+        returnFromDetail(1);
+        return true;
+    }
     switch (mState.back()) {
+    case HomeState::Back::SearchBar:
+        mSearch->backToBar();
+        updatePhotoRatio(0);
+        return true;
     case HomeState::Back::Albums:
         mState.backToAlbums();
         break;
@@ -173,9 +263,12 @@ bool HomeWidget::goBack()
 
 void HomeWidget::play()
 {
-    const int type = mState.mCurrentProperty.mType;
-    const bool isSearch = type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
-    if (!mState.isPhotoList() || (isSearch && !mState.mIsSearchShown))
+    if (mPages->isShown(HomePages::Detail)) {
+        holdPackage();
+        emit slidePlay(mDetail->recordIndex());
+        return;
+    }
+    if (!mState.isPhotoList() || (mState.isSearch() && !mState.mIsSearchShown))
         return;
     const int cell = mCommentArea->content()->getIndex();
     const int index = mState.recordIndex(cell);
@@ -185,10 +278,14 @@ void HomeWidget::play()
         logLine("{HomeWidget::keyPressEvent} mCurrentPackageData is NULL");
 }
 
-void HomeWidget::confirmSignOut()
+// What belongs to the account goes with it.
+void HomeWidget::doLogout()
 {
-    logLine("{HomeWidget::confirmSignOut} signing out is refused");
-    returnFromLogoutCancel();
+    AccountManagerHelper::logout();
+    CellFiller::cancelThumbnails();
+    PackageManager::clearAll();
+    PhotoManager::clearAll();
+    emit signedOut();
 }
 
 void HomeWidget::returnFromLogoutCancel()

@@ -147,13 +147,13 @@ void PhotoItem::show(const QPixmap &picture)
 {
     const QSize size = imageSize();
     mPicture = picture;
-    mPicture.setDevicePixelRatio(1);
     if (picture.size() != size) {
+        QRect place(QPoint(0, 0), picture.size());
+        place.moveTo((size.width() - picture.width()) / 2, (size.height() - picture.height()) / 2);
         QPixmap ground(size);
         ground.fill(Qt::transparent);
         QPainter painter(&ground);
-        painter.drawPixmap((size.width() - picture.width()) / 2,
-                           (size.height() - picture.height()) / 2, mPicture);
+        painter.drawPixmap(place, picture); // whatever the picture's device pixel ratio
         painter.end();
         mPicture = ground;
     }

@@ -96,7 +96,7 @@ void PictureDetailWidget::display(int number, const DetailPhoto &photo)
     mNumber = number;
     mWanted = 0;
     mPhoto = photo;
-    mZoom->close();
+    mZoom->dismiss();
     mNotes.open(photo);
     const OrvalaPhoto *next = mList.photo(number >= before ? number + 1 : number - 1);
     mNextUrl = next ? next->imageUrl() : QString();
@@ -166,7 +166,7 @@ void PictureDetailWidget::listArrived(const PackageProperty &property, ErrorCode
 
 void PictureDetailWidget::updateList(PackageProperty &property)
 {
-    if (mNumber == 0 || isNote(property))
+    if (mNumber == 0 || isNote(property) || !isVisible())
         return;
     if (mWanted > 0)
         listArrived(property, NET_SUCCESS);
@@ -183,7 +183,7 @@ void PictureDetailWidget::showStrip()
         const OrvalaPhoto *record = mList.photo(number);
         neighbours.append({record ? record->thumbnailUrl() : QString(), number == mNumber});
     }
-    mStrip->show(neighbours);
+    mStrip->showNeighbours(neighbours);
 }
 
 void PictureDetailWidget::showInformation()
@@ -387,7 +387,7 @@ void PictureDetailWidget::showEvent(QShowEvent *event)
 void PictureDetailWidget::hideEvent(QHideEvent *event)
 {
     QWidget::hideEvent(event);
-    mZoom->close();
+    mZoom->dismiss();
     mPictures->stop();
 }
 

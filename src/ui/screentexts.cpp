@@ -18,6 +18,17 @@ const QVector<const char *> mHintString = {
     "Try again",
 };
 
+const QVector<const char *> mQuestionString = {
+    "Do you want to sign in again?",
+    "The sign-in has expired, or the album service no longer accepts it.",
+    "Delete comment",
+    "Do you want to delete this comment?",
+    "No comments yet",
+    "The comment could not be deleted. Please try again later.",
+    "The comment has been deleted.",
+    "One moment, please...",
+};
+
 const QVector<const char *> *tableOf(int table)
 {
     switch (table) {
@@ -25,6 +36,8 @@ const QVector<const char *> *tableOf(int table)
         return &mFailureString;
     case ScreenTexts::HintTable:
         return &mHintString;
+    case ScreenTexts::QuestionTable:
+        return &mQuestionString;
     default:
         return nullptr;
     }

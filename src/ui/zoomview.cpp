@@ -42,7 +42,7 @@ void ZoomView::open(const QPixmap &picture, const QSize &photo)
 }
 
 // Lets go of the picture, which may be a large one.
-void ZoomView::close()
+void ZoomView::dismiss()
 {
     hide();
     mPicture = mMap = QPixmap();
@@ -50,7 +50,7 @@ void ZoomView::close()
 
 void ZoomView::leave()
 {
-    close();
+    dismiss();
     emit left();
 }
 

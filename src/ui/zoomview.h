@@ -19,7 +19,7 @@ public:
 
     // Shows the picture at the first step. The size is that of the full-size photo.
     void open(const QPixmap &picture, const QSize &photo);
-    void close();
+    void dismiss();
 
     // True when the key was for the magnified photo; all are but those that leave it.
     bool handleKey(int key);

@@ -7,6 +7,7 @@
 #include "accountmanager/loginpage.h"
 #include "accountmanager/waitwidget.h"
 #include "common/ui/remotekeys.h"
+#include "oauth/signinplugin.h"
 #include "res/resources.h"
 #include "support/logcapture.h"
 
@@ -28,9 +29,13 @@ void press(const Keys &keys)
     }
 }
 
-// What has the focus: an account's address or a button's text.
+// What has the focus: an account's address, with a dash behind it for its button, or the text of
+// another button.
 QString focus()
 {
+    const QWidget *parent = QApplication::focusWidget()->parentWidget();
+    if (const auto *row = qobject_cast<const AccountItem *>(parent))
+        return row->mail() + '-';
     if (const auto *item = qobject_cast<AccountItem *>(QApplication::focusWidget()))
         return item->mail();
     const auto *button = qobject_cast<QAbstractButton *>(QApplication::focusWidget());
@@ -81,11 +86,14 @@ private slots:
         QTest::newRow("down") << 3 << Keys{down} << "0";
         QTest::newRow("last row") << 3 << Keys{down, down, down} << "1";
         QTest::newRow("first row") << 3 << Keys{up, left} << "2";
-        QTest::newRow("right") << 3 << Keys{right} << "New";
-        QTest::newRow("to Exit") << 3 << Keys{right, down, down} << "Exit";
-        QTest::newRow("back to New") << 3 << Keys{right, down, up, up, right} << "New";
-        QTest::newRow("back to the row") << 3 << Keys{down, right, down, left} << "0";
-        QTest::newRow("one account") << 1 << Keys{down, right, left} << "0";
+        QTest::newRow("Delete") << 3 << Keys{right} << "2-";
+        QTest::newRow("next Delete") << 3 << Keys{right, down} << "0-";
+        QTest::newRow("from Delete") << 3 << Keys{right, down, left} << "0";
+        QTest::newRow("New") << 3 << Keys{right, right} << "New";
+        QTest::newRow("to Exit") << 3 << Keys{right, right, down, down} << "Exit";
+        QTest::newRow("back to New") << 3 << Keys{right, right, down, up, up, right} << "New";
+        QTest::newRow("back to the row") << 3 << Keys{down, right, right, down, left, left} << "0";
+        QTest::newRow("one account") << 1 << Keys{down, right, right, left} << "0-";
         QTest::newRow("none") << 0 << Keys{left, up, right, DEVICE_PAGEDOWN_KEY} << "New";
         QTest::newRow("none, Exit") << 0 << Keys{down} << "Exit";
     }
@@ -175,19 +183,62 @@ private slots:
         QCOMPARE(finished.size(), 0);
         QCOMPARE(label("message"), AccountTexts::text(text));
         QCOMPARE(focus(), QString(text == AccountTexts::AccountGone ? "1" : "0"));
-        press({DEVICE_RIGHT_KEY});
+        press({DEVICE_RIGHT_KEY, DEVICE_RIGHT_KEY});
         QCOMPARE(focus(), QString("New"));
         QVERIFY(label("message").isEmpty());
+    }
+
+    // Deleting asks first; the next account takes the place of the one that is gone.
+    void deleting_data()
+    {
+        const int right = DEVICE_RIGHT_KEY, select = DEVICE_SELECT_KEY;
+        QTest::addColumn<int>("accounts");
+        QTest::addColumn<Keys>("keys");
+        QTest::addColumn<QStringList>("left");
+        QTest::addColumn<QString>("focused");
+        const QStringList all{"0", "1", "2"};
+        QTest::newRow("asked") << 3 << Keys{right, select} << all << "";
+        QTest::newRow("yes") << 3 << Keys{right, select, select} << QStringList{"1", "2"} << "1";
+        QTest::newRow("no") << 3 << Keys{right, select, right, select} << all << "0-";
+        QTest::newRow("Return") << 3 << Keys{right, select, DEVICE_RETURN_KEY} << all << "0-";
+        QTest::newRow("last row") << 3
+                                  << Keys{DEVICE_DOWN_KEY, DEVICE_DOWN_KEY, right, select, select}
+                                  << QStringList{"0", "1"} << "1";
+        QTest::newRow("only one") << 1 << Keys{right, select, select} << QStringList() << "New";
+    }
+
+    void deleting()
+    {
+        QFETCH(int, accounts);
+        QFETCH(Keys, keys);
+        show(accounts);
+        LogCapture log;
+        press(keys);
+        QTEST(OtherConnection(mFile->path()).rows("SELECT usermail FROM orvala1"), "left");
+        QTEST(focus(), "focused");
+        QVERIFY(!log.contains("Return key has been Pressed"));
+    }
+
+    void deletingFails()
+    {
+        show(2);
+        const OtherConnection other(mFile->path());
+        other.rows(
+            "CREATE TRIGGER t BEFORE DELETE ON orvala1 BEGIN SELECT RAISE(ABORT, 'no'); END");
+        press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY, DEVICE_SELECT_KEY});
+        QCOMPARE(label("message"), AccountTexts::text(AccountTexts::NotDeleted));
+        QCOMPARE(focus(), QString("0"));
     }
 
     void newAndExit()
     {
         LogCapture log;
         show(0);
+        SignInPlugin::setFile(mFile->path());
         press({DEVICE_SELECT_KEY});
         QVERIFY(log.contains("has foucus New, emit oauthStarted()"));
         QVERIFY(log.contains("enter AccountManager::startAuthorize()"));
-        QCOMPARE(label("message"), QString("Please register on PC and try again later."));
+        QCOMPARE(label("message"), AccountTexts::text(AccountTexts::SignInUnavailable));
         press({DEVICE_RETURN_KEY});
         QCOMPARE(log.lines().count("Return key has been Pressed"), 1);
         press({DEVICE_DOWN_KEY, DEVICE_SELECT_KEY});

@@ -14,6 +14,7 @@
 #include "res/resources.h"
 #include "support/logcapture.h"
 
+#include <QAbstractButton>
 #include <QLabel>
 #include <QStackedWidget>
 #include <QtTest>
@@ -45,6 +46,15 @@ public:
     }
     ~Screen() override { removeWidget(&accounts); }
 
+    void chooseNew()
+    {
+        for (QAbstractButton *button : accounts.findChildren<QAbstractButton *>()) {
+            if (button->text() == QLatin1String("New")) {
+                button->setFocus();
+                press(DEVICE_SELECT_KEY);
+            }
+        }
+    }
     OAuthWidget *wizard() { return findChild<OAuthWidget *>(); }
     bool isAtAccounts() { return currentWidget() == &accounts && !wizard(); }
     bool isPageShown() const
@@ -99,7 +109,7 @@ class TestSignIn : public QObject
         service->playOn(mServer.get());
         configure(seconds);
         mScreen = std::make_unique<Screen>();
-        emit mScreen->accounts.findChild<LoginPage *>()->oauthStarted();
+        mScreen->chooseNew();
     }
     void signIn()
     {
@@ -263,9 +273,11 @@ private slots:
             mScreen->press(key);
         QTRY_VERIFY(mScreen->isAtAccounts());
         QVERIFY(LogCapture::contains("handleAthorizeCancel invoked!"));
+        const auto *button = qobject_cast<QAbstractButton *>(QApplication::focusWidget());
+        QCOMPARE(button ? button->text() : QString(), QString("New"));
         SignInCase good;
         good.playOn(mServer.get());
-        emit mScreen->accounts.findChild<LoginPage *>()->oauthStarted();
+        mScreen->chooseNew();
         QTRY_VERIFY(mScreen->isPageShown());
         mScreen->press(DEVICE_SELECT_KEY);
         QVERIFY(mScreen->findChild<QPopUpForm *>());
@@ -299,7 +311,7 @@ private slots:
         mServer->close();
         mServer->closeConnections();
         mScreen = std::make_unique<Screen>();
-        emit mScreen->accounts.findChild<LoginPage *>()->oauthStarted();
+        mScreen->chooseNew();
         waitForTimeOut();
     }
 

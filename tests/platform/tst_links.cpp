@@ -208,6 +208,7 @@ void TestLinks::tellsOfInterfacesThatComeAndGo()
 {
     addCable("visitor", "visitorEnd");
     QTRY_COMPARE(carriersOf("visitor"), QList<bool>({true}));
+    QTRY_COMPARE(carriersOf("visitorEnd"), QList<bool>({true}));
     QVERIFY(ip(QStringLiteral("link del visitor")));
     QTRY_COMPARE(carriersOf("visitor"), QList<bool>({true, false}));
     QTRY_COMPARE(carriersOf("visitorEnd"), QList<bool>({true, false}));

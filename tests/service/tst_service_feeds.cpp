@@ -1,5 +1,6 @@
 #include "support/testservice.h"
 
+#include "feeds/featuredlist.h"
 #include "index/tokens.h"
 
 #include <gtest/gtest.h>
@@ -264,4 +265,40 @@ TEST_F(Feeds, aRefreshTokenBuysAccess)
         json::parse(post(known + "&refresh_token=no&grant_type=refresh_token", "")->body)["error"],
         "invalid_grant");
     EXPECT_EQ(statusOf(std::string(base) + "/user/default?access_token=" + refresh), 401);
+}
+
+TEST_F(Feeds, featuredShowsEverythingBeforeItRepeats)
+{
+    const auto shownOn = [&](const std::string &day, std::size_t count) {
+        FeaturedList list(database(), [day] { return day; }); // as after a start of the service
+        auto reader = database().read();
+        std::vector<std::int64_t> ids = *list.photos(reader);
+        EXPECT_EQ(std::set<std::int64_t>(ids.begin(), ids.end()).size(), 4u);
+        ids.resize(count);
+        list.noteShown(ids);
+        return ids;
+    };
+    std::set<std::int64_t> seen;
+    for (const char *day : {"2026-05-01", "2026-05-02", "2026-05-03", "2026-05-04"}) {
+        const auto first = shownOn(day, 1);
+        EXPECT_EQ(shownOn(day, 1), first); // the day keeps its order
+        seen.insert(first.front());
+    }
+    EXPECT_EQ(seen.size(), 4u);
+    std::set<std::vector<std::int64_t>> orders;
+    for (int day = 10; day < 30; ++day)
+        orders.insert(shownOn("2026-05-" + std::to_string(day), 4));
+    EXPECT_GT(orders.size(), 3u);
+}
+
+TEST_F(Feeds, aBurstIsThinned)
+{
+    for (int i = 0; i < 20; ++i)
+        addPhoto("Burst/" + std::to_string(i) + ".jpg",
+                 {{"Exif.Photo.DateTimeOriginal", "2014:03:01 10:00:" + std::to_string(10 + i)}});
+    scan();
+    const Titles titles = titlesOf(publicFeed(std::string(base) + "/featured"));
+    ASSERT_EQ(titles.size(), 24u);
+    const auto isBurst = [](const std::string &title) { return std::isdigit(title[0]) != 0; };
+    EXPECT_EQ(std::count_if(titles.begin(), titles.begin() + 5, isBurst), 1);
 }

@@ -207,4 +207,6 @@ TEST_F(Program, mistakesAreExplained)
          {"serve", "user add", "user list", "user remove", "user token", "import", "photos"})
         EXPECT_EQ(run(std::string(arguments) + " --help").status, 0) << arguments;
     EXPECT_NE(run("serve --port 70000").status, 0);
+    writeBytes(mFolder.file("settings"), "[serve]\nport = 70000\n");
+    EXPECT_NE(run("--config " + mFolder.file("settings") + " serve").status, 0);
 }

@@ -6,6 +6,8 @@
 
 #include <gtest/gtest.h>
 
+#include <thread>
+
 using Titles = std::vector<std::string>;
 namespace fs = std::filesystem;
 
@@ -135,9 +137,32 @@ TEST_F(Scan, linksAndHiddenNames)
     addPhoto("a/.hidden.jpg");
     fs::create_directory_symlink(photo(""), photo("a/circle"));
     fs::create_symlink(photo("a/missing.jpg"), photo("a/broken.jpg"));
+    fs::create_directories(file("elsewhere")); // what leads out of the folder is left out
+    writePicture(file("elsewhere/foreign.jpg"), 16, 16);
+    fs::create_symlink(file("elsewhere/foreign.jpg"), photo("a/out.jpg"));
+    fs::create_directory_symlink(file("elsewhere"), photo("a/outside"));
     start();
     scan();
     EXPECT_EQ(featured(), Titles{"one"});
+    const json entry = publicFeed("/data/feed/api/featured")["entry"][0];
+    const std::string picture = pathOf(entry["content"]["src"]);
+    EXPECT_EQ(statusOf(picture), 200);
+    fs::remove(photo("a/one.jpg"));
+    fs::create_symlink(file("elsewhere/foreign.jpg"), photo("a/one.jpg"));
+    EXPECT_EQ(statusOf(picture), 404);
+}
+
+TEST_F(Scan, aWatchedFolderNeedsNoScan)
+{
+    addPhoto("a/one.jpg");
+    start();
+    scan();
+    addPhoto("b/two.jpg");
+    const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(30);
+    while (featured().size() < 2 && std::chrono::steady_clock::now() < end)
+        std::this_thread::yield();
+    EXPECT_EQ(featured(), (Titles{"one", "two"}));
+    EXPECT_EQ(json::parse(get("/health")->body)["photos"], 2);
 }
 
 TEST_F(Scan, privacyFollowsItsMark)

@@ -1,3 +1,7 @@
+#include "accountmanager/accountmanagerhelper.h"
+#include "common/ui/qconfirm.h"
+#include "common/ui/qpopupdialog.h"
+#include "common/ui/qpopupform.h"
 #include "common/ui/remotekeys.h"
 #include "data/download.h"
 #include "data/heldanswers.h"
@@ -14,7 +18,9 @@
 #include "ui/homebars.h"
 #include "ui/homewidget.h"
 #include "ui/photoitem.h"
+#include "ui/picturedetailwidget.h"
 #include "ui/samplefeeds.h"
+#include "ui/searchwidget.h"
 #include "ui/upwidget.h"
 
 #include <QBuffer>
@@ -41,6 +47,14 @@ void answerFeatured(QTcpSocket *socket, const MisbehavingServer::Request &reques
     answer(sample::photos("Photo", first, std::min(first + 7, 20), 20))(socket, request);
 }
 
+// 110 search results, a hundred at a time.
+void answerSearch(QTcpSocket *socket, const MisbehavingServer::Request &request)
+{
+    const bool isFurther = request.path.contains("start-index=101");
+    answer(sample::photos("Found", isFurther ? 101 : 1, isFurther ? 110 : 100, 110))(socket,
+                                                                                     request);
+}
+
 } // namespace
 
 // The home screen by key presses, against a server of its own.
@@ -65,11 +79,17 @@ private slots:
     void thumbnailsAreShownUndistorted();
     void redLeadsHomeAndPlayIsOffered();
     void hostileTextsStayPlain();
+    void searchesInBlocks();
+    void returnsToTheSearchBar();
+    void followsThePhotoScreen();
+    void signsOutOnlyWhenConfirmed();
+    void anExpiredSignInLeadsToTheAccounts();
 
 private:
     void open(const QByteArray &settings = QByteArray());
     void press(std::initializer_list<int> keys);
     void enterMenu(int entry);
+    void search(const QString &words);
     QStringList captions() const;
     int focused() const { return grid()->content()->getIndex(); }
     FormScrollArea *grid() const { return mHome->findChild<FormScrollArea *>(); }
@@ -131,6 +151,16 @@ void TestHomeWidget::enterMenu(int entry)
     while (menu()->focusIndex() > entry)
         press({DEVICE_LEFT_KEY});
     press({DEVICE_SELECT_KEY});
+}
+
+void TestHomeWidget::search(const QString &words)
+{
+    enterMenu(UpWidget::SearchEntry);
+    press({DEVICE_SELECT_KEY});
+    QVERIFY(mHome->findChild<QPopUpForm *>());
+    mHome->findChild<QPopUpForm *>()->handleInput(words);
+    QTRY_VERIFY(!mHome->findChild<QPopUpForm *>());
+    press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY});
 }
 
 QStringList TestHomeWidget::captions() const
@@ -220,7 +250,9 @@ void TestHomeWidget::opensPeopleAndGoesBack()
     QTRY_VERIFY(isReady());
     QCOMPARE(mHome->packageType(), int(TYPE_FAVORITE_PEOPLE));
     QCOMPARE(focused(), 1);
-    press({DEVICE_RETURN_KEY}); // nothing above: the list stays
+    press({DEVICE_RETURN_KEY}); // nothing above
+    QVERIFY(mHome->findChild<QConfirm *>());
+    press({DEVICE_RETURN_KEY});
     QCOMPARE(captions().size(), 3);
 }
 
@@ -253,6 +285,8 @@ void TestHomeWidget::aFailureCanBeRetried()
     mServer->on(kPeople, behaviour);
     enterMenu(UpWidget::FavoritesEntry);
     QTRY_VERIFY(failure()->isVisible());
+    if (mHome->findChild<QPopupDialog *>()) // refused: whether to sign in again
+        press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY});
     QVERIFY(failure()->hasFocus());
     QVERIFY(!failure()->reason().isEmpty());
     mServer->on(kPeople, answer(sample::people(3)));
@@ -393,6 +427,103 @@ void TestHomeWidget::hostileTextsStayPlain()
     press({DEVICE_SELECT_KEY});
     QTRY_VERIFY(isReady());
     QVERIFY(bars()->information().contains("<b>&lt;img src='/etc/passwd'&gt;</b>"));
+}
+
+void TestHomeWidget::searchesInBlocks()
+{
+    mServer->on("/data/feed/api/all", answerSearch);
+    open();
+    QTRY_VERIFY(isReady());
+    search("sea");
+    QTRY_COMPARE(captions().value(0), QString("Found 1"));
+    for (int page = 0; page < 13; ++page)
+        press({DEVICE_PAGEDOWN_KEY});
+    QTRY_COMPARE(captions().value(0), QString("Found 101"));
+    QCOMPARE(mHome->packageType(), int(TYPE_SEARCH_MORE_PHOTOS));
+    press({DEVICE_RIGHT_KEY, DEVICE_PAGEDOWN_KEY});
+    QCOMPARE(captions(), QStringList({"Found 109", "Found 110"}));
+    press({DEVICE_PAGEDOWN_KEY}); // there are 110
+    QCOMPARE(mHome->startIndex(), 109);
+    press({DEVICE_SELECT_KEY, DEVICE_RIGHT_KEY, DEVICE_RETURN_KEY});
+    QCOMPARE(captions().value(focused()), QString("Found 110"));
+    press({DEVICE_PAGEUP_KEY, DEVICE_PAGEUP_KEY});
+    QTRY_COMPARE(captions().value(0), QString("Found 1"));
+}
+
+void TestHomeWidget::returnsToTheSearchBar()
+{
+    mServer->on("/data/feed/api/all", answerSearch);
+    open();
+    QTRY_VERIFY(isReady());
+    search("sea");
+    QTRY_COMPARE(captions().size(), 8);
+    press({DEVICE_RETURN_KEY});
+    auto *bar = mHome->findChild<SearchWidget *>();
+    QVERIFY(bar->hasFocus());
+    QCOMPARE(bar->text(), QString("sea"));
+    press({DEVICE_PLAY_KEY, DEVICE_PAGEDOWN_KEY, DEVICE_UP_KEY});
+    QVERIFY(menu()->hasFocus());
+    press({DEVICE_DOWN_KEY});
+    QVERIFY(bar->hasFocus());
+    press({DEVICE_RED_KEY});
+    QTRY_COMPARE(captions().value(0), QString("Photo 1"));
+}
+
+void TestHomeWidget::followsThePhotoScreen()
+{
+    open();
+    QTRY_VERIFY(isReady());
+    QTRY_COMPARE(mHome->recordCount(), 16); // the second page is fetched ahead
+    press({DEVICE_DOWN_KEY, DEVICE_RIGHT_KEY, DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY});
+    auto *detail = mHome->findChild<PictureDetailWidget *>();
+    QVERIFY(detail->hasFocus());
+    QVERIFY(bars()->information().contains("7/20"));
+    press({DEVICE_RIGHT_KEY, DEVICE_RIGHT_KEY, DEVICE_RIGHT_KEY});
+    QCOMPARE(detail->number(), 10);
+    QCOMPARE(mHome->startIndex(), 9);
+    press({DEVICE_RETURN_KEY});
+    QCOMPARE(captions().value(focused()), QString("Photo 10"));
+    QVERIFY(grid()->content()->cell(1)->hasFocus());
+    press({DEVICE_SELECT_KEY});
+    mHome->showRecord(12); // back from a slide show
+    QCOMPARE(detail->number(), 12);
+    QVERIFY(detail->hasFocus());
+    PackageManager::clearAll(); // the cache may let go
+    press({DEVICE_RETURN_KEY});
+    QTRY_VERIFY(isReady());
+    QCOMPARE(captions().value(0), QString("Photo 9"));
+    QVERIFY(mHome->preparePageData(16, true)); // as a slide show asks
+    QCOMPARE(mHome->startIndex(), 9);
+    QVERIFY(!mHome->preparePageData(0, false));
+}
+
+void TestHomeWidget::signsOutOnlyWhenConfirmed()
+{
+    AccountManagerHelper::setAccessToken("token");
+    open();
+    QTRY_VERIFY(isReady());
+    QSignalSpy left(mHome.get(), &HomeWidget::signedOut);
+    enterMenu(UpWidget::SignOutEntry);
+    QVERIFY(mHome->findChild<QConfirm *>());
+    press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY});
+    QCOMPARE(menu()->selectedIndex(), int(UpWidget::HomeEntry));
+    QVERIFY(menu()->hasFocus());
+    QVERIFY(left.isEmpty());
+    press({DEVICE_RETURN_KEY, DEVICE_SELECT_KEY});
+    QCOMPARE(left.size(), 1);
+    QVERIFY(AccountManagerHelper::getAccessToken().isEmpty());
+}
+
+void TestHomeWidget::anExpiredSignInLeadsToTheAccounts()
+{
+    mServer->on(kPeople, MisbehavingServer::answer("", 401));
+    open();
+    QTRY_VERIFY(isReady());
+    QSignalSpy left(mHome.get(), &HomeWidget::signedOut);
+    enterMenu(UpWidget::FavoritesEntry);
+    QTRY_VERIFY(mHome->findChild<QPopupDialog *>());
+    press({DEVICE_SELECT_KEY});
+    QCOMPARE(left.size(), 1);
 }
 
 QTEST_MAIN(TestHomeWidget)

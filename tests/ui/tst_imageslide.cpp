@@ -426,6 +426,7 @@ void TestImageSlide::keysDuringADownload()
     player()->update();
     QVERIFY(LogCapture::contains("Wrong QImageSlide::update()"));
     QTRY_VERIFY(mPage->homeScreen()->isLoading());
+    QTRY_VERIFY(held.count() > 0);
     QVERIFY(player()->hasFocus());
 
     press({DEVICE_SETTING_KEY, DEVICE_RETURN_KEY, DEVICE_LEFT_KEY, DEVICE_PAUSE_KEY});

@@ -1,0 +1,23 @@
+#pragma once
+
+#include <QLineEdit>
+
+// The field for the login ID of the account form. It leaves Select to the form.
+class UserNameLineEdit : public QLineEdit
+{
+    Q_OBJECT
+
+public:
+    explicit UserNameLineEdit(QWidget *parent = nullptr);
+
+    // Takes a text from the keyboard form.
+    void setInput(const QString &text);
+    // Shows a stored account, which may be longer than what is typed. Typing replaces it.
+    void showAccount(const QString &account);
+
+signals:
+    void editCompleted();
+
+protected:
+    void keyPressEvent(QKeyEvent *event) override;
+};

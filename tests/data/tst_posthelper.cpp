@@ -1,0 +1,205 @@
+#include "accountmanager/accountmanagerhelper.h"
+#include "data/mediauploader.h"
+#include "data/posthelper.h"
+#include "data/testconfig.h"
+#include "support/logcapture.h"
+#include "support/misbehavingserver.h"
+
+#include <QImage>
+#include <QTimer>
+#include <QtTest>
+
+namespace {
+
+const QByteArray kEntry = R"({"entry":{"title":{"$t":"x"}}})";
+const char *const kCategory = "<category scheme=\"https://schemas.orvala.example/2005#kind\"    "
+                              "term=\"https://schemas.orvala.example/photos/2007#";
+
+} // namespace
+
+// What posting sends, byte by byte, and how it takes the answers.
+class TestPostHelper : public QObject
+{
+    Q_OBJECT
+
+private slots:
+    void init();
+    void cleanup();
+    void escapes_data();
+    void escapes();
+    void postsAComment();
+    void postsATag();
+    void deletes();
+    void judgesAnswers_data();
+    void judgesAnswers();
+    void canBeCanceled();
+    void uploadsAPhoto();
+    void refusesFiles();
+
+private:
+    MisbehavingServer::Request last() const { return mServer->requests().last(); }
+    QString file(const QString &name, const QByteArray &bytes) const;
+
+    QTemporaryDir mFolder;
+    TestConfig mConfig;
+    std::unique_ptr<LogCapture> mLog;
+    std::unique_ptr<MisbehavingServer> mServer;
+};
+
+void TestPostHelper::init()
+{
+    mLog = std::make_unique<LogCapture>();
+    mServer = std::make_unique<MisbehavingServer>();
+    mConfig.write("[Service]\nFeedBase=" + mServer->url("").toUtf8() + '\n');
+    AccountManagerHelper::setAccessToken("to/k&n");
+}
+
+void TestPostHelper::cleanup()
+{
+    mServer.reset();
+    mLog.reset();
+}
+
+QString TestPostHelper::file(const QString &name, const QByteArray &bytes) const
+{
+    QFile file(mFolder.filePath(name));
+    if (!file.open(QIODevice::WriteOnly) || file.write(bytes) != bytes.size())
+        qFatal("cannot write a file");
+    return file.fileName();
+}
+
+void TestPostHelper::escapes_data()
+{
+    QTest::addColumn<QString>("text");
+    QTest::addColumn<QString>("escaped");
+    QTest::newRow("all") << "a < b & \"c\" > 'd'"
+                         << "a &lt; b &amp; &quot;c&quot; &gt; 'd'";
+    QTest::newRow("escaped already") << "a &amp; b &lt;"
+                                     << "a &amp; b &amp;lt;";
+}
+
+void TestPostHelper::escapes()
+{
+    QFETCH(QString, text);
+    QTEST(PostHelper::escapeXml(text), "escaped");
+}
+
+void TestPostHelper::postsAComment()
+{
+    mServer->enqueue(MisbehavingServer::answer("  " + kEntry));
+    QString comment = QString::fromUtf8("caf\u00e9 <3 %1 \u20ac \U0001f600\x01");
+    QCOMPARE(PostHelper::addComment("me", "a b", "7", comment), NET_SUCCESS);
+    QCOMPARE(comment.mid(0, 9), QString::fromUtf8("caf\u00e9 &lt;"));
+    QCOMPARE(last().method, QByteArray("POST"));
+    QCOMPARE(last().path, QByteArray("/data/feed/api/user/me/albumid/a%20b/photoid/7"
+                                     "?access_token=to%2Fk%26n&alt=json"));
+    QCOMPARE(last().headers.value("content-type"), QByteArray("application/atom+xml"));
+    QCOMPARE(last().body, QByteArray("<entry xmlns='http://www.w3.org/2005/Atom'>  "
+                                     "<content>caf\xe9 &lt;3 %1 &#8364; &#128512;</content>  ") +
+                              kCategory + "comment\"/></entry>");
+}
+
+void TestPostHelper::postsATag()
+{
+    mServer->enqueue(MisbehavingServer::answer(kEntry));
+    mServer->enqueue(MisbehavingServer::answer(R"({"entry":{"Title":1}})"));
+    QString tag = "Q&A";
+    QCOMPARE(PostHelper::addTag("me", "a", "7", tag), NET_SUCCESS);
+    QCOMPARE(last().body, "<entry xmlns='http://www.w3.org/2005/Atom'>  <title>Q&amp;A</title>  " +
+                              QByteArray(kCategory) + "tag\"/></entry>");
+    QCOMPARE(PostHelper::addTag("me", "a", "7", tag), NET_REJECTED);
+}
+
+void TestPostHelper::deletes()
+{
+    mServer->enqueue(MisbehavingServer::answer(""));
+    QCOMPARE(PostHelper::deleteTag("me", "a", "7", "50% a/b?#c"), NET_SUCCESS);
+    QCOMPARE(last().method, QByteArray("DELETE"));
+    QCOMPARE(last().path, QByteArray("/data/entry/api/user/me/albumid/a/photoid/7/tag/"
+                                     "50%25%20a%2Fb%3F%23c?access_token=to%2Fk%26n&alt=json"));
+    mServer->enqueue(MisbehavingServer::answer("", 404));
+    QCOMPARE(PostHelper::deleteTag("me", "a", "7", "x"), NET_CONTENT_ERROR);
+    mServer->enqueue(MisbehavingServer::answer("", 404));
+    QCOMPARE(PostHelper::deleteComment("me", "a", "7", "c1"), NET_SUCCESS);
+    QCOMPARE(last().path, QByteArray("/data/entry/api/user/me/albumid/a/photoid/7/commentid/c1"
+                                     "?access_token=to%2Fk%26n&alt=json"));
+}
+
+void TestPostHelper::judgesAnswers_data()
+{
+    QTest::addColumn<MisbehavingServer::Behaviour>("behaviour");
+    QTest::addColumn<int>("code");
+    QTest::addColumn<QString>("line");
+    const QString rejected = "Error: operation rejected by server!";
+    QTest::newRow("a page") << MisbehavingServer::html() << int(NET_REJECTED) << rejected;
+    QTest::newRow("nothing") << MisbehavingServer::answer("") << int(NET_REJECTED)
+                             << "Error occurs when readData";
+    QTest::newRow("forbidden") << MisbehavingServer::answer(kEntry, 403) << int(NET_CONTENT_ERROR)
+                               << "Network Error!";
+    QTest::newRow("gone") << MisbehavingServer::reset() << int(NET_FAILED) << "Network Error!";
+}
+
+void TestPostHelper::judgesAnswers()
+{
+    QFETCH(MisbehavingServer::Behaviour, behaviour);
+    QFETCH(QString, line);
+    mServer->enqueue(behaviour);
+    mServer->enqueue(behaviour); // the toolkit may try a lost request again
+    QString comment = "x";
+    QTEST(int(PostHelper::addComment("me", "a", "7", comment)), "code");
+    QVERIFY(LogCapture::contains(line));
+}
+
+void TestPostHelper::canBeCanceled()
+{
+    mServer->enqueue(MisbehavingServer::silence());
+    QTimer poll;
+    connect(&poll, &QTimer::timeout, this, [this] {
+        if (!mServer->requests().isEmpty())
+            PostHelper::cancel();
+    });
+    poll.start(1);
+    QString comment = "x";
+    QCOMPARE(PostHelper::addComment("me", "a", "7", comment), NET_CANCELED);
+}
+
+void TestPostHelper::uploadsAPhoto()
+{
+    const QString path = mFolder.filePath("p.png");
+    QImage picture(3, 2, QImage::Format_RGB32);
+    picture.fill(Qt::red);
+    QVERIFY(picture.save(path));
+    QFile stored(path);
+    QVERIFY(stored.open(QIODevice::ReadOnly));
+    const QByteArray bytes = stored.readAll();
+
+    mServer->enqueue(MisbehavingServer::answer(kEntry));
+    QCOMPARE(MediaUploader::startToUpload(path, "Sea", "me", "a1", "By day", false), NET_SUCCESS);
+    QCOMPARE(last().path,
+             QByteArray("/data/feed/api/user/me/albumid/a1?access_token=to%2Fk%26n&alt=json"));
+    const QByteArray body =
+        "\nMedia multipart posting\n--END_OF_PART\nContent-Type:application/atom+xml\n\n"
+        "<entry xmlns='http://www.w3.org/2005/Atom'>   <title>Sea</title>   "
+        "<summary>By day</summary>   " +
+        QByteArray(kCategory) + "photo\"/> </entry>\n--END_OF_PART\nContent-Type:image/png\n\n" +
+        bytes + "\n--END_OF_PART--";
+    QCOMPARE(last().body, body);
+    QCOMPARE(last().headers.value("content-type"),
+             "multipart/related; boundary=END_OF_PART Content-Length:" +
+                 QByteArray::number(body.size()) + " MIME-version:1.0");
+}
+
+void TestPostHelper::refusesFiles()
+{
+    const auto upload = [](const QString &path, bool busy) {
+        return MediaUploader::startToUpload(path, "t", "me", "a", "s", busy);
+    };
+    QCOMPARE(upload("anything", true), ErrorCode(MediaUploader::Busy));
+    QCOMPARE(upload(file("text.jpg", "no picture"), false), ErrorCode(MediaUploader::NotAnImage));
+    QCOMPARE(upload(file("empty.png", ""), false), ErrorCode(MediaUploader::NotAnImage));
+    QVERIFY(LogCapture::contains("MediaUploader::MediaUploader image is null!"));
+    QVERIFY(mServer->requests().isEmpty());
+}
+
+QTEST_MAIN(TestPostHelper)
+#include "tst_posthelper.moc"
