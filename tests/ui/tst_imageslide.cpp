@@ -439,6 +439,7 @@ void TestImageSlide::keysDuringADownload()
     QCOMPARE(mReports->last(), isAnswered ? kStopped : kStarted);
     if (isAnswered)
         return;
+    QTRY_COMPARE(held.count(), 1);
     serve(12);
     held.answerFirst(MisbehavingServer::answer(sample::photos("Photo", 1, 8, 12)));
     QTRY_VERIFY(!mPage->homeScreen()->isLoading());
