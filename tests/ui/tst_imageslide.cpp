@@ -264,7 +264,7 @@ void TestImageSlide::aPhotoIsThereBeforeItsTurn()
     auto *photos = player()->findChild<SlidePhotos *>();
     const QString next = mServer->url(pathOf(2));
     QTRY_VERIFY(photos->isPrepared(next));
-    QVERIFY(showsPhoto());
+    QTRY_VERIFY(showsPhoto());
     QCOMPARE(label()->slide().photo.size(), QSize(1280, 720));
     QCOMPARE(requestsOf(3), 0);
     PhotoManager::clearAll(); // prepared is prepared
