@@ -9,7 +9,6 @@
 #include "common/ui/keyboardlayout.h"
 #include "common/ui/qpopupform.h"
 #include "res/resources.h"
-#include "support/logcapture.h"
 
 #include <QLabel>
 #include <QPushButton>
@@ -27,10 +26,6 @@ class TestManagerForm : public QObject
 
     void press(int key) { pressKey(QApplication::focusWidget(), key); }
     QString tip() const { return mForm->findChild<QLabel *>("tip")->text(); }
-    QString tipColour() const
-    {
-        return mForm->findChild<QLabel *>("tip")->styleSheet().section(QRegExp("[ ;]"), 1, 1);
-    }
     QList<PinLineEdit *> boxes() const { return mForm->findChildren<PinLineEdit *>(); }
     QPushButton *button(const QString &text) const
     {
@@ -68,7 +63,6 @@ class TestManagerForm : public QObject
         for (const PinLineEdit *box : boxes())
             QVERIFY(box->text().isEmpty() && box->digit().isEmpty());
         QVERIFY(!button("Next")->isEnabled());
-        QCOMPARE(tipColour(), QString("#c00000"));
     }
 
 private slots:
@@ -97,7 +91,6 @@ private slots:
         enterLoginId("neworvalauser");
         QCOMPARE(mForm->findChild<UserNameLineEdit *>()->text(), QString("neworval"));
         QCOMPARE(tip(), I18n::login(7));
-        QCOMPARE(tipColour(), QString("black"));
         enterPin("4711");
         QCOMPARE(tip(), I18n::login(9));
         checkStartedOver();
@@ -150,7 +143,6 @@ private slots:
 
     void pinBox()
     {
-        LogCapture log;
         PinLineEdit *box = boxes().at(1);
         box->setFocus();
         QTest::keyClick(box, 'a');
@@ -158,12 +150,9 @@ private slots:
         press('1');
         press('2');
         QCOMPARE(box->digit(), QString("2"));
-        QTRY_VERIFY(log.contains("PinLineEdit::showAsterisk,  mMapKey = 3"));
-        QVERIFY(log.contains("ManagerWidget::focusNextButton,  pinKey = 3"));
-        QCOMPARE(QApplication::focusWidget(), boxes().at(2));
+        QTRY_COMPARE(QApplication::focusWidget(), boxes().at(2));
         press(DEVICE_LEFT_KEY);
         press(DEVICE_CLEAR_KEY);
-        QVERIFY(log.contains("Clear is press!!"));
         QVERIFY(box->text().isEmpty() && box->digit().isEmpty());
         press(DEVICE_SELECT_KEY);
         KeyRobot robot(mForm->findChild<QPopUpForm *>());

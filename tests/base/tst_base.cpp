@@ -20,16 +20,6 @@ void TestBase::looksTextsUp_data()
     const auto row = [](const char *name, int table, int index, const char *text) {
         QTest::newRow(name) << table << index << QString::fromLatin1(text);
     };
-    row("last title", 0, 13, "Unknown User");
-    row("leading blanks", 2, 0, "    Message content");
-    row("trailing line break", 2, 10, "  Are you sure to logout your account:\n");
-    row("last label", 2, 29, "Please register on PC and try again later.\n");
-    row("quotes inside", 5, 10,
-        "You have do some incorrect operations, please press \"Return\" to authorize your account "
-        "again!");
-    row("long text", 6, 2,
-        "Account Manager can simplify your login process to Orvala. Please enter your local login "
-        "ID and protection code.");
     row("last login text", 6, 11,
         "This account is exist, please input correct password to authorize it.");
     row("no table 1", 1, 0, "Unkown");

@@ -1,5 +1,4 @@
 #include "common/keyrobot.h"
-#include "common/ui/maskedtext.h"
 #include "common/ui/qkeyboardinput.h"
 #include "network/systemconfig.h"
 #include "res/resources.h"
@@ -101,21 +100,6 @@ private slots:
         QCOMPARE(buttons.at(8)->text(), QStringLiteral("&&"));
     }
 
-    void focusLook()
-    {
-        QKeyBoard keyboard;
-        const auto buttons = keyboard.findChildren<QPushButton *>();
-        const auto marked = [&buttons](int index) {
-            return buttons.at(index)->styleSheet().contains(QLatin1String("Bg_Focus"));
-        };
-        QVERIFY(marked(0));
-        pressKey(&keyboard, DEVICE_LEFT_KEY);
-        QVERIFY(marked(11) && !marked(0));
-        QCOMPARE(buttons.at(0)->styleSheet(),
-                 QStringLiteral("outline-width: 0px; border-image: "
-                                "url(:/res/KeyBoard_Bg_Normal.png);border-width: 6px;"));
-    }
-
     void realKeyboard()
     {
         QKeyBoardInput input;
@@ -175,23 +159,6 @@ private slots:
         KeyRobot robot(&input);
         robot.press(9);
         QCOMPARE(input.text().size(), 10000);
-    }
-
-    void placesInAMaskedText()
-    {
-        MaskedText text;
-        text.setMasked(true);
-        text.replace(0, 0, emoji() + QStringLiteral("xy"));
-        QCOMPARE(text.shown(), QStringLiteral("**y"));
-        QCOMPARE(text.placeInText(1), emoji().size());
-        QCOMPARE(text.placeShown(emoji().size() + 1), 2);
-        QCOMPARE(text.placeInText(99), text.text().size());
-        QCOMPARE(text.previous(emoji().size()), 0);
-        QCOMPARE(text.replace(5, -3, QString()), 5); // a bad range takes nothing away
-        text.replace(text.text().size(), 99, emoji());
-        QCOMPARE(text.shown(), QStringLiteral("***") + emoji());
-        text.hideLast();
-        QCOMPARE(text.shown(), QStringLiteral("****"));
     }
 };
 

@@ -71,39 +71,6 @@ private slots:
         for (const char *text : {":)", ":(", ":D", "www.", ".com"})
             QVERIFY2(texts.contains(QString::fromLatin1(text)), text);
     }
-
-    void keysOfEveryPage()
-    {
-        for (int i = 0; i < kPageCount; ++i) {
-            const auto page = KeyboardPage(i);
-            QSet<QString> labels;
-            for (int key = 0; key < kKeyCount; ++key) {
-                const bool isPicture = key >= CursorLeftKey && key <= NewLineKey;
-                QCOMPARE(keyLabel(page, key).isEmpty(), isPicture);
-                labels << keyLabel(page, key);
-            }
-            QCOMPARE(labels.size(), 50); // none twice, six without a label
-            QCOMPARE(keyLabel(page, 9), QStringLiteral("1"));
-            QCOMPARE(keyLabel(page, 33), QStringLiteral("8"));
-            QCOMPARE(keyLabel(page, 45), QStringLiteral("0"));
-            QCOMPARE(keyText(page, DeleteKey), QString());
-            QCOMPARE(keyText(page, LettersKey), QString());
-            QCOMPARE(keyText(page, SpaceKey), QStringLiteral(" "));
-        }
-    }
-
-    void turningPages()
-    {
-        QCOMPARE(turnedPage(KeyboardPage::Small, -1), KeyboardPage::CapitalAccents);
-        QCOMPARE(turnedPage(KeyboardPage::CapitalAccents, 1), KeyboardPage::Small);
-        QCOMPARE(otherOfPair(KeyboardPage::Capital), KeyboardPage::Small);
-        QCOMPARE(pageAfterKey(KeyboardPage::Small, LettersKey), KeyboardPage::Capital);
-        QCOMPARE(pageAfterKey(KeyboardPage::Smileys, LettersKey), KeyboardPage::Small);
-        QCOMPARE(pageAfterKey(KeyboardPage::Capital, SymbolsKey), KeyboardPage::Symbols);
-        QCOMPARE(pageAfterKey(KeyboardPage::Symbols, SymbolsKey), KeyboardPage::Smileys);
-        QCOMPARE(pageAfterKey(KeyboardPage::Smileys, SymbolsKey), KeyboardPage::Symbols);
-        QCOMPARE(pageAfterKey(KeyboardPage::Small, AccentsKey), KeyboardPage::SmallAccents);
-    }
 };
 
 QTEST_APPLESS_MAIN(tst_KeyboardLayout)

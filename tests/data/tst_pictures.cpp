@@ -91,10 +91,7 @@ private slots:
     void refusesWhatIsNoPicture()
     {
         QFETCH(QByteArray, data);
-        LogCapture log;
         QVERIFY(!decode(data));
-        QVERIFY(log.contains(data.isEmpty() ? "invalid parameter in createPhot"
-                                            : "Failed to decode photo data in createPhot"));
     }
 
     void showsWhatThereIs()

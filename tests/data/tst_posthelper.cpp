@@ -2,10 +2,10 @@
 #include "data/mediauploader.h"
 #include "data/posthelper.h"
 #include "data/testconfig.h"
+#include "data/testpictures.h"
 #include "support/logcapture.h"
 #include "support/misbehavingserver.h"
 
-#include <QImage>
 #include <QTimer>
 #include <QtTest>
 
@@ -25,8 +25,6 @@ class TestPostHelper : public QObject
 private slots:
     void init();
     void cleanup();
-    void escapes_data();
-    void escapes();
     void postsAComment();
     void postsATag();
     void deletes();
@@ -68,35 +66,20 @@ QString TestPostHelper::file(const QString &name, const QByteArray &bytes) const
     return file.fileName();
 }
 
-void TestPostHelper::escapes_data()
-{
-    QTest::addColumn<QString>("text");
-    QTest::addColumn<QString>("escaped");
-    QTest::newRow("all") << "a < b & \"c\" > 'd'"
-                         << "a &lt; b &amp; &quot;c&quot; &gt; 'd'";
-    QTest::newRow("escaped already") << "a &amp; b &lt;"
-                                     << "a &amp; b &amp;lt;";
-}
-
-void TestPostHelper::escapes()
-{
-    QFETCH(QString, text);
-    QTEST(PostHelper::escapeXml(text), "escaped");
-}
-
 void TestPostHelper::postsAComment()
 {
     mServer->enqueue(MisbehavingServer::answer("  " + kEntry));
-    QString comment = QString::fromUtf8("caf\u00e9 <3 %1 \u20ac \U0001f600\x01");
+    QString comment = QString::fromUtf8("caf\u00e9 <3 &amp; %1 \u20ac \U0001f600\x01");
     QCOMPARE(PostHelper::addComment("me", "a b", "7", comment), NET_SUCCESS);
     QCOMPARE(comment.mid(0, 9), QString::fromUtf8("caf\u00e9 &lt;"));
     QCOMPARE(last().method, QByteArray("POST"));
     QCOMPARE(last().path, QByteArray("/data/feed/api/user/me/albumid/a%20b/photoid/7"
                                      "?access_token=to%2Fk%26n&alt=json"));
     QCOMPARE(last().headers.value("content-type"), QByteArray("application/atom+xml"));
-    QCOMPARE(last().body, QByteArray("<entry xmlns='http://www.w3.org/2005/Atom'>  "
-                                     "<content>caf\xe9 &lt;3 %1 &#8364; &#128512;</content>  ") +
-                              kCategory + "comment\"/></entry>");
+    QCOMPARE(last().body,
+             QByteArray("<entry xmlns='http://www.w3.org/2005/Atom'>  "
+                        "<content>caf\xe9 &lt;3 &amp; %1 &#8364; &#128512;</content>  ") +
+                 kCategory + "comment\"/></entry>");
 }
 
 void TestPostHelper::postsATag()
@@ -129,25 +112,19 @@ void TestPostHelper::judgesAnswers_data()
 {
     QTest::addColumn<MisbehavingServer::Behaviour>("behaviour");
     QTest::addColumn<int>("code");
-    QTest::addColumn<QString>("line");
-    const QString rejected = "Error: operation rejected by server!";
-    QTest::newRow("a page") << MisbehavingServer::html() << int(NET_REJECTED) << rejected;
-    QTest::newRow("nothing") << MisbehavingServer::answer("") << int(NET_REJECTED)
-                             << "Error occurs when readData";
-    QTest::newRow("forbidden") << MisbehavingServer::answer(kEntry, 403) << int(NET_CONTENT_ERROR)
-                               << "Network Error!";
-    QTest::newRow("gone") << MisbehavingServer::reset() << int(NET_FAILED) << "Network Error!";
+    QTest::newRow("a page") << MisbehavingServer::html() << int(NET_REJECTED);
+    QTest::newRow("nothing") << MisbehavingServer::answer("") << int(NET_REJECTED);
+    QTest::newRow("forbidden") << MisbehavingServer::answer(kEntry, 403) << int(NET_CONTENT_ERROR);
+    QTest::newRow("gone") << MisbehavingServer::reset() << int(NET_FAILED);
 }
 
 void TestPostHelper::judgesAnswers()
 {
     QFETCH(MisbehavingServer::Behaviour, behaviour);
-    QFETCH(QString, line);
     mServer->enqueue(behaviour);
     mServer->enqueue(behaviour); // the toolkit may try a lost request again
     QString comment = "x";
     QTEST(int(PostHelper::addComment("me", "a", "7", comment)), "code");
-    QVERIFY(LogCapture::contains(line));
 }
 
 void TestPostHelper::canBeCanceled()
@@ -165,13 +142,8 @@ void TestPostHelper::canBeCanceled()
 
 void TestPostHelper::uploadsAPhoto()
 {
-    const QString path = mFolder.filePath("p.png");
-    QImage picture(3, 2, QImage::Format_RGB32);
-    picture.fill(Qt::red);
-    QVERIFY(picture.save(path));
-    QFile stored(path);
-    QVERIFY(stored.open(QIODevice::ReadOnly));
-    const QByteArray bytes = stored.readAll();
+    const QByteArray bytes = encoded(plain(3, 2), "PNG");
+    const QString path = file("p.png", bytes);
 
     mServer->enqueue(MisbehavingServer::answer(kEntry));
     QCOMPARE(MediaUploader::startToUpload(path, "Sea", "me", "a1", "By day", false), NET_SUCCESS);
@@ -197,7 +169,6 @@ void TestPostHelper::refusesFiles()
     QCOMPARE(upload("anything", true), ErrorCode(MediaUploader::Busy));
     QCOMPARE(upload(file("text.jpg", "no picture"), false), ErrorCode(MediaUploader::NotAnImage));
     QCOMPARE(upload(file("empty.png", ""), false), ErrorCode(MediaUploader::NotAnImage));
-    QVERIFY(LogCapture::contains("MediaUploader::MediaUploader image is null!"));
     QVERIFY(mServer->requests().isEmpty());
 }
 

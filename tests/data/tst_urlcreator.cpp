@@ -1,6 +1,5 @@
 #include "accountmanager/accountmanagerhelper.h"
 #include "data/urlcreator.h"
-#include "support/logcapture.h"
 #include "testconfig.h"
 
 #include <QtTest>
@@ -55,18 +54,10 @@ private slots:
 
     void refusesIncompleteRequests()
     {
-        const QString start = "Invalid parameters in UrlCreator::getUrlOf";
-        const QMap<int, QString> lines = {
-            {-1, "Error: Unknow Type!"},       {0, "Invalid Type!"},
-            {2, start + "AlbumsList"},         {3, start + "AlbumPhotosList!"},
-            {5, start + "PhotoCommentsList!"}, {6, start + "PhotoTagsList!"},
-            {7, start + "FavoritePeopleList"}, {9, "Error: Unknow Type!"}};
-        for (auto line = lines.begin(); line != lines.end(); ++line) {
-            LogCapture log;
+        for (int type : {-1, 0, 2, 3, 5, 6, 7, 9}) {
             PackageProperty property;
-            property.mType = line.key();
+            property.mType = type;
             QCOMPARE(UrlCreator::getUrl(property), QString());
-            QCOMPARE(log.lines(), QStringList(*line));
         }
     }
 

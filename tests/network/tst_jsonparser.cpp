@@ -17,9 +17,6 @@ const char *__lsan_default_suppressions()
 // A script engine's own parser is the judge: of what is accepted, and of the tree.
 namespace {
 
-const QString emptyLine = "ERROR : canver Array fail, the QVariantList is Empty !";
-const QString skipLine = "-Skip! This is a QScriptValue lenght";
-
 struct Outcome
 {
     bool isAccepted = false;
@@ -195,11 +192,8 @@ private slots:
     void refusesWhatTheLanguageRefuses()
     {
         QFETCH(QByteArray, text);
-        LogCapture log;
+        QVERIFY(!parse(text).isAccepted);
         QVERIFY(JsonParser::parse(text).isEmpty());
-        QCOMPARE(LogCapture::lines(),
-                 QStringList("uncaught exception at line0:SyntaxError: Unable to "
-                             "parse JSON string"));
     }
 
     void repairsBytesThatAreNoText()
@@ -230,14 +224,8 @@ private slots:
         QVERIFY(JsonParser::parse(QByteArray("[").repeated(1000000)).isEmpty());
     }
 
-    void logsWhatTheWalkersMeet()
+    void arraysAreFlattened()
     {
-        LogCapture log;
-        const JsonObject tree = JsonParser::parse(QString("{\"a\":[1,[2,[]],{\"b\":[]}]}"));
-        QCOMPARE(tree.value("a").toList().size(), 3);
-        QCOMPARE(LogCapture::lines(),
-                 QStringList({"JsonParser::parse engine.evaluate OK.", skipLine, emptyLine,
-                              skipLine, skipLine, emptyLine, skipLine}));
         const JsonObject top = JsonParser::parse(QString("[[1,[2]],\"x\"]"));
         QCOMPARE(top.value("0").toList(), QVariantList({1.0, 2.0}));
         QCOMPARE(top.value("length"), QVariant(2.0));

@@ -99,7 +99,6 @@ private slots:
         QCOMPARE(run("document.getElementById('a').value").toString(), QString());
         open(kForm);
         QCOMPARE(shown.size(), 1); // only the first time
-        QVERIFY(LogCapture::contains("{OAuthView::handleFinished} mWebElements is not empty..."));
     }
 
     void select()
@@ -161,9 +160,7 @@ private slots:
     void nothingToFocus()
     {
         for (const QString &address : {kLogin, kConsent, QString("http://127.0.0.1/other")}) {
-            LogCapture::lines().clear();
             open("", address);
-            QVERIFY(LogCapture::contains("ERROR: do not find any button can focus in this page."));
             for (int key : {DEVICE_DOWN_KEY, DEVICE_LEFT_KEY, DEVICE_SELECT_KEY})
                 press(key);
             mView->setEditedText("x");
@@ -182,7 +179,6 @@ private slots:
         QCOMPARE(focused(), QString("a"));
         run(panel.arg("<button type=submit id=go>"));
         mView->handleValidatePanel();
-        QVERIFY(LogCapture::contains("has find ValidatePanel"));
         QCOMPARE(walk(DEVICE_RIGHT_KEY, 3), QStringList({"digits", "pw", "go", "digits"}));
         press(Qt::Key_1, "1");
         QCOMPARE(run("document.getElementById('digits').value").toString(), QString());

@@ -135,7 +135,6 @@ private slots:
     void cleanup();
     void tellsOfBothEndsOfACable();
     void tellsOfEveryFlap();
-    void tellsOfTwoInterfacesAtOnce();
     void tellsOfInterfacesThatComeAndGo();
     void recoversFromLostNotices();
 };
@@ -190,18 +189,6 @@ void TestLinks::tellsOfEveryFlap()
     // The kernel may merge what the other end sees, but it ends where it began.
     QTRY_VERIFY(carriersOf("firstEnd").isEmpty() || carriersOf("firstEnd").last());
     QVERIFY(alternates(carriersOf("firstEnd")));
-}
-
-void TestLinks::tellsOfTwoInterfacesAtOnce()
-{
-    setUp("first", false);
-    setUp("second", false);
-    QTRY_COMPARE(carriersOf("first"), QList<bool>({false}));
-    QTRY_COMPARE(carriersOf("second"), QList<bool>({false}));
-    setUp("second", true);
-    setUp("first", true);
-    QTRY_COMPARE(carriersOf("first"), QList<bool>({false, true}));
-    QTRY_COMPARE(carriersOf("second"), QList<bool>({false, true}));
 }
 
 void TestLinks::tellsOfInterfacesThatComeAndGo()

@@ -8,7 +8,7 @@
 #include "data/packagemanager.h"
 #include "data/photomanager.h"
 #include "data/testconfig.h"
-#include "network/connection.h"
+#include "data/testpictures.h"
 #include "platform/devicestate.h"
 #include "support/logcapture.h"
 #include "support/misbehavingserver.h"
@@ -23,7 +23,6 @@
 #include "ui/searchwidget.h"
 #include "ui/upwidget.h"
 
-#include <QBuffer>
 #include <QKeyEvent>
 #include <QSignalSpy>
 #include <QtTest>
@@ -65,10 +64,7 @@ class TestHomeWidget : public QObject
 private slots:
     void init();
     void cleanup();
-    void startsWithFeaturedPhotos();
-    void featuredPhotosArePaged();
     void opensAlbumsAndGoesBack();
-    void opensPeopleAndGoesBack();
     void anEmptyListLeavesTheMenu();
     void aFailureCanBeRetried_data();
     void aFailureCanBeRetried();
@@ -112,7 +108,6 @@ void TestHomeWidget::init()
     mServer->on(kFeatured, answerFeatured);
     mServer->on(kMyAlbums, answer(sample::albums("me", 11)));
     mServer->on(kPeople, answer(sample::people(3)));
-    mServer->on("/data/feed/api/user/p2", answer(sample::albums("p2", 2)));
     mServer->on("/data/feed/api/user/me/albumid/a10", answer(sample::photos("Holiday", 1, 10, 0)));
 }
 
@@ -156,7 +151,7 @@ void TestHomeWidget::enterMenu(int entry)
 void TestHomeWidget::search(const QString &words)
 {
     enterMenu(UpWidget::SearchEntry);
-    press({DEVICE_SELECT_KEY});
+    press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY}); // nothing to search for yet: still the field
     QVERIFY(mHome->findChild<QPopUpForm *>());
     mHome->findChild<QPopUpForm *>()->handleInput(words);
     QTRY_VERIFY(!mHome->findChild<QPopUpForm *>());
@@ -172,43 +167,6 @@ QStringList TestHomeWidget::captions() const
             shown << cell->caption();
     }
     return shown;
-}
-
-void TestHomeWidget::startsWithFeaturedPhotos()
-{
-    open();
-    QVERIFY(mHome->isLoading());
-    QTRY_VERIFY(isReady());
-    QCOMPARE(captions().size(), 8);
-    QCOMPARE(captions().first(), QString("Photo 1"));
-    QVERIFY(grid()->content()->cell(0)->hasFocus());
-    QVERIFY(bars()->information().contains("<b>Featured Photos</b>1/20<"));
-    press({DEVICE_DOWN_KEY, DEVICE_RIGHT_KEY});
-    QVERIFY(bars()->information().contains("6/20"));
-    QVERIFY(isHomeMenu);
-    QVERIFY(bars()->isKeyShown(DEVICE_PAGEDOWN_KEY));
-    QVERIFY(!bars()->isKeyShown(DEVICE_PAGEUP_KEY));
-}
-
-void TestHomeWidget::featuredPhotosArePaged()
-{
-    open();
-    QTRY_VERIFY(isReady());
-    press({DEVICE_PAGEUP_KEY});
-    QCOMPARE(mHome->startIndex(), 1);
-    press({DEVICE_RIGHT_KEY, DEVICE_PAGEDOWN_KEY});
-    QTRY_VERIFY(isReady());
-    QCOMPARE(captions().first(), QString("Photo 9"));
-    QCOMPARE(focused(), 0);
-    press({DEVICE_PAGEDOWN_KEY});
-    QTRY_VERIFY(isReady());
-    QCOMPARE(captions(), QStringList({"Photo 17", "Photo 18", "Photo 19", "Photo 20"}));
-    press({DEVICE_PAGEDOWN_KEY});
-    QCOMPARE(mHome->startIndex(), 17);
-    press({DEVICE_LEFT_KEY});
-    QTRY_VERIFY(isReady());
-    QCOMPARE(captions().first(), QString("Photo 9"));
-    QCOMPARE(focused(), 7);
 }
 
 void TestHomeWidget::opensAlbumsAndGoesBack()
@@ -233,23 +191,6 @@ void TestHomeWidget::opensAlbumsAndGoesBack()
     QCOMPARE(mHome->packageType(), int(TYPE_ALBUM_LIST));
     QCOMPARE(captions().value(focused()), QString("Album 10\n10 photos"));
     QVERIFY(grid()->content()->cell(1)->hasFocus());
-}
-
-void TestHomeWidget::opensPeopleAndGoesBack()
-{
-    open();
-    QTRY_VERIFY(isReady());
-    enterMenu(UpWidget::FavoritesEntry);
-    QTRY_VERIFY(isReady());
-    press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY});
-    QTRY_VERIFY(isReady());
-    QCOMPARE(HomeWidget::mFavoritePeopleName, QString("Person 2"));
-    QVERIFY(!HomeWidget::mIsSelfPhoto);
-    QCOMPARE(captions().size(), 2);
-    press({DEVICE_RETURN_KEY});
-    QTRY_VERIFY(isReady());
-    QCOMPARE(mHome->packageType(), int(TYPE_FAVORITE_PEOPLE));
-    QCOMPARE(focused(), 1);
     press({DEVICE_RETURN_KEY}); // nothing above
     QVERIFY(mHome->findChild<QConfirm *>());
     press({DEVICE_RETURN_KEY});
@@ -364,13 +305,7 @@ void TestHomeWidget::theCacheMayLetGo()
 
 void TestHomeWidget::thumbnailsAreShownUndistorted()
 {
-    QImage portrait(30, 60, QImage::Format_RGB32);
-    portrait.fill(Qt::red);
-    QByteArray bytes;
-    QBuffer buffer(&bytes);
-    buffer.open(QIODevice::WriteOnly);
-    portrait.save(&buffer, "PNG");
-    mServer->on("/portrait.png", answer(bytes));
+    mServer->on("/portrait.png", answer(encoded(plain(30, 60), "PNG")));
     mServer->on(kFeatured,
                 answer(sample::feed({sample::photo("Tall", mServer->url("/portrait.png"))}, 1)));
     open();
@@ -506,8 +441,6 @@ void TestHomeWidget::signsOutOnlyWhenConfirmed()
     enterMenu(UpWidget::SignOutEntry);
     QVERIFY(mHome->findChild<QConfirm *>());
     press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY});
-    QCOMPARE(menu()->selectedIndex(), int(UpWidget::HomeEntry));
-    QVERIFY(menu()->hasFocus());
     QVERIFY(left.isEmpty());
     press({DEVICE_RETURN_KEY, DEVICE_SELECT_KEY});
     QCOMPARE(left.size(), 1);

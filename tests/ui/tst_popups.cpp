@@ -193,7 +193,6 @@ void TestPopups::deletesAComment()
     press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY}); // No
     QCOMPARE(count("DELETE"), 0);
     press({DEVICE_SELECT_KEY, DEVICE_SELECT_KEY}); // Yes
-    QCOMPARE(mServer->requests().value(mServer->requests().size() - 1).method.isEmpty(), false);
     QCOMPARE(count("DELETE"), 1);
     QTRY_COMPARE(toast(), ScreenTexts::question(isTaken ? ScreenTexts::CommentDeleted
                                                         : ScreenTexts::CommentNotDeleted));

@@ -127,9 +127,6 @@ void TestSlidePicture::slowMachinesAreSpared()
 void TestSlidePicture::optionsStayInRange()
 {
     TestConfig config;
-    const SlideOptions plain = SlideOptions::configured();
-    QVERIFY(plain.fade == 0 && plain.motion == 0 && plain.ahead == 1 && !plain.blurredFill);
-    QVERIFY(!plain.loop && !plain.keysWhileLoading && plain.clock == SlideCorner::None);
     config.write("[SlideShow]\nFade=99999999\nMotion=-3\nAhead=0\nClock=Top Right\n"
                  "Caption=bottomLEFT\nLoop=TRUE\nMarksSeconds=soon\n");
     const SlideOptions odd = SlideOptions::configured();
