@@ -173,7 +173,7 @@ std::vector<std::int64_t> searchPhotos(Session &session, const std::string &expr
 {
     return numbersOf(Query(session,
                            "SELECT rowid FROM photoSearch WHERE photoSearch MATCH ? "
-                           "ORDER BY rank, rowid DESC LIMIT ? OFFSET ?",
+                           "ORDER BY rowid DESC LIMIT ? OFFSET ?",
                            expression, page.count, page.start - 1));
 }
 

@@ -30,7 +30,6 @@ std::vector<PhotoRecord> photosWithIds(Session &session, const std::vector<std::
 // text without a word.
 std::string searchExpression(const std::string &text);
 std::int64_t searchCount(Session &session, const std::string &expression);
-// The best fits first: a title counts most, then tags, album, caption, person and date.
 std::vector<std::int64_t> searchPhotos(Session &session, const std::string &expression,
                                        const Page &page);
 

@@ -1,7 +1,6 @@
 #include "index/schema.h"
 
 #include "index/database.h"
-#include "index/photosearch.h"
 
 namespace {
 
@@ -110,22 +109,7 @@ CREATE INDEX showablePhotos ON photos (album, published, key, present, error)
     WHERE present = 1 AND error = '';
 )sql";
 
-// Search by person and date as well; refilled by the caller.
-const char widerSearch[] = R"sql(
-CREATE TABLE months (number TEXT PRIMARY KEY, name TEXT NOT NULL) WITHOUT ROWID;
-INSERT INTO months VALUES ('01', 'January'), ('02', 'February'), ('03', 'March'), ('04', 'April'),
-    ('05', 'May'), ('06', 'June'), ('07', 'July'), ('08', 'August'), ('09', 'September'),
-    ('10', 'October'), ('11', 'November'), ('12', 'December');
-DROP TABLE photoSearch;
-CREATE VIRTUAL TABLE photoSearch USING fts5 (
-    title, caption, tags, album, person, date,
-    tokenize = "unicode61 remove_diacritics 2", prefix = '2 3'
-);
-INSERT INTO photoSearch (photoSearch, rank) VALUES ('rank', 'bm25(10, 4, 8, 5, 3, 2)');
-)sql";
-
-const char *const steps[] = {firstVersion, givenTexts, featuredMemory, widerSearch};
-constexpr int searchVersion = 4; // the last step that changed the search texts
+const char *const steps[] = {firstVersion, givenTexts, featuredMemory};
 constexpr int newestVersion = sizeof steps / sizeof steps[0];
 
 } // namespace
@@ -140,8 +124,6 @@ bool upgradeSchema(Session &session, std::string *error)
     }
     for (int step = version; step < newestVersion; ++step)
         database.exec(steps[step]);
-    if (version < searchVersion)
-        refreshAllSearch(session);
     if (version < newestVersion)
         database.exec("PRAGMA user_version = " + std::to_string(newestVersion));
     return true;

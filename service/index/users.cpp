@@ -1,7 +1,6 @@
 #include "index/users.h"
 
 #include "index/database.h"
-#include "index/photosearch.h"
 #include "index/revisions.h"
 
 namespace {
@@ -42,7 +41,6 @@ std::optional<UserRecord> userWithMail(Session &session, const std::string &mail
 
 std::int64_t saveUser(Session &writer, const UserRecord &user)
 {
-    const auto before = userWithMail(writer, user.mail);
     Query(writer,
           "INSERT INTO users (mail, name, photos) VALUES (?1, ?2, ?3) "
           "ON CONFLICT (mail) DO UPDATE SET name = ?2, "
@@ -50,10 +48,7 @@ std::int64_t saveUser(Session &writer, const UserRecord &user)
           user.mail, user.name, user.photos)
         .run();
     raiseRevision(writer, Revision::Users);
-    const std::int64_t id = userWithMail(writer, user.mail)->id;
-    if (before && before->name != user.name)
-        refreshUserSearch(writer, id);
-    return id;
+    return userWithMail(writer, user.mail)->id;
 }
 
 std::int64_t saveUser(Database &database, const UserRecord &user)

@@ -29,8 +29,8 @@ public:
     static Package *getPackage(PackageProperty &property);
     // True when a request for this list is running afterwards; false calls nothing.
     static bool downloadPage(PackageProperty &property, Callback callback);
-    // Whether the page that failed last was refused because the sign-in has expired; for a call-back
-    // to ask.
+    // Whether the page that failed last was refused because the sign-in has expired; for a
+    // call-back to ask.
     static bool isSignInRefused() { return mIsSignInRefused; }
     static void prepareNextDatas(PackageProperty property, int startIndex);
 

@@ -68,8 +68,8 @@ public:
     // Code of the last request, for the owner to ask after its end.
     ErrorCode errorCode() const { return mErrorCode; }
 
-    // Whether the last GET failed because the server wants another sign-in (status 401), which has no
-    // code of its own.
+    // Whether the last GET failed because the server wants another sign-in (status 401), which has
+    // no code of its own.
     bool isSignInRefused() const { return mIsSignInRefused; }
 
     // Synchronous requests: block until the answer is complete, the time-out expires or the program

@@ -207,9 +207,11 @@ void SlideLabel::paintPicture(QPainter &painter)
 
 void SlideLabel::paintPlaceholder(QPainter &painter) const
 {
-    const QPixmap picture = loadPicture(mPlaceholder);
-    const QSize size = (QSizeF(picture.size()) / picture.devicePixelRatioF()).toSize();
     painter.fillRect(rect(), Qt::black);
+    const QPixmap picture = loadPicture(mPlaceholder);
+    if (picture.isNull())
+        return;
+    const QSize size = (QSizeF(picture.size()) / picture.devicePixelRatioF()).toSize();
     painter.drawPixmap(slidemotion::centred(size, this->size()), picture);
 }
 

@@ -41,7 +41,8 @@ SlidePhotos::SlidePhotos(SlideLabel *label, const SlideOptions &options, QObject
 SlidePhotos::~SlidePhotos()
 {
     clear();
-    mInstance = nullptr;
+    if (mInstance == this)
+        mInstance = nullptr;
 }
 
 void SlidePhotos::show(const QString &url, const QString &thumbnailUrl, SlideLabel::Change change)

@@ -10,8 +10,8 @@
 
 namespace {
 
-constexpr int kBlurredWidth = 32;      // pixels across the screen that are left of the photo
-constexpr int kSmoothWidth = 256;      // and after the first step back to the screen's size
+constexpr int kBlurredWidth = 20;      // pixels across the screen that are left of the photo
+constexpr int kDoublings = 4;          // steps back: each smooths, so that no pixel can be made out
 constexpr int kDarkening = 110;        // of 255, under white texts
 constexpr int kThinnestBand = 4;       // pixels; what is less stays black
 constexpr QRgb kNight = qRgb(0, 0, 0); // beside photos without a fill
@@ -31,10 +31,9 @@ QImage outOfFocus(const QPixmap &photo, const QSize &screen)
     const QImage part = photo.copy(middlePart(photo.size(), screen)).toImage();
     const QImage rough = part.scaled(few * 4, Qt::IgnoreAspectRatio, Qt::FastTransformation)
                              .scaled(few, Qt::IgnoreAspectRatio, Qt::SmoothTransformation);
-    QImage smooth = rough
-                        .scaled(few * (kSmoothWidth / kBlurredWidth), Qt::IgnoreAspectRatio,
-                                Qt::SmoothTransformation)
-                        .convertToFormat(QImage::Format_RGB32);
+    QImage smooth = rough.convertToFormat(QImage::Format_RGB32);
+    for (int i = 0; i < kDoublings; ++i)
+        smooth = smooth.scaled(smooth.size() * 2, Qt::IgnoreAspectRatio, Qt::SmoothTransformation);
     QPainter(&smooth).fillRect(smooth.rect(), QColor(0, 0, 0, kDarkening));
     return smooth;
 }

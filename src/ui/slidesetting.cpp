@@ -102,6 +102,9 @@ QPushButton *SlideSetting::makeButton(const QString &text)
     font.setPointSize(SystemConfig::buttonFont());
     button->setFont(font);
     button->setFixedSize(kButtonSize);
+    QPalette palette = button->palette();
+    palette.setColor(QPalette::ButtonText, QColor(0xf2, 0xf6, 0xf9));
+    button->setPalette(palette);
     button->setStyleSheet(
         QStringLiteral("QPushButton {border-image: url(:/res/Button_Normal.png); outline-width: "
                        "0px; border-width: 6px;}QPushButton:focus {border-image: "

@@ -210,7 +210,7 @@ void TestEndToEnd::staysUsableBehindABadRelay_data()
     QTest::newRow("cut body") << MisbehavingServer::cut("{\"feed\":{\"entry\":[{", 5000)
                               << int(ScreenTexts::PageFailed);
     QTest::newRow("HTML") << MisbehavingServer::html() << -1;
-    QTest::newRow("401") << MisbehavingServer::answer("{}", 401) << int(ScreenTexts::PageFailed);
+    QTest::newRow("401") << MisbehavingServer::answer("{}", 401) << int(ScreenTexts::PageRefused);
     QTest::newRow("500") << MisbehavingServer::answer("oops", 500) << int(ScreenTexts::PageFailed);
     QTest::newRow("silence") << MisbehavingServer::silence() << int(ScreenTexts::PageTooSlow);
 }
@@ -233,6 +233,9 @@ void TestEndToEnd::staysUsableBehindABadRelay()
     QTRY_VERIFY(!mTv->isLoading());
     QVERIFY(mTv->captions().isEmpty());
     QCOMPARE(mTv->failure(), failure < 0 ? QString() : ScreenTexts::failure(failure));
+
+    if (failure == ScreenTexts::PageRefused)
+        mTv->press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY}); // no, not to the accounts
 
     // The menu leads to what can be had, ...
     enter(UpWidget::HomeEntry);

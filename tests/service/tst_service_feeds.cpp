@@ -294,18 +294,3 @@ TEST_F(Feeds, aBurstIsThinned)
     const auto isBurst = [](const std::string &title) { return std::isdigit(title[0]) != 0; };
     EXPECT_EQ(std::count_if(titles.begin(), titles.begin() + 5, isBurst), 1);
 }
-
-TEST_F(Feeds, theSearchKnowsPeopleAndDatesAndRanks)
-{
-    const auto found = [&](const std::string &words) {
-        return titlesOf(publicFeed(std::string(base) + "/all?q=" + words));
-    };
-    EXPECT_EQ(found("ben"), Titles{"portrait"});
-    addUser("ben@orvala.example", "Benedict", "ben");
-    EXPECT_EQ(found("benedict"), Titles{"portrait"});
-    EXPECT_EQ(found("mar%202012"), Titles{"one"});
-    EXPECT_EQ(found("2013-03-01"), Titles{"two"});
-    addPhoto("Winter/dog.jpg");
-    scan();
-    EXPECT_EQ(found("dog"), (Titles{"dog", "one"})); // a title before a caption
-}

