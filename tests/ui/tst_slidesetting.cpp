@@ -1,14 +1,11 @@
-#include "common/ui/remotekeys.h"
-#include "data/testconfig.h"
+#include "ui/screencase.h"
 #include "ui/settingitem.h"
 #include "ui/slidesetting.h"
 
-#include <QKeyEvent>
 #include <QPushButton>
-#include <QtTest>
 
 // The panel by key presses.
-class TestSlideSetting : public QObject
+class TestSlideSetting : public ScreenCase
 {
     Q_OBJECT
 
@@ -19,12 +16,6 @@ private slots:
     void valuesStopAtTheirEnds();
 
 private:
-    void press(std::initializer_list<int> keys)
-    {
-        for (int key : keys)
-            QTest::sendKeyEvent(QTest::Press, QApplication::focusWidget(), Qt::Key(key), QString(),
-                                {});
-    }
     SettingItem *row(int index) const { return mPanel->findChildren<SettingItem *>().at(index); }
     QString focused() const
     {
@@ -33,7 +24,6 @@ private:
         return QApplication::focusWidget() == row(0) ? "mode" : "speed";
     }
 
-    TestConfig mConfig;
     std::unique_ptr<SlideSetting> mPanel;
 };
 
@@ -42,9 +32,7 @@ void TestSlideSetting::init()
     SlideSetting::SlideMode = 0;
     SlideSetting::SlideSpeed = 6;
     mPanel = std::make_unique<SlideSetting>();
-    mPanel->resize(1280, 720);
-    mPanel->show();
-    QVERIFY(QTest::qWaitForWindowActive(mPanel.get()));
+    show(mPanel.get());
     mPanel->load();
 }
 
