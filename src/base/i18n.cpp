@@ -1,16 +1,16 @@
 #include "base/i18n.h"
 
-#include <QVector>
+#include "base/texttable.h"
 
 namespace {
 
-const QVector<const char *> mTitleString = {
+const TextTable mTitleString = {
     "Home",       "My Photos",   "Search",        "Tags List",    "Add New Tag",
     "Delete tag", "Add Comment", "Comments List", "Logout",       "Input text",
     "Favorites",  "Error",       "Notification",  "Unknown User",
 };
 
-const QVector<const char *> mLabelString = {
+const TextTable mLabelString = {
     "    Message content",
     "Sign out",
     "Photo Name",
@@ -43,16 +43,16 @@ const QVector<const char *> mLabelString = {
     "Please register on PC and try again later.\n",
 };
 
-const QVector<const char *> mShortCutString = {
+const TextTable mShortCutString = {
     "Page Up", "Page Down", "Return",     "Expand",    "Input Options", "ABC",     "OK",
     "Goto",    "Next",      "Slide Show", "Main Menu", "Pause",         "Setting", "Prev",
 };
 
-const QVector<const char *> mButtonString = {
+const TextTable mButtonString = {
     "Yes", "No", "Send", "Next", "Cancel", "Close", "OK", "Return", "New", "Exit", "Delete",
 };
 
-const QVector<const char *> mPromptString = {
+const TextTable mPromptString = {
     "Error: Authorization Failed",
     "Authorization Failed by some reason, it will exit App.",
     "Login, please wait...",
@@ -72,7 +72,7 @@ const QVector<const char *> mPromptString = {
     "No Photo Available!",
 };
 
-const QVector<const char *> mLoginString = {
+const TextTable mLoginString = {
     "Orvala Login",
     "Account manager",
     "Account Manager can simplify your login process to Orvala. Please enter your local login ID "
@@ -89,7 +89,7 @@ const QVector<const char *> mLoginString = {
     "This account is exist, please input correct password to authorize it.",
 };
 
-const QVector<const char *> *tableOf(int table)
+const TextTable *tableOf(int table)
 {
     switch (table) {
     case I18n::TitleTable:
@@ -111,12 +111,16 @@ const QVector<const char *> *tableOf(int table)
 
 } // namespace
 
+QString textAt(const TextTable *table, int index)
+{
+    if (!table)
+        return QStringLiteral("Unkown");
+    if (index < 0 || index >= table->size())
+        return QStringLiteral("Unknown");
+    return QString::fromLatin1(table->at(index));
+}
+
 QString I18n::text(int table, int index)
 {
-    const QVector<const char *> *entries = tableOf(table);
-    if (!entries)
-        return QStringLiteral("Unkown");
-    if (index < 0 || index >= entries->size())
-        return QStringLiteral("Unknown");
-    return QString::fromLatin1(entries->at(index));
+    return textAt(tableOf(table), index);
 }

@@ -1,10 +1,10 @@
 #include "ui/screentexts.h"
 
-#include <QVector>
+#include "base/texttable.h"
 
 namespace {
 
-const QVector<const char *> mFailureString = {
+const TextTable mFailureString = {
     "Something went wrong while this page was loading.",
     "The album service has no such page, or does not let you see it.",
     "The album service takes too long to answer.",
@@ -13,12 +13,12 @@ const QVector<const char *> mFailureString = {
     "Press Select to try again, or Return to go back.",
 };
 
-const QVector<const char *> mHintString = {
+const TextTable mHintString = {
     "Open",
     "Try again",
 };
 
-const QVector<const char *> mQuestionString = {
+const TextTable mQuestionString = {
     "Do you want to sign in again?",
     "The sign-in has expired, or the album service no longer accepts it.",
     "Delete comment",
@@ -29,7 +29,7 @@ const QVector<const char *> mQuestionString = {
     "One moment, please...",
 };
 
-const QVector<const char *> *tableOf(int table)
+const TextTable *tableOf(int table)
 {
     switch (table) {
     case ScreenTexts::FailureTable:
@@ -47,10 +47,5 @@ const QVector<const char *> *tableOf(int table)
 
 QString ScreenTexts::text(int table, int index)
 {
-    const QVector<const char *> *entries = tableOf(table);
-    if (!entries)
-        return QStringLiteral("Unkown");
-    if (index < 0 || index >= entries->size())
-        return QStringLiteral("Unknown");
-    return QString::fromLatin1(entries->at(index));
+    return textAt(tableOf(table), index);
 }
