@@ -50,6 +50,7 @@ void DetailStage::showPreview(const QPixmap &thumbnail, const QSize &photo)
     mPhotoSize = photo;
     mIsPreview = true;
     mIsWaiting = true;
+    mHasFailed = false;
     setMessage(QString());
     setBusy(true);
     update();
@@ -97,13 +98,17 @@ QSize DetailStage::imageSize() const
 void DetailStage::setImage(const QPixmap &picture)
 {
     mPicture = picture;
-    setMessage(QString());
+    // A message about the list stays: only the one about a failed picture is out of date.
+    if (mHasFailed)
+        setMessage(QString());
+    mHasFailed = false;
     endWaiting();
 }
 
 void DetailStage::setPlaceholder(const QString &resource)
 {
     mPicture = loadPicture(resource);
+    mHasFailed = true;
     endWaiting();
 }
 

@@ -56,6 +56,7 @@ private:
     QSize mPhotoSize;
     QString mMessage;
     bool mIsWaiting = false;
+    bool mHasFailed = false; // the picture, in whose place the failed-image picture stands
     bool mIsPreview = false;
     bool mMarked = false;
     bool mHasPrevious = false;
