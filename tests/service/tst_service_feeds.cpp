@@ -220,7 +220,7 @@ TEST_F(Feeds, addressesFollowTheHostThatWasAsked)
     {
         const char *host;
         std::string origin;
-    } rows[] = {{"tv.home:8443", "http://tv.home:8443"},
+    } rows[] = {{"tv.example:8443", "http://tv.example:8443"},
                 {"[::1]:8443", "http://[::1]:8443"},
                 {"evil\"/x", local},
                 {"a b", local}};
