@@ -53,6 +53,7 @@ SlideOptions SlideOptions::configured()
     options.loop = isOn("Loop");
     options.wholeList = isOn("WholeList");
     options.skipUnreadable = isOn("SkipUnreadable");
+    options.returnToPhoto = isOn("ReturnToPhoto");
     options.keysWhileLoading = isOn("KeysWhileLoading");
     return options;
 }
