@@ -32,7 +32,8 @@ public:
     QString focus() const;
     int menuEntry() const;        // that has the focus; -1 when the menu has not
     QStringList accounts() const; // addresses, from above
-    HomeWidget *home() const;     // null before the sign-in
+    MainWidget *window() const { return mWindow.get(); }
+    HomeWidget *home() const; // null before the sign-in
     bool isLoading() const;
     QStringList captions() const; // of the cells on the screen
     // Every cell on the screen shows a picture whose middle has about the colour that the table has
