@@ -187,8 +187,8 @@ bool QImageSlide::holdsOn()
 {
     if (!mOptions.waitForPhoto || mIsHolding)
         return false;
-    const bool isPageAwaited = mIndex + 1 >= sliderecords::count() && mOptions.wholeList &&
-                               sliderecords::isMoreToCome();
+    const bool isPageAwaited =
+        mIndex + 1 >= sliderecords::count() && mOptions.wholeList && sliderecords::isMoreToCome();
     const QString next = urlAt(mIndex + 1);
     mIsHolding = isPageAwaited || !(next.isEmpty() || mPhotos->isSettled(next));
     if (mIsHolding)
