@@ -71,7 +71,7 @@ set(CPACK_DEBIAN_ORVALA-SERVICE_PACKAGE_NAME orvala-service)
 set(CPACK_DEBIAN_ORVALA-SERVICE_PACKAGE_SECTION web)
 set(CPACK_COMPONENT_ORVALA-SERVICE_DESCRIPTION
     "Album service of a home\n Serves folders of photos to the album browsers of the house over HTTPS.")
-set(CPACK_DEBIAN_ORVALA-SERVICE_PACKAGE_DEPENDS "adduser, init-system-helpers, tzdata")
+set(CPACK_DEBIAN_ORVALA-SERVICE_PACKAGE_DEPENDS "adduser, init-system-helpers, procps, tzdata")
 
 foreach(script postinst prerm postrm)
   list(APPEND CPACK_DEBIAN_ORVALA_PACKAGE_CONTROL_EXTRA
