@@ -118,6 +118,7 @@ int main(int argc, char *argv[])
 {
     prepareProcess();
     MainApplication application(argc, argv);
+    QApplication::setOverrideCursor(Qt::BlankCursor); // nothing here is pointed at
     applyScale();
     readScreenSize();
     initResources();
