@@ -11,6 +11,12 @@ namespace {
 constexpr std::size_t keyBytes = 16;
 constexpr std::int64_t nanoseconds = 1'000'000'000;
 
+struct AlbumPlace
+{
+    std::int64_t user;
+    std::int64_t album;
+};
+
 // The album's row, made or changed to the state.
 std::int64_t writeAlbum(Session &session, const FolderState &state)
 {
@@ -37,23 +43,25 @@ std::string timeOf(const FoundFile &file)
 }
 
 // A file that changed keeps its id, its key, its comments and what people tagged it with.
-std::int64_t writePhoto(Session &session, std::int64_t albumId, const FoundFile &file)
+std::int64_t writePhoto(Session &session, const AlbumPlace &place, const FoundFile &file)
 {
     const PhotoMetadata &metadata = file.metadata;
     Query(session,
           "INSERT INTO photos (album, name, key, size, changed, present, error, mimeType, width, "
-          "height, title, caption, published, latitude, longitude) "
-          "VALUES (?1, ?2, ?3, ?4, ?5, 1, ?6, ?7, ?8, ?9, ?10, ?11, ?12, ?13, ?14) "
+          "height, title, caption, published, latitude, longitude, user, added) "
+          "VALUES (?1, ?2, ?3, ?4, ?5, 1, ?6, ?7, ?8, ?9, ?10, ?11, ?12, ?13, ?14, ?15, ?16) "
           "ON CONFLICT (album, name) DO UPDATE SET size = ?4, changed = ?5, present = 1, "
           "error = ?6, mimeType = ?7, width = ?8, height = ?9, "
           "title = CASE givenTitle WHEN '' THEN ?10 ELSE givenTitle END, "
           "caption = CASE givenCaption WHEN '' THEN ?11 ELSE givenCaption END, "
           "published = ?12, latitude = ?13, longitude = ?14",
-          albumId, file.name, randomText(keyBytes), file.size, file.changed, file.error,
+          place.album, file.name, randomText(keyBytes), file.size, file.changed, file.error,
           metadata.mimeType, metadata.width, metadata.height, titleOf(file), metadata.caption,
-          timeOf(file), metadata.latitude, metadata.longitude)
+          timeOf(file), metadata.latitude, metadata.longitude, place.user,
+          file.added > 0 ? file.added : currentSeconds())
         .run();
-    Query query(session, "SELECT id FROM photos WHERE album = ? AND name = ?", albumId, file.name);
+    Query query(session, "SELECT id FROM photos WHERE album = ? AND name = ?", place.album,
+                file.name);
     return query.next() ? query.number(0) : 0;
 }
 
@@ -97,7 +105,7 @@ void writeFolder(Session &session, const FolderChanges &changes)
     const bool privacyChanged = isPrivacyChanged(session, changes.state);
     const std::int64_t albumId = writeAlbum(session, changes.state);
     for (const FoundFile &file : changes.found) {
-        const std::int64_t photoId = writePhoto(session, albumId, file);
+        const std::int64_t photoId = writePhoto(session, {changes.state.userId, albumId}, file);
         writeKeywords(session, photoId, file.metadata.keywords);
         refreshPhotoSearch(session, photoId);
     }
@@ -161,6 +169,14 @@ std::int64_t addPhoto(Database &database, const FolderState &state, const FoundF
     raiseRevision(writer, Revision::Photos);
     writer.commit();
     return photoId;
+}
+
+void markShown(Database &database, const std::set<std::int64_t> &photoIds)
+{
+    Database::Writer writer(database);
+    for (const std::int64_t id : photoIds)
+        Query(writer, "UPDATE photos SET shown = 1 WHERE id = ? AND shown = 0", id).run();
+    writer.commit();
 }
 
 void writeChanges(Database &database, const std::vector<FolderChanges> &changes)

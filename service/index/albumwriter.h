@@ -4,6 +4,7 @@
 #include "pictures/photometadata.h"
 
 #include <map>
+#include <set>
 #include <vector>
 
 class Database;
@@ -39,6 +40,7 @@ struct FoundFile
     std::int64_t changed = 0;
     PhotoMetadata metadata; // empty with an error
     std::string error;      // why the file is no photo; empty when it is one
+    std::int64_t added = 0; // when it came, in seconds since 1970; 0: now
 };
 
 // All that changed in one folder since the last scan.
@@ -64,6 +66,9 @@ struct GivenTexts
 };
 std::int64_t addPhoto(Database &database, const FolderState &state, const FoundFile &file,
                       const GivenTexts &texts);
+
+// These photos have been on a screen.
+void markShown(Database &database, const std::set<std::int64_t> &photoIds);
 
 // Writes the changes in one transaction.
 void writeChanges(Database &database, const std::vector<FolderChanges> &changes);

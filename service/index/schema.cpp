@@ -109,7 +109,27 @@ CREATE INDEX showablePhotos ON photos (album, published, key, present, error)
     WHERE present = 1 AND error = '';
 )sql";
 
-const char *const steps[] = {firstVersion, givenTexts, featuredMemory};
+// What the albums need that the service gathers itself: whose photo it is without a look at its
+// album, when it came, and whether it has been on a screen. `scanned`: a walk through the user's
+// whole folder has ended, so what is found from now on is new.
+const char gatheredAlbums[] = R"sql(
+ALTER TABLE users ADD COLUMN scanned INTEGER NOT NULL DEFAULT 0;
+UPDATE users SET scanned = EXISTS (SELECT 1 FROM albums WHERE user = users.id);
+ALTER TABLE photos ADD COLUMN user INTEGER NOT NULL DEFAULT 0;
+ALTER TABLE photos ADD COLUMN added INTEGER NOT NULL DEFAULT 0;
+ALTER TABLE photos ADD COLUMN shown INTEGER NOT NULL DEFAULT 0;
+UPDATE photos SET user = (SELECT user FROM albums WHERE id = album), added = changed / 1000000000;
+CREATE INDEX photosByTime ON photos (user, published, name) WHERE present = 1 AND error = '';
+CREATE INDEX photosByDay ON photos (user, substr(published, 6, 5), published)
+    WHERE present = 1 AND error = '';
+CREATE INDEX photosByArrival ON photos (user, added, published)
+    WHERE present = 1 AND error = '';
+CREATE INDEX neverShownPhotos ON photos (user, published, name)
+    WHERE present = 1 AND error = '' AND shown = 0;
+CREATE INDEX tagsByName ON tags (tag COLLATE NOCASE, photo);
+)sql";
+
+const char *const steps[] = {firstVersion, givenTexts, featuredMemory, gatheredAlbums};
 constexpr int newestVersion = sizeof steps / sizeof steps[0];
 
 } // namespace

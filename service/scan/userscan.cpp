@@ -2,6 +2,7 @@
 
 #include "base/texts.h"
 #include "index/database.h"
+#include "index/users.h"
 
 #include <spdlog/spdlog.h>
 
@@ -11,6 +12,7 @@ namespace {
 
 constexpr std::size_t filesPerBatch = 500;
 constexpr std::chrono::milliseconds batchTime{1000};
+constexpr std::int64_t nanoseconds = 1'000'000'000;
 
 std::string lastPiece(const std::string &path)
 {
@@ -35,6 +37,7 @@ bool UserScan::run()
     {
         auto reader = mDatabase.read();
         mKnownAlbums = knownAlbums(reader, mUser.id);
+        mIsFirst = !isScanned(reader, mUser.id);
     }
     struct stat status
     {
@@ -45,6 +48,8 @@ bool UserScan::run()
     if (!mStop)
         dropUnseenAlbums();
     write();
+    if (mIsFirst && !mStop)
+        noteScanned(mDatabase, mUser.id);
     return true;
 }
 
@@ -128,7 +133,7 @@ void UserScan::compareFile(FolderChanges &changes, const std::string &folder,
 
 void UserScan::readFile(FolderChanges &changes, const std::string &folder, const ListedFile &file)
 {
-    FoundFile found{file.name, file.size, file.changed, {}, {}};
+    FoundFile found{file.name, file.size, file.changed, {}, {}, arrivalOf(file)};
     auto metadata = readPhotoMetadata(pathOf(folder) + "/" + file.name, &found.error);
     if (metadata)
         found.metadata = std::move(*metadata);
@@ -137,6 +142,13 @@ void UserScan::readFile(FolderChanges &changes, const std::string &folder, const
     ++mTotals.read;
     mTotals.unreadable += metadata ? 0 : 1;
     changes.found.push_back(std::move(found));
+}
+
+// When the photos of a folder came that the service has not known before only the files can tell.
+std::int64_t UserScan::arrivalOf(const ListedFile &file) const
+{
+    const std::int64_t now = currentSeconds();
+    return mIsFirst ? std::min(now, file.changed / nanoseconds) : now;
 }
 
 void UserScan::dropUnseenAlbums()

@@ -48,6 +48,7 @@ private:
     void compareFile(FolderChanges &changes, const std::string &folder, const ListedFile &file,
                      const KnownFile *known);
     void readFile(FolderChanges &changes, const std::string &folder, const ListedFile &file);
+    std::int64_t arrivalOf(const ListedFile &file) const;
     void dropUnseenAlbums();
     bool isBelowUnreadable(const std::string &folder) const;
     FolderState stateOf(const Place &place) const;
@@ -60,6 +61,7 @@ private:
     const UserRecord mUser;
     const std::atomic<bool> &mStop;
     Totals mTotals;
+    bool mIsFirst = false; // no walk through this folder has ended yet
     std::map<std::string, KnownAlbum> mKnownAlbums;
     std::set<std::string> mSeenFolders;
     std::set<std::string> mUnreadableFolders;
