@@ -5,6 +5,7 @@
 #include "feeds/shownphotos.h"
 #include "index/catalogue.h"
 #include "index/database.h"
+#include "index/photosearch.h"
 #include "index/users.h"
 
 namespace {
@@ -125,13 +126,10 @@ void Feeds::search(Asked &asked)
     const auto page = asked.page(pagedLimits);
     if (!page)
         return;
-    const std::string expression = searchExpression(asked.call.request.get_param_value("q"));
-    if (expression.empty())
-        return asked.send("Search", *page, 0, FeedJson::array());
-    const auto photos =
-        photosWithIds(asked.session, searchPhotos(asked.session, expression, *page));
-    asked.send("Search", *page, searchCount(asked.session, expression),
-               photoEntries(photos, asked.origin));
+    const FoundPhotos found =
+        searchPhotos(asked.session, asked.call.request.get_param_value("q"), *page);
+    const auto photos = photosWithIds(asked.session, found.ids);
+    asked.send("Search", *page, found.total, photoEntries(photos, asked.origin));
 }
 
 // One's own feed begins with what is asked for most and ends with the years; the folders between

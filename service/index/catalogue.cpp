@@ -3,8 +3,6 @@
 #include "index/database.h"
 #include "index/photorows.h"
 
-#include <cctype>
-
 namespace {
 
 #define ALBUM_COLUMNS                                                                              \
@@ -28,19 +26,6 @@ AlbumRecord albumAt(const Query &query)
     if (!query.isNull(7))
         album.cover = query.number(7);
     return album;
-}
-
-std::vector<std::int64_t> numbersOf(Query &&query)
-{
-    std::vector<std::int64_t> numbers;
-    while (query.next())
-        numbers.push_back(query.number(0));
-    return numbers;
-}
-
-bool isWordByte(unsigned char byte)
-{
-    return byte >= 0x80 || std::isalnum(byte);
 }
 
 } // namespace
@@ -110,39 +95,6 @@ std::vector<PhotoRecord> photosWithIds(Session &session, const std::vector<std::
             photos.push_back(std::move(*photo));
     }
     return photos;
-}
-
-std::string searchExpression(const std::string &text)
-{
-    std::string expression, word;
-    const auto finishWord = [&] {
-        if (!word.empty())
-            expression += (expression.empty() ? "\"" : " \"") + word + "\"*";
-        word.clear();
-    };
-    for (const char c : text) {
-        if (isWordByte(static_cast<unsigned char>(c)))
-            word += c;
-        else
-            finishWord();
-    }
-    finishWord();
-    return expression;
-}
-
-std::int64_t searchCount(Session &session, const std::string &expression)
-{
-    Query query(session, "SELECT count(*) FROM photoSearch WHERE photoSearch MATCH ?", expression);
-    return query.next() ? query.number(0) : 0;
-}
-
-std::vector<std::int64_t> searchPhotos(Session &session, const std::string &expression,
-                                       const Page &page)
-{
-    return numbersOf(Query(session,
-                           "SELECT rowid FROM photoSearch WHERE photoSearch MATCH ? "
-                           "ORDER BY rowid DESC LIMIT ? OFFSET ?",
-                           expression, page.count, page.start - 1));
 }
 
 std::vector<CommentRecord> commentsOf(Session &session, std::int64_t photoId)

@@ -1,6 +1,7 @@
 #include "index/schema.h"
 
 #include "index/database.h"
+#include "index/photosearch.h"
 
 namespace {
 
@@ -129,7 +130,18 @@ CREATE INDEX neverShownPhotos ON photos (user, published, name)
 CREATE INDEX tagsByName ON tags (tag COLLATE NOCASE, photo);
 )sql";
 
-const char *const steps[] = {firstVersion, givenTexts, featuredMemory, gatheredAlbums};
+// Search texts in one spelling, with people and dates. Photos stand under the number of their user,
+// as in "u7": a user who takes another name needs no new texts.
+const char searchInAnyScript[] = R"sql(
+DROP TABLE photoSearch;
+CREATE VIRTUAL TABLE photoSearch USING fts5 (
+    title, caption, tags, album, date, people,
+    tokenize = "unicode61 remove_diacritics 0 categories 'L* M* N*'", prefix = '1 2 3'
+);
+)sql" REFRESH_ALL_PHOTO_SEARCH;
+
+const char *const steps[] = {firstVersion, givenTexts, featuredMemory, gatheredAlbums,
+                             searchInAnyScript};
 constexpr int newestVersion = sizeof steps / sizeof steps[0];
 
 } // namespace
