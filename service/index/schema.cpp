@@ -140,8 +140,21 @@ CREATE VIRTUAL TABLE photoSearch USING fts5 (
 );
 )sql" REFRESH_ALL_PHOTO_SEARCH;
 
-const char *const steps[] = {firstVersion, givenTexts, featuredMemory, gatheredAlbums,
-                             searchInAnyScript};
+// What a file is known by when it lies elsewhere, and the keywords of files that people do not
+// want. For files read before, size and time have to do.
+const char movedFiles[] = R"sql(
+ALTER TABLE photos ADD COLUMN content TEXT NOT NULL DEFAULT '';
+UPDATE photos SET content = size || ' ' || changed;
+CREATE INDEX photosByContent ON photos (content, name);
+CREATE TABLE droppedKeywords (
+    photo INTEGER NOT NULL REFERENCES photos (id) ON DELETE CASCADE,
+    tag TEXT NOT NULL,
+    PRIMARY KEY (photo, tag)
+) WITHOUT ROWID;
+)sql";
+
+const char *const steps[] = {firstVersion,   givenTexts,        featuredMemory,
+                             gatheredAlbums, searchInAnyScript, movedFiles};
 constexpr int newestVersion = sizeof steps / sizeof steps[0];
 
 } // namespace
