@@ -55,14 +55,14 @@ std::map<std::string, KnownAlbum> knownAlbums(Session &session, std::int64_t use
 std::map<std::string, KnownFile> knownFiles(Session &session, std::int64_t albumId);
 std::int64_t presentPhotos(Session &session, std::int64_t userId);
 
-// A photo that is new in its folder, with texts that stand above those in the file (empty: none).
-// The result is its id.
+// A photo that is new in its folder, whose privacy stays as it is, with texts that stand above
+// those in the file (empty: none). The result is its id.
 struct GivenTexts
 {
     std::string title;
     std::string caption;
 };
-std::int64_t addPhoto(Database &database, const FolderState &state, const FoundFile &file,
+std::int64_t addPhoto(Database &database, FolderState state, const FoundFile &file,
                       const GivenTexts &texts);
 
 // Writes the changes in one transaction.
