@@ -30,6 +30,11 @@ QStringList strokesIn(const QString &picture)
 bool SignInVisit::open() const
 {
     mTv->press(DEVICE_SELECT_KEY);
+    return isOpen();
+}
+
+bool SignInVisit::isOpen() const
+{
     return QTest::qWaitFor([this] { return mTv->page() && mTv->focus() == "OAuthView"; },
                            PATIENCE_MS);
 }

@@ -4,7 +4,8 @@
 
 class Television;
 
-// One sign-in on the service's pages with the remote, from the account list with the focus on New:
+// One sign-in on the service's pages with the remote, with the focus on the button that leads
+// there:
 //
 //   SignInVisit visit(&tv);
 //   visit.open() && visit.fill(mail, password) && visit.submit() && visit.answer(true);
@@ -18,7 +19,8 @@ public:
     {
     }
 
-    bool open() const; // until the sign-in page can be used
+    bool open() const;   // presses what has the focus
+    bool isOpen() const; // when the sign-in page can be used
     // Writes into the first two fields; the focus ends on the second.
     bool fill(const QString &mail, const QString &password) const;
     bool submit() const;            // the button below; until the next page has come

@@ -38,13 +38,16 @@ private slots:
     void init();
     void cleanup();
     void aHouseholdSignsInAndOut();
+    void aCodeGuardsAnAccount();
     void whoDeniesLeaves();
     void manySignInsLoseNone();
 
 private:
     void signIn(const Person &person);
-    void arriveAtHome(const Person &person);
+    void arriveAtHome(const Person &person, const QString &loginId = {},
+                      const QString &pin = "7305");
     void signOut();
+    void enterCode(const QByteArray &code);
 
     AlbumService mService;
     std::unique_ptr<Television> mTv;
@@ -66,6 +69,7 @@ void TestSignInPages::init()
     QVERIFY(mService.waitForPhotos(photos));
     mTv = std::make_unique<Television>();
     mTv->useService(mService.url());
+    mTv->set("Accounts/ProtectionCodes", true);
     QVERIFY(mTv->switchOn());
     QCOMPARE(mTv->focus(), I18n::button(8)); // New: there is nothing else to do
 }
@@ -88,15 +92,16 @@ void TestSignInPages::signIn(const Person &person)
 }
 
 // The first page is there, and the account that is signed in is stored with the tokens in use.
-void TestSignInPages::arriveAtHome(const Person &person)
+void TestSignInPages::arriveAtHome(const Person &person, const QString &loginId, const QString &pin)
 {
+    const QString account = loginId.isEmpty() ? person.mail : loginId;
     QTRY_COMPARE(mTv->captions().size(), photos);
     QVERIFY(!mTv->page());
     const QString token = AccountManagerHelper::getAccessToken();
     QVERIFY(!token.isEmpty());
     const AccountManagerHelper::Session session;
-    QCOMPARE(AccountManagerHelper::getLatestLoginAccount(), person.mail);
-    QVERIFY(AccountManagerHelper::login(person.mail, "7305")); // reads what is stored
+    QCOMPARE(AccountManagerHelper::getLatestLoginAccount(), account);
+    QVERIFY(AccountManagerHelper::login(account, pin)); // reads what is stored
     QCOMPARE(AccountManagerHelper::getAccessToken(), token);
     QCOMPARE(AccountManagerHelper::getUserName(), person.name);
 }
@@ -154,6 +159,46 @@ void TestSignInPages::aHouseholdSignsInAndOut()
     QTRY_COMPARE(mTv->focus(), ben.mail);
     mTv->press(DEVICE_SELECT_KEY);
     arriveAtHome(ben);
+}
+
+// Digit by digit, each when the box before has hidden its own, and then Next.
+void TestSignInPages::enterCode(const QByteArray &code)
+{
+    for (const char digit : code) {
+        const QWidget *box = QApplication::focusWidget();
+        QCOMPARE(mTv->focus(), QString("PinLineEdit"));
+        mTv->press(digit);
+        QTRY_VERIFY(QApplication::focusWidget() != box);
+    }
+    mTv->press(DEVICE_SELECT_KEY);
+}
+
+void TestSignInPages::aCodeGuardsAnAccount()
+{
+    mTv->press(DEVICE_DOWN_KEY);
+    QCOMPARE(mTv->focus(), I18n::login(3));
+    mTv->press(DEVICE_SELECT_KEY);
+    QVERIFY(mTv->type("anna"));
+    enterCode("4711");
+    QCOMPARE(mTv->label("tip"), I18n::login(9));
+    enterCode("4711");
+    SignInVisit visit(mTv.get());
+    QVERIFY(visit.isOpen());
+    mTv->press(DEVICE_RETURN_KEY); // back to the form, which still knows all
+    QTRY_COMPARE(mTv->focus(), I18n::button(3));
+    signIn(anna);
+    arriveAtHome(anna, "anna", "4711");
+
+    signOut();
+    QTRY_COMPARE(mTv->focus(), QString("anna"));
+    mTv->press(DEVICE_SELECT_KEY);
+    QTRY_COMPARE(mTv->focus(), QString("PinLineEdit"));
+    QVERIFY(!mTv->home());
+    mTv->press(DEVICE_RETURN_KEY);
+    QTRY_COMPARE(mTv->focus(), QString("anna"));
+    mTv->press(DEVICE_SELECT_KEY);
+    enterCode("4711");
+    arriveAtHome(anna, "anna", "4711");
 }
 
 void TestSignInPages::whoDeniesLeaves()

@@ -86,7 +86,11 @@ void ShortcutBar::addEntry(int key, const QString &text)
     row->setSpacing(8);
     row->addWidget(makeCap(entry, key));
     QLabel *label = makeLabel(entry, text);
-    label->setStyleSheet(QStringLiteral("color:#c5d2db;"));
+    // No style sheet: a label with one keeps the family that was the program's before its font
+    // came.
+    QPalette colours = label->palette();
+    colours.setColor(QPalette::WindowText, QColor(0xc5, 0xd2, 0xdb));
+    label->setPalette(colours);
     row->addWidget(label);
     mRow->addWidget(entry);
     mEntries.insert(key, {entry, label});
