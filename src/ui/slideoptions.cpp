@@ -53,6 +53,7 @@ SlideOptions SlideOptions::configured()
     options.loop = isOn("SlideShow/Loop");
     options.wholeList = isOn("SlideShow/WholeList");
     options.skipUnreadable = isOn("SlideShow/SkipUnreadable");
+    options.returnToPhoto = isOn("SlideShow/ReturnToPhoto");
     options.keysWhileLoading = isOn("SlideShow/KeysWhileLoading");
     return options;
 }
