@@ -68,10 +68,10 @@ int showPictures(const QString &service, const QString &picture)
     page.show();
     waitFor(
         [&] { return !page.homeScreen()->isLoading() && Download::mHomeLabelUrlHash.isEmpty(); });
-    const QPixmap thumbnails = page.grab();
+    page.repaint();
     emit page.homeScreen()->slideShow(0);
     waitFor([] { return Download::mPhotoSlideShowUrlHash.isEmpty(); });
-    if (thumbnails.isNull() || !page.player()->label()->placeholder().isEmpty())
+    if (!page.player()->label()->placeholder().isEmpty())
         return 1;
     return page.grab().save(picture) ? 0 : 1;
 }
