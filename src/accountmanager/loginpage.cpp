@@ -95,6 +95,7 @@ void LoginPage::buildLayout()
     row->addWidget(mHint, 1, Qt::AlignTop);
     row->addLayout(buttons);
 
+    mHint->setIndent(0); // in line with the title
     mMessage->setFixedHeight(48);
     mMessage->setAlignment(Qt::AlignLeft | Qt::AlignVCenter);
     auto *column = new QVBoxLayout(this);
