@@ -76,7 +76,7 @@ bool AlbumService::start()
     QFile::remove(ready);
     mProcess.setProcessChannelMode(QProcess::ForwardedChannels);
     mProcess.start(ORVALA_SERVICE_PROGRAM,
-                   {"serve", "--data", mFolder.filePath("data"), "--port", QString::number(mPort),
+                   {"serve", "--gathered", "none", "--data", mFolder.filePath("data"), "--port", QString::number(mPort),
                     "--ready-file", ready, "--log-level", "error"});
     QFile file(ready);
     const auto isReady = [&] {

@@ -41,6 +41,7 @@ public:
     int menuEntry() const;        // that has the focus; -1 when the menu has not
     QStringList accounts() const; // addresses, from above
     QWebView *page() const;       // the service's own page, when it is shown; else null
+    MainWidget *window() const { return mWindow.get(); }
     HomeWidget *home() const;     // null before the sign-in
     bool isLoading() const;
     QStringList captions() const; // of the cells on the screen

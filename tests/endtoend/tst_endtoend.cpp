@@ -1,5 +1,6 @@
 #include "app/mainapplication.h"
 #include "common/ui/remotekeys.h"
+#include "data/mediauploader.h"
 #include "endtoend/albumservice.h"
 #include "endtoend/television.h"
 #include "platform/ipc.h"
@@ -9,6 +10,9 @@
 #include "ui/screentexts.h"
 #include "ui/upwidget.h"
 
+#include <QDir>
+#include <QJsonArray>
+#include <QJsonDocument>
 #include <QSslSocket>
 #include <QTest>
 #include <QTimer>
@@ -58,10 +62,12 @@ private slots:
     void staysUsableBehindABadRelay_data();
     void staysUsableBehindABadRelay();
     void showsWhichPicturesAreMissing();
+    void showsWhatWasUploaded(); // last: there is one photo more then
 
 private:
     void addPhotos(const QString &folder, const QString &name, int count);
     void signIn(const QString &origin);
+    int seaAlbum() const; // its number
 
     AlbumService mService;
     QHash<QString, QColor> mColours; // by caption
@@ -116,6 +122,20 @@ void TestEndToEnd::signIn(const QString &origin)
     QTRY_COMPARE(mTv->captions().size(), 8);
     QTRY_VERIFY(mTv->showsColours(mColours));
     QCOMPARE(mTv->focus(), mTv->captions().first());
+}
+
+int TestEndToEnd::seaAlbum() const
+{
+    const QJsonDocument tokens = QJsonDocument::fromJson(mService.tokens(anna));
+    const QByteArray feed =
+        mService.get(mService.url() + "/data/feed/api/user/default?access_token=" +
+                     tokens["access_token"].toString());
+    const QJsonArray albums = QJsonDocument::fromJson(feed)["feed"]["entry"].toArray();
+    for (const QJsonValue &album : albums) {
+        if (album["title"]["$t"] == "Sea")
+            return album["gphoto$id"]["$t"].toString().toInt();
+    }
+    return 0;
 }
 
 void TestEndToEnd::browsesFromSignInToExit()
@@ -263,6 +283,33 @@ void TestEndToEnd::showsWhichPicturesAreMissing()
     QTRY_COMPARE(mTv->position(), QStringLiteral("14/%1").arg(photos));
     mTv->press({DEVICE_PAGEDOWN_KEY});
     QTRY_COMPARE(mTv->position(), QStringLiteral("17/%1").arg(photos));
+    QTRY_VERIFY(mTv->showsColours(mColours));
+}
+
+void TestEndToEnd::showsWhatWasUploaded()
+{
+    signIn(mService.url());
+    if (QTest::currentTestFailed())
+        return;
+    const QString file = QDir(QDir::tempPath()).filePath("orvala-upload.png");
+    QImage picture(400, 300, QImage::Format_RGB32);
+    picture.fill(Qt::magenta);
+    QVERIFY(picture.save(file));
+    const QString title = QString::fromUtf8("<b> & \"\u044f\U0001F41F\" %1");
+    mColours.insert(title, Qt::magenta);
+    const QString album = QString::number(seaAlbum());
+    QCOMPARE(MediaUploader::startToUpload(file, title, "default", album, "", false), NET_SUCCESS);
+    QVERIFY(QFile::remove(file));
+
+    QVERIFY(mTv->enter(UpWidget::MyPhotosEntry));
+    QTRY_COMPARE(mTv->captions().size(), 2);
+    if (!mTv->focus().startsWith("Sea"))
+        mTv->press({DEVICE_DOWN_KEY, DEVICE_RIGHT_KEY});
+    QTRY_VERIFY(mTv->focus().startsWith("Sea\n11 "));
+    mTv->press(DEVICE_SELECT_KEY);
+    QTRY_COMPARE(mTv->position(), QStringLiteral("1/11"));
+    mTv->press(DEVICE_PAGEDOWN_KEY);
+    QTRY_VERIFY(mTv->captions().contains(title));
     QTRY_VERIFY(mTv->showsColours(mColours));
 }
 
