@@ -1,3 +1,4 @@
+#include "accountmanager/managerwidget.h"
 #include "oauth/signintest.h"
 
 class TestSignIn : public SignInTest
@@ -19,6 +20,39 @@ private slots:
         QCOMPARE(rows(), QStringList(kMail + " 7305 Anna & Ole at rt true"));
         QCOMPARE(Helper::getAccessToken(), QString("at"));
         QCOMPARE(Helper::getExpires(), 3600);
+    }
+
+    // An account with a code of its own gets the new tokens and is asked for the code, or, where
+    // codes are not offered, stays signed out without a word.
+    void anotherCode_data()
+    {
+        QTest::addColumn<bool>("offered");
+        QTest::newRow("offered") << true;
+        QTest::newRow("not offered") << false;
+    }
+
+    void anotherCode()
+    {
+        QFETCH(bool, offered);
+        {
+            const Helper::Session session;
+            Helper::addAccount(kMail, "1234", "old");
+        }
+        QSettings(mFile->folder() + "/config.ini", QSettings::IniFormat)
+            .setValue("Accounts/ProtectionCodes", offered);
+        SignInCase service;
+        start(&service);
+        QSignalSpy finished(&mScreen->accounts, &AccountManager::loginFinished);
+        signIn();
+        allow();
+        QTRY_COMPARE(rows(), QStringList(kMail + " 1234 before at rt false"));
+        QCOMPARE(finished.size(), 0);
+        const auto *form = mScreen->accounts.findChild<ManagerWidget *>();
+        QCOMPARE(form && form->isVisible() && form->isOldUser(), offered);
+        if (!offered)
+            QVERIFY(message().isEmpty());
+        mScreen->press(DEVICE_RETURN_KEY);
+        QTRY_VERIFY(mScreen->isAtAccounts());
     }
 
     // Return leads back from every step, to a list on which New works again.
