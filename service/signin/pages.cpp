@@ -30,7 +30,8 @@ button:focus { color: #14181f; background: #ffc94a; }
 button:disabled { color: #8a8f99; }
 .message { display: inline-block; padding: .3em 1em; color: #14181f; background: #ffc94a;
   border-radius: 6px; font-weight: bold; }
-.name { margin: 1.5em 0 .2em; font-size: 1.3em; color: #ffc94a; font-weight: bold; }
+.name { margin: 1.5em 0 .2em; max-height: 2.7em; overflow: hidden; word-wrap: break-word;
+  font-size: 1.3em; color: #ffc94a; font-weight: bold; }
 svg { display: block; width: 9.4em; height: 2.9em; }
 </style></head>
 <body>{{body}}</body></html>
