@@ -7,11 +7,16 @@
 
 #include <spdlog/spdlog.h>
 
+#include <unistd.h>
+
 #include <csignal>
 #include <cstdio>
 #include <fstream>
+#include <thread>
 
 namespace {
+
+constexpr std::chrono::milliseconds endPatience{700};
 
 // Blocked before any thread begins, so that all threads leave them to the one that waits.
 sigset_t blockSignals()
@@ -32,6 +37,16 @@ bool writeReadyFile(const std::string &file, int port)
     stream << port << "\n";
     stream.close();
     return stream.good() && std::rename(unfinished.c_str(), file.c_str()) == 0;
+}
+
+// What is under way at the end, as a large photo being decoded, is not waited for any longer: all
+// that was acknowledged is on the disk, as it has to be for a power cut.
+void endSoon()
+{
+    std::thread([] {
+        std::this_thread::sleep_for(endPatience);
+        ::_exit(0);
+    }).detach();
 }
 
 int fail(const std::string &error)
@@ -73,6 +88,7 @@ void waitForEnd(const sigset_t &signals, Service &service)
 int runServe(const ServeOptions &options)
 {
     const sigset_t signals = blockSignals();
+    std::signal(SIGXFSZ, SIG_IGN); // a limit on the size of files is answered like a full disk
     spdlog::set_pattern("%Y-%m-%d %H:%M:%S.%e %L %v");
     spdlog::set_level(spdlog::level::from_str(options.logLevel));
     std::string error;
@@ -86,5 +102,6 @@ int runServe(const ServeOptions &options)
         return fail("cannot write " + options.readyFile);
     waitForEnd(signals, *service);
     spdlog::info("stopping");
+    endSoon();
     return 0;
 }
