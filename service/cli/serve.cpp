@@ -7,8 +7,10 @@
 
 #include <spdlog/spdlog.h>
 
+#include <sys/resource.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <csignal>
 #include <cstdio>
 #include <fstream>
@@ -17,6 +19,7 @@
 namespace {
 
 constexpr std::chrono::milliseconds endPatience{700};
+constexpr rlim_t openFiles = 8192;
 
 // Blocked before any thread begins, so that all threads leave them to the one that waits.
 sigset_t blockSignals()
@@ -37,6 +40,16 @@ bool writeReadyFile(const std::string &file, int port)
     stream << port << "\n";
     stream.close();
     return stream.good() && std::rename(unfinished.c_str(), file.c_str()) == 0;
+}
+
+// Connections, photos and the index' files may be more than the usual 1024.
+void raiseFileLimit()
+{
+    rlimit limit{};
+    if (::getrlimit(RLIMIT_NOFILE, &limit) != 0 || limit.rlim_cur >= openFiles)
+        return;
+    limit.rlim_cur = std::min(openFiles, limit.rlim_max);
+    ::setrlimit(RLIMIT_NOFILE, &limit);
 }
 
 // What is under way at the end, as a large photo being decoded, is not waited for any longer: all
@@ -88,6 +101,7 @@ void waitForEnd(const sigset_t &signals, Service &service)
 int runServe(const ServeOptions &options)
 {
     const sigset_t signals = blockSignals();
+    raiseFileLimit();
     std::signal(SIGXFSZ, SIG_IGN); // a limit on the size of files is answered like a full disk
     spdlog::set_pattern("%Y-%m-%d %H:%M:%S.%e %L %v");
     spdlog::set_level(spdlog::level::from_str(options.logLevel));
