@@ -4,6 +4,7 @@
 #include "feeds/feeds.h"
 #include "feeds/health.h"
 #include "feeds/photopictures.h"
+#include "feeds/shownphotos.h"
 #include "http/httpserver.h"
 #include "index/database.h"
 #include "pictures/thumbnailstore.h"
@@ -83,6 +84,7 @@ struct Service::Parts
     std::unique_ptr<Database> database;
     SslContext context;
     std::unique_ptr<ThumbnailStore> thumbnails;
+    std::unique_ptr<ShownPhotos> shown;
     std::unique_ptr<Feeds> feeds;
     std::unique_ptr<PhotoPictures> pictures;
     std::unique_ptr<Posting> posting;
@@ -124,9 +126,11 @@ bool Service::Parts::startServer(const ServiceSettings &settings, std::string *e
     thumbnails =
         std::make_unique<ThumbnailStore>(settings.data + "/thumbnails", settings.thumbnailBytes);
     const std::string scheme = settings.withTls ? "https" : "http";
-    feeds = std::make_unique<Feeds>(*database, scheme);
+    shown = std::make_unique<ShownPhotos>(*database);
+    feeds = std::make_unique<Feeds>(*database, *shown,
+                                    Feeds::Settings{scheme, settings.gathered, settings.today});
     posting = std::make_unique<Posting>(*database, scheme);
-    pictures = std::make_unique<PhotoPictures>(*database, *thumbnails);
+    pictures = std::make_unique<PhotoPictures>(*database, *thumbnails, *shown);
     tokens = std::make_unique<TokenEndpoint>(*database, codes,
                                              std::chrono::seconds(settings.accessLife).count());
     SignInPages::Settings pages;

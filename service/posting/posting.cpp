@@ -9,6 +9,7 @@
 #include "posting/atomentry.h"
 #include "posting/multipart.h"
 #include "posting/newphotofile.h"
+#include "scan/contentmark.h"
 #include "scan/folderlist.h"
 
 #include <sys/stat.h>
@@ -73,8 +74,13 @@ FoundFile describe(const NewPhotoFile &file, PhotoMetadata metadata)
     {
     };
     ::stat(file.path().c_str(), &status);
-    return {file.name(), status.st_size,
-            status.st_mtim.tv_sec * nanoseconds + status.st_mtim.tv_nsec, std::move(metadata), ""};
+    return {file.name(),
+            status.st_size,
+            status.st_mtim.tv_sec * nanoseconds + status.st_mtim.tv_nsec,
+            std::move(metadata),
+            "",
+            0,
+            contentMark(file.path())};
 }
 
 // What an upload brings: its entry, and its picture on the way into the album's folder. Further

@@ -67,8 +67,7 @@ private slots:
 private:
     void addPhotos(const QString &folder, const QString &name, int count);
     void signIn(const QString &origin);
-    int seaAlbum() const;  // its number
-    void enter(int entry); // of the menu
+    int seaAlbum() const; // its number
 
     AlbumService mService;
     QHash<QString, QColor> mColours; // by caption
@@ -111,8 +110,7 @@ void TestEndToEnd::cleanup()
 
 void TestEndToEnd::signIn(const QString &origin)
 {
-    mTv->set("Service/FeedBase", origin);
-    mTv->set("Service/OAuthBase", origin + "/o/oauth2/");
+    mTv->useService(origin);
     QVERIFY(mTv->addAccount(anna, "Anna", mService.tokens(anna)));
     QVERIFY(mTv->addAccount(ben, "Ben", mService.tokens(ben)));
     QVERIFY(mTv->switchOn());
@@ -140,17 +138,6 @@ int TestEndToEnd::seaAlbum() const
     return 0;
 }
 
-void TestEndToEnd::enter(int entry)
-{
-    for (int row = 0; row < 3 && mTv->menuEntry() < 0; ++row)
-        mTv->press(DEVICE_UP_KEY);
-    const int way = entry - mTv->menuEntry();
-    for (int i = 0; i < qAbs(way); ++i)
-        mTv->press(way > 0 ? DEVICE_RIGHT_KEY : DEVICE_LEFT_KEY);
-    QCOMPARE(mTv->menuEntry(), entry);
-    mTv->press(DEVICE_SELECT_KEY);
-}
-
 void TestEndToEnd::browsesFromSignInToExit()
 {
     signIn(mService.url());
@@ -176,7 +163,7 @@ void TestEndToEnd::browsesFromSignInToExit()
     QTRY_COMPARE(mTv->position(), at(1));
 
     // My Photos, the second album, its photos, and Return to the album.
-    enter(UpWidget::MyPhotosEntry);
+    QVERIFY(mTv->enter(UpWidget::MyPhotosEntry));
     QTRY_COMPARE(mTv->captions().size(), 2);
     mTv->press({DEVICE_DOWN_KEY, DEVICE_RIGHT_KEY});
     QTRY_COMPARE(mTv->position(), QStringLiteral("2/2"));
@@ -208,7 +195,7 @@ void TestEndToEnd::outlivesTheService()
     if (QTest::currentTestFailed())
         return;
     mService.kill();
-    enter(UpWidget::MyPhotosEntry);
+    QVERIFY(mTv->enter(UpWidget::MyPhotosEntry));
     QTRY_COMPARE(mTv->failure(), ScreenTexts::failure(ScreenTexts::NoConnection));
     mTv->press(DEVICE_DOWN_KEY);
     QTRY_COMPARE(mTv->focus(), QStringLiteral("FailurePage"));
@@ -249,7 +236,7 @@ void TestEndToEnd::staysUsableBehindABadRelay()
 
     const QByteArray albums = "/data/feed/api/user/default";
     relay.on(albums, behaviour);
-    enter(UpWidget::MyPhotosEntry);
+    QVERIFY(mTv->enter(UpWidget::MyPhotosEntry));
     QTRY_VERIFY(!mTv->isLoading());
     QVERIFY(mTv->captions().isEmpty());
     QCOMPARE(mTv->failure(), failure < 0 ? QString() : ScreenTexts::failure(failure));
@@ -258,14 +245,14 @@ void TestEndToEnd::staysUsableBehindABadRelay()
         mTv->press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY}); // no, not to the accounts
 
     // The menu leads to what can be had, ...
-    enter(UpWidget::HomeEntry);
+    QVERIFY(mTv->enter(UpWidget::HomeEntry));
     QTRY_COMPARE(mTv->captions().size(), 8);
     QTRY_VERIFY(mTv->showsColours(mColours));
     // ... and to the albums when they can be had again. A list without records counts for a while.
     relay.on(albums, forwardTo(mService.port()));
     const auto albumsAreShown = [this] {
         if (!mTv->isLoading())
-            enter(UpWidget::MyPhotosEntry);
+            mTv->enter(UpWidget::MyPhotosEntry);
         return mTv->captions().size() == 2;
     };
     QTRY_VERIFY(albumsAreShown());
@@ -314,7 +301,7 @@ void TestEndToEnd::showsWhatWasUploaded()
     QCOMPARE(MediaUploader::startToUpload(file, title, "default", album, "", false), NET_SUCCESS);
     QVERIFY(QFile::remove(file));
 
-    enter(UpWidget::MyPhotosEntry);
+    QVERIFY(mTv->enter(UpWidget::MyPhotosEntry));
     QTRY_COMPARE(mTv->captions().size(), 2);
     if (!mTv->focus().startsWith("Sea"))
         mTv->press({DEVICE_DOWN_KEY, DEVICE_RIGHT_KEY});

@@ -119,28 +119,6 @@ TEST_F(Feeds, pagesKeepToTheirLimits)
     }
 }
 
-TEST_F(Feeds, searchFindsTitlesCaptionsTagsAndAlbumsByTheBeginningsOfWords)
-{
-    const struct
-    {
-        const char *words;
-        Titles titles;
-    } rows[] = {{"dog", {"one"}},         {"DO%20SUM", {"one"}},
-                {"summ", {"two", "one"}}, {"thr", {"three"}},
-                {"winter", {"three"}},    {"hidden", {}},
-                {"secret", {}},           {"", {}},
-                {"%22%20OR%20*", {}},     {"NEAR%28one", {}},
-                {"%F0%9F%90%95", {}},     {"one%00", {"one"}}};
-    for (const auto &row : rows) {
-        const json found =
-            publicFeed(std::string(base) + "/all?q=" + row.words + "&max-results=100&alt=json");
-        EXPECT_EQ(titlesOf(found), row.titles) << row.words;
-        EXPECT_EQ(valueOf(found, "openSearch$totalResults"), std::to_string(row.titles.size()));
-    }
-    EXPECT_EQ(titlesOf(publicFeed(std::string(base) + "/all?q=summ&max-results=100&start-index=2")),
-              (Titles{"one"}));
-}
-
 TEST_F(Feeds, commentsAndTagsOfAPhoto)
 {
     const std::string text = "a < b & \"c\" <br /> \xF0\x9F\x98\x80";
