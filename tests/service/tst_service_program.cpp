@@ -84,9 +84,10 @@ protected:
     {
         const std::string ready = mFolder.file("ready");
         fs::remove(ready);
-        auto process = std::make_unique<Process>(
-            Words{"orvala-service", "serve", "--http", "--data", data(), "--photos",
-                  mFolder.file("photos"), "--ready-file", ready, "--log-level", "off"});
+        auto process =
+            std::make_unique<Process>(Words{"orvala-service", "serve", "--http", "--data", data(),
+                                            "--photos", mFolder.file("photos"), "--ready-file",
+                                            ready, "--log-level", "off", "--gathered", "none"});
         waitFor([&] { return fs::exists(ready); });
         mPort = fs::exists(ready) ? std::stoi(readWholeFile(ready)) : 0;
         return process;
