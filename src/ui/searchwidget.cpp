@@ -9,6 +9,7 @@
 #include <QKeyEvent>
 #include <QLabel>
 #include <QLineEdit>
+#include <QPainter>
 
 namespace {
 
@@ -26,6 +27,8 @@ const char *const BAR_FOCUSED = "QLabel{border-width: 2px}";
 const char *const BAR_UNFOCUSED = "QFrame{border-width: 0px;}QLabel{border-width: 1px}";
 
 constexpr int kHeight = 60; // of field and button, pixels
+constexpr int kRing = 3;    // around the marked part, with a gap of as much
+constexpr int kRingRadius = 14;
 
 // A sheet set anew costs a layout, so only one that differs is set.
 void setSheet(QWidget *widget, const char *sheet)
@@ -56,6 +59,10 @@ SearchWidget::SearchWidget(QWidget *parent)
     QFont font = mField->font();
     font.setPixelSize(26);
     mField->setFont(font);
+    QPalette palette = mField->palette();
+    palette.setColor(QPalette::Base, QColor(0xe6, 0xec, 0xf0));
+    palette.setColor(QPalette::Text, QColor(0x12, 0x20, 0x2b));
+    mField->setPalette(palette);
     mButton->setFixedSize(kHeight, kHeight);
     mButton->setPixmap(loadPicture(QStringLiteral(":/res/search.png"), QSize(kHeight, kHeight)));
 
@@ -99,6 +106,21 @@ void SearchWidget::setFrame()
         setSheet(mField, FIELD_MARKED);
         showButton(!mField->text().isEmpty());
     }
+    update();
+}
+
+// A green line of two pixels is too little to be found across a room.
+void SearchWidget::paintEvent(QPaintEvent *)
+{
+    if (!hasFocus())
+        return;
+    QPainter painter(this);
+    painter.setRenderHint(QPainter::Antialiasing);
+    painter.setPen(QPen(QColor(0xf2, 0xf6, 0xf9), kRing));
+    const QWidget *marked = mCurrentFocus == Button ? static_cast<QWidget *>(mButton) : mField;
+    const qreal gap = 1.5 * kRing;
+    painter.drawRoundedRect(QRectF(marked->geometry()).adjusted(-gap, -gap, gap, gap), kRingRadius,
+                            kRingRadius);
 }
 
 void SearchWidget::keyPressEvent(QKeyEvent *event)
