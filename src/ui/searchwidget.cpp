@@ -29,6 +29,7 @@ const char *const BAR_UNFOCUSED = "QFrame{border-width: 0px;}QLabel{border-width
 constexpr int kHeight = 60; // of field and button, pixels
 constexpr int kRing = 3;    // around the marked part, with a gap of as much
 constexpr int kRingRadius = 14;
+constexpr int kGap = 14; // between field and button
 
 // A sheet set anew costs a layout, so only one that differs is set.
 void setSheet(QWidget *widget, const char *sheet)
@@ -59,15 +60,12 @@ SearchWidget::SearchWidget(QWidget *parent)
     QFont font = mField->font();
     font.setPixelSize(26);
     mField->setFont(font);
-    QPalette palette = mField->palette();
-    palette.setColor(QPalette::Base, QColor(0xe6, 0xec, 0xf0));
-    palette.setColor(QPalette::Text, QColor(0x12, 0x20, 0x2b));
-    mField->setPalette(palette);
     mButton->setFixedSize(kHeight, kHeight);
     mButton->setPixmap(loadPicture(QStringLiteral(":/res/search.png"), QSize(kHeight, kHeight)));
 
     auto *row = new QHBoxLayout(this);
     row->setContentsMargins(0, 20, 0, 20);
+    row->setSpacing(kGap);
     row->addItem(makeSpacer());
     row->addWidget(mField);
     row->addWidget(mButton);
