@@ -91,9 +91,8 @@ void QKeyBoardInput::build()
 void QKeyBoardInput::paintEvent(QPaintEvent *)
 {
     QPainter painter(this);
-    painter.drawPixmap(mBox->pos(),
-                       stretchedPicture(QStringLiteral(":/res/InputBox_Focus.png"), mBox->size(),
-                                        kPictureBorder, this));
+    painter.drawPixmap(mBox->pos(), stretchedPicture(QStringLiteral(":/res/InputBox_Focus.png"),
+                                                     mBox->size(), kPictureBorder, this));
 }
 
 void QKeyBoardInput::setText(const QString &text)
