@@ -39,6 +39,7 @@ QLabel *makeLabel(QWidget *parent, const char *name, const QString &text)
     label->setObjectName(QLatin1String(name));
     label->setTextFormat(Qt::PlainText);
     label->setWordWrap(true);
+    label->setIndent(0);
     label->setText(text);
     return label;
 }
