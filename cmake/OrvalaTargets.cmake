@@ -10,7 +10,10 @@ set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bin)
 
 find_program(ORVALA_CCACHE ccache)
 if(ORVALA_CCACHE)
-  set(CMAKE_CXX_COMPILER_LAUNCHER ${ORVALA_CCACHE})
+  # What ccache asks for before it takes part in a build with precompiled headers.
+  set(CMAKE_CXX_COMPILER_LAUNCHER ${CMAKE_COMMAND} -E env
+      CCACHE_SLOPPINESS=pch_defines,time_macros,include_file_mtime,include_file_ctime
+      ${ORVALA_CCACHE})
 endif()
 
 function(orvala_settings target)
@@ -25,10 +28,20 @@ function(orvala_settings target)
   endif()
 endfunction()
 
-function(orvala_qt_settings target)
-  set_target_properties(${target} PROPERTIES AUTOMOC ON)
+function(orvala_qt_definitions target)
   target_compile_definitions(${target} PRIVATE QT_NO_FOREACH QT_NO_JAVA_STYLE_ITERATORS
                                                QT_DEPRECATED_WARNINGS)
+endfunction()
+
+function(orvala_qt_settings target)
+  set_target_properties(${target} PROPERTIES AUTOMOC ON)
+  orvala_qt_definitions(${target})
+  get_target_property(type ${target} TYPE)
+  if(type STREQUAL EXECUTABLE)
+    orvala_use_headers(${target} orvala_qt_program_headers)
+  else()
+    orvala_use_headers(${target} orvala_qt_headers)
+  endif()
 endfunction()
 
 # orvala_library(<name> SOURCES <files> LINKS <targets>): a static library of the client, one for
