@@ -53,7 +53,9 @@ void addServe(CLI::App &program, ServeOptions &options, int &result)
                             "Certificate chain (PEM); without it a self-signed one is made");
     command->add_option("--key", service.key, "The certificate's key (PEM)")->needs(certificate);
     command->add_flag("!--http", service.withTls, "No TLS, for measuring");
-    command->add_option("--threads", service.threads, "Requests answered at the same time")
+    command
+        ->add_option("--threads", service.threads,
+                     "Requests answered at the same time, a quarter of them for one address")
         ->check(CLI::Range(1, 1024))
         ->capture_default_str();
     command->add_option("--log-level", options.logLevel, "How much is logged")

@@ -16,6 +16,8 @@
 #include <sys/file.h>
 #include <unistd.h>
 
+#include <sqlite3.h>
+
 #include <filesystem>
 
 namespace {
@@ -33,6 +35,16 @@ bool makeDataFolder(const std::string &folder, std::string *error)
     if (isNew)
         std::filesystem::permissions(folder, std::filesystem::perms::owner_all, code);
     return true;
+}
+
+bool isStorageFull(const std::exception &exception)
+{
+    const auto *problem = dynamic_cast<const SQLite::Exception *>(&exception);
+    if (!problem)
+        return false;
+    const int code = problem->getExtendedErrorCode();
+    return (code & 0xFF) == SQLITE_FULL || code == SQLITE_IOERR_WRITE ||
+           code == SQLITE_IOERR_SHMSIZE;
 }
 
 } // namespace
@@ -116,6 +128,7 @@ bool Service::Parts::startServer(const ServiceSettings &settings, std::string *e
     http.port = settings.port;
     http.threads = settings.threads;
     http.context = context.get();
+    http.isStorageFull = isStorageFull;
     server = std::make_unique<HttpServer>(router, http);
     if (server->start())
         return true;

@@ -126,6 +126,19 @@ bool isPrivacyChanged(Session &session, const FolderState &state)
     return query.next() && (query.number(0) != 0) != state.isPrivate;
 }
 
+// The addresses of an album's pictures, which take no token, end when the album becomes private.
+void renewKeys(Session &session, std::int64_t albumId)
+{
+    std::vector<std::int64_t> photoIds;
+    {
+        Query query(session, "SELECT id FROM photos WHERE album = ?", albumId);
+        while (query.next())
+            photoIds.push_back(query.number(0));
+    }
+    for (const std::int64_t id : photoIds)
+        Query(session, "UPDATE photos SET key = ? WHERE id = ?", randomText(keyBytes), id).run();
+}
+
 void writeFolder(Session &session, const FolderChanges &changes)
 {
     const bool privacyChanged = isPrivacyChanged(session, changes.state);
@@ -144,6 +157,8 @@ void writeFolder(Session &session, const FolderChanges &changes)
         setPresent(session, photoId, false);
     for (const std::int64_t photoId : changes.back)
         setPresent(session, photoId, true);
+    if (privacyChanged && changes.state.isPrivate)
+        renewKeys(session, albumId);
     if (privacyChanged)
         refreshAlbumSearch(session, albumId);
     refreshAlbum(session, albumId);
@@ -196,10 +211,12 @@ std::int64_t presentPhotos(Session &session, std::int64_t userId)
     return query.next() ? query.number(0) : 0;
 }
 
-std::int64_t addPhoto(Database &database, const FolderState &state, const FoundFile &file,
+std::int64_t addPhoto(Database &database, FolderState state, const FoundFile &file,
                       const GivenTexts &texts)
 {
     Database::Writer writer(database);
+    if (isPrivacyChanged(writer, state)) // while the photo was on its way
+        state.isPrivate = !state.isPrivate;
     writeFolder(writer, {state, {file}, {}, {}});
     std::int64_t photoId = 0;
     {

@@ -69,14 +69,14 @@ std::vector<LikePhoto> photosLike(Session &session, std::int64_t userId, const F
 
 std::int64_t presentPhotos(Session &session, std::int64_t userId);
 
-// A photo that is new in its folder, with texts that stand above those in the file (empty: none).
-// The result is its id.
+// A photo that is new in its folder, whose privacy stays as it is, with texts that stand above
+// those in the file (empty: none). The result is its id.
 struct GivenTexts
 {
     std::string title;
     std::string caption;
 };
-std::int64_t addPhoto(Database &database, const FolderState &state, const FoundFile &file,
+std::int64_t addPhoto(Database &database, FolderState state, const FoundFile &file,
                       const GivenTexts &texts);
 
 // All that was left out in the user's folders: paths below the user's folder, and why.

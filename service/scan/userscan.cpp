@@ -65,6 +65,7 @@ bool UserScan::run()
     if (!mStop)
         dropUnseenAlbums();
     write();
+    finishWriting();
     if (!mStop)
         writeLeftOut(mDatabase, mUser.id, mLeftOut);
     if (mIsFirst && !mStop)
@@ -260,11 +261,21 @@ void UserScan::add(FolderChanges changes, bool isChanged)
         write();
 }
 
+// Written while the walk reads on, one batch at a time and in their order.
 void UserScan::write()
 {
+    finishWriting();
     if (!mBatch.empty())
-        writeChanges(mDatabase, mBatch);
+        mWriting = std::async(std::launch::async, [this, batch = std::move(mBatch)] {
+            writeChanges(mDatabase, batch);
+        });
     mBatch.clear();
     mBatchFiles = 0;
     mLastWrite = std::chrono::steady_clock::now();
+}
+
+void UserScan::finishWriting()
+{
+    if (mWriting.valid())
+        mWriting.get();
 }

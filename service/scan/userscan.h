@@ -5,6 +5,7 @@
 
 #include <atomic>
 #include <chrono>
+#include <future>
 #include <set>
 
 class Database;
@@ -58,6 +59,7 @@ private:
     bool leavesOutLink(bool isLink, const std::string &path);
     void add(FolderChanges changes, bool isChanged);
     void write();
+    void finishWriting();
 
     Database &mDatabase;
     const UserRecord mUser;
@@ -73,4 +75,5 @@ private:
     std::vector<FolderChanges> mBatch;
     std::size_t mBatchFiles = 0;
     std::chrono::steady_clock::time_point mLastWrite;
+    std::future<void> mWriting;
 };

@@ -1,5 +1,6 @@
 #include "app/mainapplication.h"
 #include "common/ui/remotekeys.h"
+#include "data/mediauploader.h"
 #include "endtoend/albumservice.h"
 #include "endtoend/television.h"
 #include "platform/ipc.h"
@@ -9,6 +10,9 @@
 #include "ui/screentexts.h"
 #include "ui/upwidget.h"
 
+#include <QDir>
+#include <QJsonArray>
+#include <QJsonDocument>
 #include <QSslSocket>
 #include <QTest>
 #include <QTimer>
@@ -58,11 +62,12 @@ private slots:
     void staysUsableBehindABadRelay_data();
     void staysUsableBehindABadRelay();
     void showsWhichPicturesAreMissing();
+    void showsWhatWasUploaded(); // last: there is one photo more then
 
 private:
     void addPhotos(const QString &folder, const QString &name, int count);
     void signIn(const QString &origin);
-    void enter(int entry); // of the menu
+    int seaAlbum() const; // its number
 
     AlbumService mService;
     QHash<QString, QColor> mColours; // by caption
@@ -105,8 +110,7 @@ void TestEndToEnd::cleanup()
 
 void TestEndToEnd::signIn(const QString &origin)
 {
-    mTv->set("Service/FeedBase", origin);
-    mTv->set("Service/OAuthBase", origin + "/o/oauth2/");
+    mTv->useService(origin);
     QVERIFY(mTv->addAccount(anna, "Anna", mService.tokens(anna)));
     QVERIFY(mTv->addAccount(ben, "Ben", mService.tokens(ben)));
     QVERIFY(mTv->switchOn());
@@ -120,15 +124,18 @@ void TestEndToEnd::signIn(const QString &origin)
     QCOMPARE(mTv->focus(), mTv->captions().first());
 }
 
-void TestEndToEnd::enter(int entry)
+int TestEndToEnd::seaAlbum() const
 {
-    for (int row = 0; row < 3 && mTv->menuEntry() < 0; ++row)
-        mTv->press(DEVICE_UP_KEY);
-    const int way = entry - mTv->menuEntry();
-    for (int i = 0; i < qAbs(way); ++i)
-        mTv->press(way > 0 ? DEVICE_RIGHT_KEY : DEVICE_LEFT_KEY);
-    QCOMPARE(mTv->menuEntry(), entry);
-    mTv->press(DEVICE_SELECT_KEY);
+    const QJsonDocument tokens = QJsonDocument::fromJson(mService.tokens(anna));
+    const QByteArray feed =
+        mService.get(mService.url() + "/data/feed/api/user/default?access_token=" +
+                     tokens["access_token"].toString());
+    const QJsonArray albums = QJsonDocument::fromJson(feed)["feed"]["entry"].toArray();
+    for (const QJsonValue &album : albums) {
+        if (album["title"]["$t"] == "Sea")
+            return album["gphoto$id"]["$t"].toString().toInt();
+    }
+    return 0;
 }
 
 void TestEndToEnd::browsesFromSignInToExit()
@@ -156,7 +163,7 @@ void TestEndToEnd::browsesFromSignInToExit()
     QTRY_COMPARE(mTv->position(), at(1));
 
     // My Photos, the second album, its photos, and Return to the album.
-    enter(UpWidget::MyPhotosEntry);
+    QVERIFY(mTv->enter(UpWidget::MyPhotosEntry));
     QTRY_COMPARE(mTv->captions().size(), 2);
     mTv->press({DEVICE_DOWN_KEY, DEVICE_RIGHT_KEY});
     QTRY_COMPARE(mTv->position(), QStringLiteral("2/2"));
@@ -188,7 +195,7 @@ void TestEndToEnd::outlivesTheService()
     if (QTest::currentTestFailed())
         return;
     mService.kill();
-    enter(UpWidget::MyPhotosEntry);
+    QVERIFY(mTv->enter(UpWidget::MyPhotosEntry));
     QTRY_COMPARE(mTv->failure(), ScreenTexts::failure(ScreenTexts::NoConnection));
     mTv->press(DEVICE_DOWN_KEY);
     QTRY_COMPARE(mTv->focus(), QStringLiteral("FailurePage"));
@@ -229,7 +236,7 @@ void TestEndToEnd::staysUsableBehindABadRelay()
 
     const QByteArray albums = "/data/feed/api/user/default";
     relay.on(albums, behaviour);
-    enter(UpWidget::MyPhotosEntry);
+    QVERIFY(mTv->enter(UpWidget::MyPhotosEntry));
     QTRY_VERIFY(!mTv->isLoading());
     QVERIFY(mTv->captions().isEmpty());
     QCOMPARE(mTv->failure(), failure < 0 ? QString() : ScreenTexts::failure(failure));
@@ -238,14 +245,14 @@ void TestEndToEnd::staysUsableBehindABadRelay()
         mTv->press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY}); // no, not to the accounts
 
     // The menu leads to what can be had, ...
-    enter(UpWidget::HomeEntry);
+    QVERIFY(mTv->enter(UpWidget::HomeEntry));
     QTRY_COMPARE(mTv->captions().size(), 8);
     QTRY_VERIFY(mTv->showsColours(mColours));
     // ... and to the albums when they can be had again. A list without records counts for a while.
     relay.on(albums, forwardTo(mService.port()));
     const auto albumsAreShown = [this] {
         if (!mTv->isLoading())
-            enter(UpWidget::MyPhotosEntry);
+            mTv->enter(UpWidget::MyPhotosEntry);
         return mTv->captions().size() == 2;
     };
     QTRY_VERIFY(albumsAreShown());
@@ -276,6 +283,33 @@ void TestEndToEnd::showsWhichPicturesAreMissing()
     QTRY_COMPARE(mTv->position(), QStringLiteral("14/%1").arg(photos));
     mTv->press({DEVICE_PAGEDOWN_KEY});
     QTRY_COMPARE(mTv->position(), QStringLiteral("17/%1").arg(photos));
+    QTRY_VERIFY(mTv->showsColours(mColours));
+}
+
+void TestEndToEnd::showsWhatWasUploaded()
+{
+    signIn(mService.url());
+    if (QTest::currentTestFailed())
+        return;
+    const QString file = QDir(QDir::tempPath()).filePath("orvala-upload.png");
+    QImage picture(400, 300, QImage::Format_RGB32);
+    picture.fill(Qt::magenta);
+    QVERIFY(picture.save(file));
+    const QString title = QString::fromUtf8("<b> & \"\u044f\U0001F41F\" %1");
+    mColours.insert(title, Qt::magenta);
+    const QString album = QString::number(seaAlbum());
+    QCOMPARE(MediaUploader::startToUpload(file, title, "default", album, "", false), NET_SUCCESS);
+    QVERIFY(QFile::remove(file));
+
+    QVERIFY(mTv->enter(UpWidget::MyPhotosEntry));
+    QTRY_COMPARE(mTv->captions().size(), 2);
+    if (!mTv->focus().startsWith("Sea"))
+        mTv->press({DEVICE_DOWN_KEY, DEVICE_RIGHT_KEY});
+    QTRY_VERIFY(mTv->focus().startsWith("Sea\n11 "));
+    mTv->press(DEVICE_SELECT_KEY);
+    QTRY_COMPARE(mTv->position(), QStringLiteral("1/11"));
+    mTv->press(DEVICE_PAGEDOWN_KEY);
+    QTRY_VERIFY(mTv->captions().contains(title));
     QTRY_VERIFY(mTv->showsColours(mColours));
 }
 

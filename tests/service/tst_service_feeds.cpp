@@ -154,43 +154,6 @@ TEST_F(Feeds, contactsAreTheOthers)
     EXPECT_EQ(statusOf(pathOf(valueOf(list["entry"][0], "gphoto$thumbnail"))), 200);
 }
 
-TEST_F(Feeds, tokensDecideWhoSeesWhat)
-{
-    const std::string ben = token("ben@orvala.example");
-    const json own = publicFeed(std::string(base) + "/user/default?access_token=" + ben);
-    ASSERT_EQ(own["entry"].size(), 2u);
-    std::string secret;
-    for (const json &entry : own["entry"]) {
-        if (valueOf(entry, "gphoto$access") == "private")
-            secret = pathOf(valueOf(entry, "id"));
-    }
-    EXPECT_EQ(titlesOf(publicFeed(secret + "?access_token=" + ben)), (Titles{"hidden"}));
-    const std::string anna = token("anna@orvala.example");
-    const std::string expired = token("anna@orvala.example", 0);
-    const struct
-    {
-        std::string path;
-        int status;
-    } rows[] = {{secret + "?access_token=" + anna, 403},
-                {secret + "/photoid/1?kind=comment&access_token=" + anna, 403},
-                {secret, 401},
-                {secret + "?access_token=" + ben + "x", 401},
-                {std::string(base) + "/user/1?access_token=" + expired, 401},
-                {std::string(base) + "/user/1?access_token=", 401},
-                {std::string(base) + "/user/9?access_token=" + anna, 404},
-                {std::string(base) + "/user/1/albumid/999?access_token=" + anna, 404},
-                {std::string(base) + "/user/1/albumid/x?access_token=" + anna, 404},
-                {photoPath(0) + "9999?kind=tag&access_token=" + anna, 404},
-                {photoPath(0) + "?kind=user&access_token=" + anna, 400},
-                {std::string(base) + "/user/ben@orvala.example?access_token=" + anna, 200}};
-    for (const auto &row : rows)
-        EXPECT_EQ(statusOf(row.path), row.status) << row.path;
-    EXPECT_EQ(titlesOf(publicFeed(std::string(base) + "/user/2?access_token=" + anna)),
-              (Titles{"ben"}));
-    EXPECT_EQ(get(std::string(base) + "/user/1", {{"Authorization", "Bearer " + anna}})->status,
-              200);
-}
-
 TEST_F(Feeds, addressesFollowTheHostThatWasAsked)
 {
     const std::string local = "http://127.0.0.1:" + std::to_string(service().port());

@@ -251,9 +251,13 @@ TEST_F(Scan, privacyFollowsItsMark)
     addPhoto("a/b/one.jpg");
     start();
     scan();
+    const std::string address = pathOf(
+        publicFeed("/data/feed/api/featured")["entry"][0]["content"]["src"].get<std::string>());
+    EXPECT_EQ(statusOf(address), 200);
     writeBytes(photo("a/.private"), "");
     scan();
     EXPECT_EQ(featured(), Titles{});
+    EXPECT_EQ(statusOf(address), 404); // whoever knew it
     EXPECT_EQ(titlesOf(publicFeed("/data/feed/api/all?q=one")), Titles{});
     EXPECT_EQ(albums(), Titles{"b"});
     fs::remove(photo("a/.private"));
