@@ -7,6 +7,7 @@
 #include "data/photomanager.h"
 #include "network/systemconfig.h"
 #include "ui/accountquestions.h"
+#include "ui/cachedlist.h"
 #include "ui/formscrollarea.h"
 #include "ui/formscrollwidget.h"
 #include "ui/homebars.h"
@@ -236,7 +237,7 @@ void HomeWidget::fetchAnew()
 Package *HomeWidget::takeUsablePackage()
 {
     PackageProperty &wanted = mState.mCurrentProperty;
-    Package *package = PackageManager::getPackage(wanted);
+    Package *package = cachedList(wanted);
     const bool beginsLater = package && wanted.mType == TYPE_FEATURED_PHOTOS &&
                              package->mProperty.mStartIndex > wanted.mStartIndex;
     if (!beginsLater)

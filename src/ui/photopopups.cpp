@@ -20,6 +20,7 @@ PhotoPopups::PhotoPopups(PictureDetailWidget *detail, QWidget *screen)
             &PhotoPopups::showMoreComment);
     connect(mLists, &NoteLists::addCommentWanted, this, &PhotoPopups::showInputCommentDialog);
     connect(mLists, &NoteLists::addTagWanted, this, &PhotoPopups::showInputTagDialog);
+    connect(detail, &PictureDetailWidget::notesArrived, mLists, &NoteLists::take);
     connect(mInput, &NoteInput::posted, this, &PhotoPopups::refresh);
     connect(mLists, &NoteLists::changed, this, &PhotoPopups::refresh);
 }
@@ -45,7 +46,7 @@ void PhotoPopups::showMoreComment()
     mLists->showMoreComment(mDetail->commentsProperty(), mDetail->isSelfPhoto());
 }
 
-// The photo screen first: the list then joins its request, and passes the answer on.
+// The photo screen first: the list then joins its request.
 void PhotoPopups::refresh()
 {
     mDetail->refreshNotes();

@@ -133,10 +133,10 @@ void PictureDetailWidget::downloadPackageCB(PackageProperty &property, ErrorCode
     logLine("{PictureDetailWidget::downloadPackageCB} type ", property.mType, " code ", code);
     if (!mWidgetInst)
         return;
-    if (!isNote(property))
+    if (isNote(property))
+        mWidgetInst->takeNotes(property, code);
+    else
         mWidgetInst->listArrived(property, code);
-    else if (mWidgetInst->mNotes.take(property, code))
-        mWidgetInst->showInformation();
 }
 
 void PictureDetailWidget::listArrived(const PackageProperty &property, ErrorCode code)
@@ -195,6 +195,13 @@ void PictureDetailWidget::fetchNotes()
 {
     mNotes.request(downloadPackageCB);
     showInformation();
+}
+
+void PictureDetailWidget::takeNotes(const PackageProperty &property, ErrorCode code)
+{
+    if (mNotes.take(property, code))
+        showInformation();
+    emit notesArrived(property, code);
 }
 
 void PictureDetailWidget::refreshNotes()

@@ -74,6 +74,8 @@ signals:
     void handleDetailPageChange(int startIndex, bool nextPage);
     void slidePlay(int recordIndex); // runs by itself
     void slideShow(int recordIndex); // stepped by hand
+    // Comments or tags have come, or did not, whoever asked for them.
+    void notesArrived(const PackageProperty &property, ErrorCode code);
     // Another photo, or another use of the keys.
     void viewChanged();
 
@@ -96,6 +98,7 @@ private:
     void showStrip();
     void showInformation();
     void fetchNotes();
+    void takeNotes(const PackageProperty &property, ErrorCode code);
     bool handleKey(int key);
     bool handlePhotoKey(int key);
     bool handleActionKey(int key);

@@ -2,6 +2,7 @@
 
 #include "accountmanager/accountitem.h"
 #include "accountmanager/accountmanagerhelper.h"
+#include "common/ui/qtoastwidget.h"
 #include "data/packagemanager.h"
 #include "data/photomanager.h"
 #include "network/connection.h"
@@ -170,6 +171,12 @@ QString Television::position() const
 
 QString Television::failure() const
 {
-    const auto *page = mWindow->findChild<FailurePage *>();
-    return page && page->isVisible() ? page->reason() : QString();
+    const auto *page = shown<FailurePage>();
+    return page ? page->reason() : QString();
+}
+
+QString Television::toast() const
+{
+    const auto *toast = shown<QToastWidget>();
+    return toast ? toast->text().simplified() : QString();
 }

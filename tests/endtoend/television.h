@@ -10,7 +10,6 @@
 #include <memory>
 
 class HomeWidget;
-class FailurePage;
 class PhotoItem;
 
 // The television: the program's own main window on a screen of 1280 x 720, its settings and account
@@ -41,6 +40,17 @@ public:
     QString position() const; // in the list, as "3/23"
     // The reason on the page for what did not load; empty when it is not shown.
     QString failure() const;
+    // The one of that class that is on the screen; null without.
+    template <typename Type>
+    Type *shown() const
+    {
+        for (Type *widget : mWindow->findChildren<Type *>()) {
+            if (widget->isVisible())
+                return widget;
+        }
+        return nullptr;
+    }
+    QString toast() const; // on one line; empty when none is shown
 
     FakeShell &shell() { return mShell; }
 
