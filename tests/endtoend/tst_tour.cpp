@@ -91,7 +91,9 @@ void TestTour::tour()
 void TestTour::walkFeatured()
 {
     const int photos = mColours.size();
-    const auto at = [photos](int number) { return QStringLiteral("%1/%2").arg(number).arg(photos); };
+    const auto at = [photos](int number) {
+        return QStringLiteral("%1/%2").arg(number).arg(photos);
+    };
     QSet<QString> seen;
     for (int number = 1; number <= photos; ++number) {
         QTRY_COMPARE(mTv->position(), at(number));
