@@ -27,23 +27,23 @@ PhotoPopups::PhotoPopups(PictureDetailWidget *detail, QWidget *screen)
 
 void PhotoPopups::showInputCommentDialog()
 {
-    mInput->showInputCommentDialog(mDetail->commentsProperty());
+    mInput->showInputCommentDialog(mDetail->photo().request(PHOTO_COMMENTS_LIST));
 }
 
 void PhotoPopups::showInputTagDialog()
 {
     if (mDetail->isSelfPhoto())
-        mInput->showInputTagDialog(mDetail->tagsProperty());
+        mInput->showInputTagDialog(mDetail->photo().request(PHOTO_TAGS_LIST));
 }
 
 void PhotoPopups::showTagList()
 {
-    mLists->showTagList(mDetail->tagsProperty(), mDetail->isSelfPhoto());
+    mLists->showTagList(mDetail->photo().request(PHOTO_TAGS_LIST), mDetail->isSelfPhoto());
 }
 
 void PhotoPopups::showMoreComment()
 {
-    mLists->showMoreComment(mDetail->commentsProperty(), mDetail->isSelfPhoto());
+    mLists->showMoreComment(mDetail->photo().request(PHOTO_COMMENTS_LIST), mDetail->isSelfPhoto());
 }
 
 // The photo screen first: the list then joins its request.

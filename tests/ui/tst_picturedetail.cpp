@@ -423,7 +423,7 @@ void TestPictureDetail::commentsAndTags()
     const QString text = information();
     QVERIFY(text.contains("<b>older</b>"));
     QVERIFY(text.indexOf("newer < all") < text.indexOf("older"));
-    PackageProperty comments = mDetail->commentsProperty();
+    PackageProperty comments = mDetail->photo().request(PHOTO_COMMENTS_LIST);
     QVERIFY(PackageManager::getPackage(comments)); // for whoever lists them all
 
     mDetail->refreshNotes();
@@ -442,7 +442,7 @@ void TestPictureDetail::notesOfAnotherPhoto()
         held.answerFirst(MisbehavingServer::answer(sample::feed(late, 0)));
     // Comments that the service does not give.
     QTRY_VERIFY(information().contains(DetailTexts::text(DetailTexts::PhotoGone)));
-    PackageProperty first = mDetail->tagsProperty();
+    PackageProperty first = mDetail->photo().request(PHOTO_TAGS_LIST);
     first.mPhotoId = "1";
     QTRY_VERIFY(PackageManager::getPackage(first));
     QVERIFY(!information().contains("late tag"));
