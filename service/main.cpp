@@ -3,6 +3,8 @@
 
 #include <CLI/CLI.hpp>
 
+#include <algorithm>
+
 namespace {
 
 void addData(CLI::App *command, std::string &data)
@@ -10,6 +12,25 @@ void addData(CLI::App *command, std::string &data)
     command
         ->add_option("--data", data, "Folder with the service's index, certificate and thumbnails")
         ->capture_default_str();
+}
+
+void addGathered(CLI::App *command, ServiceSettings &service)
+{
+    std::vector<std::string> names = {"none"};
+    for (const Gathered kind : allGatheredKinds())
+        names.push_back(nameOf(kind));
+    const auto choose = [&service](const std::vector<std::string> &chosen) {
+        service.gathered.clear();
+        for (const Gathered kind : allGatheredKinds()) {
+            if (std::find(chosen.begin(), chosen.end(), nameOf(kind)) != chosen.end())
+                service.gathered.insert(kind);
+        }
+    };
+    command
+        ->add_option_function<std::vector<std::string>>(
+            "--gathered", choose,
+            "Albums that the service gathers for each user from all their folders (all of them)")
+        ->check(CLI::IsMember(names));
 }
 
 void addServe(CLI::App &program, ServeOptions &options, int &result)
@@ -32,7 +53,9 @@ void addServe(CLI::App &program, ServeOptions &options, int &result)
                             "Certificate chain (PEM); without it a self-signed one is made");
     command->add_option("--key", service.key, "The certificate's key (PEM)")->needs(certificate);
     command->add_flag("!--http", service.withTls, "No TLS, for measuring");
-    command->add_option("--threads", service.threads, "Requests answered at the same time")
+    command
+        ->add_option("--threads", service.threads,
+                     "Requests answered at the same time, a quarter of them for one address")
         ->check(CLI::Range(1, 1024))
         ->capture_default_str();
     command->add_option("--log-level", options.logLevel, "How much is logged")
@@ -50,6 +73,7 @@ void addServe(CLI::App &program, ServeOptions &options, int &result)
             [&service](int days) { service.accessLife = std::chrono::hours(days * 24); },
             "Days for which a sign-in opens the feeds before it is renewed (90)")
         ->check(CLI::Range(1, 3650));
+    addGathered(command, service);
     command->callback([&] { result = runServe(options); });
 }
 

@@ -4,6 +4,7 @@
 #include "feeds/feeds.h"
 #include "feeds/health.h"
 #include "feeds/photopictures.h"
+#include "feeds/shownphotos.h"
 #include "http/httpserver.h"
 #include "index/database.h"
 #include "pictures/thumbnailstore.h"
@@ -14,6 +15,8 @@
 #include <fcntl.h>
 #include <sys/file.h>
 #include <unistd.h>
+
+#include <sqlite3.h>
 
 #include <filesystem>
 
@@ -32,6 +35,16 @@ bool makeDataFolder(const std::string &folder, std::string *error)
     if (isNew)
         std::filesystem::permissions(folder, std::filesystem::perms::owner_all, code);
     return true;
+}
+
+bool isStorageFull(const std::exception &exception)
+{
+    const auto *problem = dynamic_cast<const SQLite::Exception *>(&exception);
+    if (!problem)
+        return false;
+    const int code = problem->getExtendedErrorCode();
+    return (code & 0xFF) == SQLITE_FULL || code == SQLITE_IOERR_WRITE ||
+           code == SQLITE_IOERR_SHMSIZE;
 }
 
 } // namespace
@@ -54,6 +67,7 @@ struct Service::Parts
     std::unique_ptr<Database> database;
     SslContext context;
     std::unique_ptr<ThumbnailStore> thumbnails;
+    std::unique_ptr<ShownPhotos> shown;
     std::unique_ptr<Feeds> feeds;
     std::unique_ptr<PhotoPictures> pictures;
     std::unique_ptr<Posting> posting;
@@ -93,9 +107,11 @@ bool Service::Parts::startServer(const ServiceSettings &settings, std::string *e
     thumbnails =
         std::make_unique<ThumbnailStore>(settings.data + "/thumbnails", settings.thumbnailBytes);
     const std::string scheme = settings.withTls ? "https" : "http";
-    feeds = std::make_unique<Feeds>(*database, scheme);
+    shown = std::make_unique<ShownPhotos>(*database);
+    feeds = std::make_unique<Feeds>(*database, *shown,
+                                    Feeds::Settings{scheme, settings.gathered, settings.today});
     posting = std::make_unique<Posting>(*database, scheme);
-    pictures = std::make_unique<PhotoPictures>(*database, *thumbnails);
+    pictures = std::make_unique<PhotoPictures>(*database, *thumbnails, *shown);
     tokens = std::make_unique<TokenEndpoint>(*database, codes,
                                              std::chrono::seconds(settings.accessLife).count());
     SignInPages::Settings pages;
@@ -112,6 +128,7 @@ bool Service::Parts::startServer(const ServiceSettings &settings, std::string *e
     http.port = settings.port;
     http.threads = settings.threads;
     http.context = context.get();
+    http.isStorageFull = isStorageFull;
     server = std::make_unique<HttpServer>(router, http);
     if (server->start())
         return true;

@@ -1,7 +1,11 @@
 #pragma once
 
+#include "base/texts.h"
+#include "index/gatheredalbums.h"
+
 #include <chrono>
 #include <cstdint>
+#include <functional>
 #include <memory>
 #include <string>
 
@@ -17,9 +21,11 @@ struct ServiceSettings
     bool withTls = true;
     std::string certificate; // empty: self-signed, made once
     std::string key;         // empty: in the certificate's file
-    int threads = 16;
+    int threads = 128;
     std::chrono::seconds scanPause{300};
-    std::chrono::hours accessLife{90 * 24}; // of an access token
+    std::chrono::hours accessLife{90 * 24};        // of an access token
+    GatheredKinds gathered = allGatheredKinds();   // which albums the service makes up
+    std::function<std::string()> today = localDay; // as 2026-05-01
     std::int64_t thumbnailBytes = std::int64_t(8) << 30;
 };
 

@@ -123,9 +123,7 @@ int playRound(const AlbumService &service, SpoiltService &spoilt, Presser &press
               int keys)
 {
     Television television;
-    television.set("Service/FeedBase", spoilt.url());
-    television.set("Service/OAuthBase", spoilt.url() + "/o/oauth2/");
-    television.set("Service/SignInPage", spoilt.url() + "/ServiceLogin");
+    television.useService(spoilt.url());
     television.set("Network/SilenceSeconds", 1);
     television.set("Network/PageSeconds", 2);
     television.set("Network/SignInSeconds", 2);

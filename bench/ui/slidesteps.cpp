@@ -1,38 +1,22 @@
 // A step of the slide show, from the key to the repainted screen: to a photo that was prepared, and
 // to one that is still with the server, each against a program that decodes the same file with
-// turbojpeg and paints it scaled. Then the memory over many steps. The screen is 1280 x 720, times
+// turbojpeg and paints it scaled; and what a long list costs. The screen is 1280 x 720, times
 // QT_SCALE_FACTOR: 1.5 for 1080p.
 
 #include "benchpicture.h"
 #include "common/ui/remotekeys.h"
-#include "data/photomanager.h"
-#include "network/systemconfig.h"
-#include "res/resources.h"
 #include "support/bench.h"
-#include "support/misbehavingserver.h"
-#include "ui/homewidget.h"
-#include "ui/qimageslide.h"
-#include "ui/samplefeeds.h"
-#include "ui/slidephotos.h"
+#include "ui/slidescene.h"
 #include "ui/slidesetting.h"
-#include "ui/widget.h"
 
-#include <QApplication>
-#include <QFile>
-#include <QKeyEvent>
 #include <QPainter>
-#include <QTemporaryFile>
-#include <QtTest>
 
 #include <turbojpeg.h>
-#include <unistd.h>
 
 namespace {
 
-constexpr int kPhotos = 2000;
 constexpr int kRounds = 40;
-constexpr int kSteps = 10000;
-constexpr int kWarmUp = 1000;
+constexpr int kShort = 10, kLong = 10000; // records
 constexpr double kTwoFrames = 2.0 / 60;
 
 // The reference: decodes at the key, and paints scaled to fit.
@@ -71,70 +55,9 @@ private:
     QImage mImage;
 };
 
-void pressAndPaint(QWidget *target, int key)
+double stepTime(SlideScene &scene, int key)
 {
-    QKeyEvent press(QEvent::KeyPress, key, Qt::NoModifier);
-    QApplication::sendEvent(target, &press);
-    QCoreApplication::sendPostedEvents();
-    QCoreApplication::processEvents();
-}
-
-template <typename Condition>
-void waitFor(Condition condition)
-{
-    if (!QTest::qWaitFor(condition))
-        qFatal("the photo does not come");
-}
-
-// One album of many photos, all with the same bytes.
-void serve(MisbehavingServer &server, const QByteArray &jpeg)
-{
-    const auto answer = MisbehavingServer::answer(jpeg); // one copy of the bytes
-    QJsonArray photos;
-    for (int i = 0; i < kPhotos; ++i) {
-        const QByteArray number = QByteArray::number(i);
-        photos << sample::photo("Photo " + number, server.url("/p" + number + ".jpg"));
-        server.on("/s0/p" + number + ".jpg", answer);
-    }
-    server.on("/data/feed/api/featured", MisbehavingServer::answer(sample::feed(photos, kPhotos)));
-}
-
-void configure(QTemporaryFile &file, const QString &feedBase)
-{
-    file.open();
-    file.write("[Max]\nCacheSize=96\n[Service]\nFeedBase=" + feedBase.toUtf8() +
-               "\n[SlideShow]\nBlurredFill=true\nCaption=BottomLeft\nClock=TopRight\nFade=900\n");
-    file.flush();
-    SystemConfig::setConfigFile(file.fileName());
-}
-
-double residentMegabytes()
-{
-    QFile file("/proc/self/statm");
-    file.open(QIODevice::ReadOnly);
-    return file.readAll().split(' ').at(1).toDouble() * double(sysconf(_SC_PAGESIZE)) / 1e6;
-}
-
-// Resident memory after the first steps and at the end, there and back through the photos.
-void measureMemory(QImageSlide *player, MisbehavingServer &server)
-{
-    double before = 0;
-    int key = DEVICE_RIGHT_KEY;
-    for (int step = 0; step < kSteps; ++step) {
-        if (step == kWarmUp)
-            before = residentMegabytes();
-        if (player->position() == 0)
-            key = DEVICE_RIGHT_KEY;
-        else if (player->position() == kPhotos - 1)
-            key = DEVICE_LEFT_KEY;
-        pressAndPaint(player, key);
-        server.forgetRequests();
-        if (step % 4 == 0)
-            waitFor([player] { return player->label()->placeholder().isEmpty(); });
-    }
-    const double grown = residentMegabytes() - before;
-    bench::row("slide show, megabytes grown from step 1,000 to 10,000", grown, 2,
-               std::to_string(int(before)) + " MB before");
+    return bench::seconds([&] { SlideScene::pressAndPaint(scene.player(), key); });
 }
 
 struct Times
@@ -143,72 +66,75 @@ struct Times
 };
 
 // The three in turn, on new photos each round.
-Times measureSteps(QImageSlide *player, QWidget *plain)
+Times measureSteps(SlideScene &scene, QWidget *plain)
 {
     Times times;
-    auto *photos = player->findChild<SlidePhotos *>();
-    const auto *list = HomeWidget::mCurrentPackageData;
     for (int round = 0; round < kRounds; ++round) {
-        const QString next = list->record<OrvalaPhoto>(player->position() + 1)->imageUrl();
-        waitFor([&] { return photos->isPrepared(next); });
-        times.prepared.push_back(
-            bench::seconds([player] { pressAndPaint(player, DEVICE_RIGHT_KEY); }));
-        times.fresh.push_back(bench::seconds([player] {
-            pressAndPaint(player, DEVICE_RIGHT_KEY);
-            while (!player->label()->placeholder().isEmpty())
+        SlideScene::waitFor([&] { return scene.isPrepared(scene.player()->position() + 1); });
+        times.prepared.push_back(stepTime(scene, DEVICE_RIGHT_KEY));
+        times.fresh.push_back(bench::seconds([&scene] {
+            SlideScene::pressAndPaint(scene.player(), DEVICE_RIGHT_KEY);
+            while (!scene.showsPhoto())
                 QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
             QCoreApplication::sendPostedEvents();
             QCoreApplication::processEvents();
         }));
-        times.plain.push_back(bench::seconds([plain] { pressAndPaint(plain, DEVICE_RIGHT_KEY); }));
+        times.plain.push_back(
+            bench::seconds([plain] { SlideScene::pressAndPaint(plain, DEVICE_RIGHT_KEY); }));
     }
     return times;
 }
 
-void report(const char *what, const std::vector<double> &ours, const std::vector<double> &plain,
-            double goal, const std::string &size)
+// To and fro between two prepared photos in the middle of a list.
+void stepInList(SlideScene &scene, const QByteArray &jpeg, int records, std::vector<double> &times)
 {
-    const double a = bench::median(ours), b = bench::median(plain);
-    bench::row(what + size, a / b, goal, bench::milliseconds({0, a, b}));
+    scene.serve(records, {jpeg});
+    scene.open(records / 2);
+    for (int round = 0; round < 2 * kRounds; ++round) {
+        const bool isOn = round % 2 == 0;
+        const int next = scene.player()->position() + (isOn ? 1 : -1);
+        SlideScene::waitFor([&] { return scene.isPrepared(next); });
+        times.push_back(stepTime(scene, isOn ? DEVICE_RIGHT_KEY : DEVICE_LEFT_KEY));
+    }
+}
+
+void report(const std::string &what, const std::vector<double> &ours,
+            const std::vector<double> &reference, double goal)
+{
+    const double a = bench::median(ours), b = bench::median(reference);
+    bench::row(what, a / b, goal, bench::milliseconds({0, a, b}));
 }
 
 } // namespace
 
 int main(int argc, char **argv)
 {
-    qInstallMessageHandler([](QtMsgType, const QMessageLogContext &, const QString &) {});
-    QApplication app(argc, argv);
-    initResources();
-    SystemConfig::mScreen_Width = 1280;
-    SystemConfig::mScreen_Height = 720;
-    SystemConfig::setScale(app.devicePixelRatio());
+    SlideScene scene(argc, argv,
+                     "BlurredFill=true\nCaption=BottomLeft\nClock=TopRight\nFade=900\n");
     SlideSetting::SlideSpeed = 3600;
-    MisbehavingServer server;
-    QTemporaryFile settings;
-    configure(settings, server.url(QString()));
-    const QSize screen = QSize(1280, 720) * app.devicePixelRatio();
+    const QSize screen = SlideScene::screen();
+    const std::string size = std::to_string(screen.height()) + "p";
     const QByteArray jpeg = photoJpeg(screen.width() * 7 / 8, screen.height() * 7 / 8);
-    serve(server, jpeg);
-    PhotoManager::init();
-
     Plain plain(jpeg);
     plain.resize(1280, 720);
     plain.show();
-    Widget page;
-    page.resize(1280, 720);
-    page.show();
-    waitFor([] { return HomeWidget::mCurrentPackageData != nullptr; });
-    emit page.homeScreen()->slideShow(0);
+    scene.serve(3 * kRounds, {jpeg});
+    scene.open(0);
 
-    const Times times = measureSteps(page.player(), &plain);
-    const std::string size = std::to_string(screen.height()) + "p";
-    report("slide step to a prepared photo against decode and scaled blit, ", times.prepared,
-           times.plain, 0.5, size);
-    report("slide step to a photo at the server against decode and scaled blit, ", times.fresh,
-           times.plain, 0, size);
+    const Times times = measureSteps(scene, &plain);
+    report("slide step to a prepared photo against decode and scaled blit, " + size, times.prepared,
+           times.plain, 0.5);
+    report("slide step to a photo at the server against decode and scaled blit, " + size,
+           times.fresh, times.plain, 0);
     const double slowest = *std::max_element(times.prepared.begin(), times.prepared.end());
-    bench::row("slowest of them against two frames, " + size, slowest / kTwoFrames, 1,
-               std::to_string(slowest * 1e3) + " ms");
-    measureMemory(page.player(), server);
+    bench::row("slowest step to a prepared photo against two frames, " + size, slowest / kTwoFrames,
+               1, std::to_string(slowest * 1e3) + " ms");
+
+    std::vector<double> few, many;
+    for (int i = 0; i < 4; ++i) {
+        stepInList(scene, jpeg, kShort, few);
+        stepInList(scene, jpeg, kLong, many);
+    }
+    report("slide step with 10,000 records against 10", many, few, 1.2);
     return 0;
 }

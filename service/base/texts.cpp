@@ -162,6 +162,11 @@ std::int64_t currentSeconds()
     return std::time(nullptr);
 }
 
+std::string localDay()
+{
+    return localTime(currentSeconds()).substr(0, std::string("2026-05-01").size());
+}
+
 std::string withoutExtension(const std::string &name)
 {
     const std::size_t dot = name.rfind('.');

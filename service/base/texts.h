@@ -22,6 +22,8 @@ std::optional<std::int64_t> parseNumber(std::string_view text);
 std::string utcTime(std::int64_t seconds);
 std::string localTime(std::int64_t seconds);
 std::int64_t currentSeconds();
+// Today in the server's zone, as 2026-05-01.
+std::string localDay();
 // Seconds since 1970 of an ISO time with or without fraction and zone, UTC if it has none; nothing
 // if it is no such time.
 std::optional<std::int64_t> parseTime(const std::string &text);

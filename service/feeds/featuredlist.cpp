@@ -52,11 +52,6 @@ void FeaturedList::noteShown(const std::vector<std::int64_t> &ids)
         writeShown();
 }
 
-std::string FeaturedList::localDay()
-{
-    return localTime(currentSeconds()).substr(0, std::string("2026-05-01").size());
-}
-
 bool FeaturedList::isDue() const
 {
     return mCost < cheap || Clock::now() - mRead > mCost * restFactor;

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "base/texts.h"
+
 #include <chrono>
 #include <cstdint>
 #include <functional>
@@ -26,8 +28,6 @@ public:
 
     Ids photos(Session &session);
     void noteShown(const std::vector<std::int64_t> &ids);
-
-    static std::string localDay();
 
 private:
     using Clock = std::chrono::steady_clock;

@@ -2,17 +2,25 @@
 
 #include "feeds/featuredlist.h"
 #include "http/router.h"
-#include "index/records.h"
+#include "index/gatheredalbums.h"
 
 class Database;
+class ShownPhotos;
 struct Asked;
 
-// Answers the feed addresses from the index. `scheme` ("https" or "http") begins the addresses that
-// the feeds name; the rest of their origin is the host that the client asked for.
+// Answers the feed addresses from the index. The origin of the addresses that the feeds name is
+// the host that the client asked for.
 class Feeds
 {
 public:
-    Feeds(Database &database, std::string scheme);
+    struct Settings
+    {
+        std::string scheme; // of the addresses in the feeds: "https" or "http"
+        GatheredKinds gathered;
+        FeaturedList::Today today;
+    };
+
+    Feeds(Database &database, ShownPhotos &shown, Settings settings);
     void addRoutes(Router &router);
 
 private:
@@ -25,12 +33,15 @@ private:
     void search(Asked &asked);
     void albums(Asked &asked);
     void albumPhotos(Asked &asked);
+    void gatheredPhotos(Asked &asked, const Page &page);
+    Gathering gatheringFor(const Asked &asked) const;
     void aboutPhoto(Asked &asked);
     void comments(Asked &asked, const PhotoRecord &photo);
     void tags(Asked &asked, const PhotoRecord &photo);
     void contacts(Asked &asked);
 
     Database &mDatabase;
-    const std::string mScheme;
+    ShownPhotos &mShown;
+    const Settings mSettings;
     FeaturedList mFeatured;
 };

@@ -13,7 +13,8 @@ struct Box
 {
     int width, height;
 };
-constexpr std::array<Box, 3> thumbnailBoxes = {Box{112, 88}, Box{224, 176}, Box{336, 264}};
+constexpr std::array<Box, 3> thumbnailBoxes = {Box{112, 88}, Box{224, 176},
+                                               Box{widestThumbnail, 264}};
 
 struct Size
 {
@@ -78,14 +79,15 @@ std::string userFeed(const std::string &origin, std::int64_t userId)
     return origin + "/data/feed/api/user/" + std::to_string(userId);
 }
 
-std::string albumFeed(const std::string &origin, std::int64_t userId, std::int64_t albumId)
+std::string albumFeed(const std::string &origin, std::int64_t userId, const std::string &album)
 {
-    return userFeed(origin, userId) + "/albumid/" + std::to_string(albumId);
+    return userFeed(origin, userId) + "/albumid/" + album;
 }
 
 std::string photoFeed(const std::string &origin, const PhotoRecord &photo)
 {
-    return albumFeed(origin, photo.userId, photo.albumId) + "/photoid/" + std::to_string(photo.id);
+    return albumFeed(origin, photo.userId, std::to_string(photo.albumId)) + "/photoid/" +
+           std::to_string(photo.id);
 }
 
 void addPlace(FeedJson &entry, const PhotoRecord &photo)
@@ -151,12 +153,12 @@ FeedJson albumEntry(const AlbumRecord &album, const PhotoRecord *cover, const st
         group["media$thumbnail"] =
             FeedJson::array({thumbnail(*cover, origin, thumbnailBoxes.back())});
     }
-    return {{"id", feedText(albumFeed(origin, album.userId, album.id))},
+    return {{"id", feedText(albumFeed(origin, album.userId, album.feedId))},
             {"published", feedText(withZone(album.published))},
             {"updated", feedText(withZone(album.published))},
             {"title", feedText(album.title)},
             {"author", authorOf(album.userId, album.userName)},
-            {"gphoto$id", feedNumber(album.id)},
+            {"gphoto$id", feedText(album.feedId)},
             {"gphoto$user", feedNumber(album.userId)},
             {"gphoto$nickname", feedText(album.userName)},
             {"gphoto$access", feedText(album.isPrivate ? "private" : "public")},

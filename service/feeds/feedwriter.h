@@ -12,6 +12,9 @@
 // bytes that are no UTF-8 become U+FFFD.
 using FeedJson = nlohmann::ordered_json;
 
+// The width of the largest picture that a grid shows, in pixels.
+constexpr int widestThumbnail = 336;
+
 FeedJson feedText(const std::string &text);
 FeedJson feedNumber(std::int64_t number);
 

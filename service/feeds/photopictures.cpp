@@ -2,6 +2,8 @@
 
 #include "base/secrets.h"
 #include "base/texts.h"
+#include "feeds/feedwriter.h"
+#include "feeds/shownphotos.h"
 #include "index/catalogue.h"
 #include "index/database.h"
 #include "pictures/thumbnailstore.h"
@@ -41,9 +43,10 @@ void setCaching(httplib::Response &response, const std::string &tag)
 
 } // namespace
 
-PhotoPictures::PhotoPictures(Database &database, ThumbnailStore &store)
+PhotoPictures::PhotoPictures(Database &database, ThumbnailStore &store, ShownPhotos &shown)
     : mDatabase(database)
     , mStore(store)
+    , mShown(shown)
 {
 }
 
@@ -71,6 +74,8 @@ void PhotoPictures::answer(const std::string &key, int width, const httplib::Req
     }
     if (!file || !liesWithin(file->folder, file->path))
         return answerError(response, notFound, "there is no such photo");
+    if (!file->isShown && (width == 0 || width > widestThumbnail))
+        mShown.note(file->photoId);
     const std::string tag =
         '"' + fingerprint(file->identity).substr(0, 32) + "-" + std::to_string(width) + '"';
     if (isUnchanged(request, tag)) {

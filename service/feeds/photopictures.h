@@ -3,6 +3,7 @@
 #include "http/router.h"
 
 class Database;
+class ShownPhotos;
 class ThumbnailStore;
 
 // Answers the picture addresses: "photos/KEY/sWIDTH/NAME" and, for the full size,
@@ -11,7 +12,8 @@ class ThumbnailStore;
 class PhotoPictures
 {
 public:
-    PhotoPictures(Database &database, ThumbnailStore &store);
+    // What is larger than a thumbnail goes to a screen, which `shown` is told.
+    PhotoPictures(Database &database, ThumbnailStore &store, ShownPhotos &shown);
     void addRoutes(Router &router);
 
 private:
@@ -20,4 +22,5 @@ private:
 
     Database &mDatabase;
     ThumbnailStore &mStore;
+    ShownPhotos &mShown;
 };

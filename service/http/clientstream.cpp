@@ -48,6 +48,8 @@ ClientStream::ClientStream(int socket, SSL_CTX *context, int stopEvent, const Li
         SSL_set_fd(mSsl, mSocket);
         SSL_set_accept_state(mSsl);
     }
+    int port = 0;
+    get_remote_ip_and_port(mAddress, port);
     beginRequest();
 }
 
@@ -78,12 +80,15 @@ void ClientStream::beginRequest()
 {
     mDeadline = Clock::now() + mLimits.head;
     mBytesLeft = mLimits.headBytes;
+    mIsPaced = false;
+    mIsAnswering = false;
 }
 
 void ClientStream::headArrived(std::size_t bodyBytes)
 {
     mBytesLeft = bodyBytes;
     mDeadline = Clock::now() + mLimits.body;
+    mIsPaced = true;
 }
 
 void ClientStream::closeAfterAnswer()
@@ -109,11 +114,21 @@ bool ClientStream::awaitsInput(std::chrono::milliseconds moment)
 
 bool ClientStream::flush()
 {
+    if (!mIsAnswering) { // making the answer is not the client's time
+        mDeadline = std::max(mDeadline, Clock::now() + mLimits.body);
+        mIsAnswering = true;
+    }
+    return sendAll();
+}
+
+bool ClientStream::sendAll()
+{
     std::size_t sent = 0;
     while (sent < mOutput.size()) {
         const ssize_t part = send(mOutput.data() + sent, mOutput.size() - sent);
         if (part <= 0)
             return fail();
+        notePace(part);
         sent += part;
     }
     mOutput.clear();
@@ -132,7 +147,7 @@ bool ClientStream::is_writable() const
 
 ssize_t ClientStream::read(char *bytes, size_t size)
 {
-    if (mBytesLeft == 0 || (mInputStart >= mInput.size() && (!flush() || !fill())))
+    if (mBytesLeft == 0 || (mInputStart >= mInput.size() && (!sendAll() || !fill())))
         return -1;
     const std::size_t part = std::min(size, mInput.size() - mInputStart);
     if (part > mBytesLeft) {
@@ -236,7 +251,16 @@ bool ClientStream::fill()
     mInputStart = 0;
     const ssize_t received = receive(mInput.data(), mInput.size());
     mInput.resize(received > 0 ? received : 0);
+    notePace(received);
     return received > 0 || fail();
+}
+
+// A client may take its time as long as it keeps up some pace.
+void ClientStream::notePace(ssize_t bytes)
+{
+    if (mIsPaced && bytes > 0)
+        mDeadline += std::chrono::microseconds(bytes * 1'000'000 /
+                                               static_cast<ssize_t>(mLimits.bytesPerSecond));
 }
 
 bool ClientStream::fail()

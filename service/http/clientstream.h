@@ -15,10 +15,11 @@ class ClientStream : public httplib::Stream
 public:
     struct Limits
     {
-        std::chrono::seconds head{10};    // from its first byte to the end of the header lines
-        std::chrono::seconds body{600};   // for the rest of the request and the answer
-        std::chrono::seconds silence{20}; // without a byte in either direction
-        std::size_t headBytes = 0;        // header lines
+        std::chrono::seconds head{10}; // from its first byte to the end of the header lines
+        std::chrono::seconds body{30}; // for the rest, and again for the answer, beside what ...
+        std::size_t bytesPerSecond = 4096; // ... that many bytes take
+        std::chrono::seconds silence{20};  // without a byte in either direction
+        std::size_t headBytes = 0;         // header lines
     };
 
     // Takes the socket over. `stopEvent` is a descriptor that becomes readable when every wait has
@@ -31,6 +32,7 @@ public:
     // Completes the TLS handshake, once; false when the client does not manage it.
     bool handshake();
     void beginRequest();
+    const std::string &address() const { return mAddress; }
     // The rest of the request has at most so many bytes.
     void headArrived(std::size_t bodyBytes);
     // Bytes of a next request are here already, or come within a moment.
@@ -57,18 +59,23 @@ private:
     bool waitForTls(int result);
     ssize_t receive(char *bytes, std::size_t size);
     ssize_t send(const char *bytes, std::size_t size);
+    bool sendAll();
     bool fill();
+    void notePace(ssize_t bytes);
     bool fail();
     void drain();
 
     const int mSocket;
     const int mStopEvent;
     const Limits mLimits;
+    std::string mAddress;
     SSL *mSsl = nullptr;
     bool mHandshakeDone = false;
     bool mBroken = false;
     bool mHasUnread = false;
     Clock::time_point mDeadline;
+    bool mIsPaced = false; // the deadline moves with what goes through
+    bool mIsAnswering = false;
     std::size_t mBytesLeft = 0;
     std::string mInput;
     std::size_t mInputStart = 0;

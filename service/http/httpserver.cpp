@@ -2,6 +2,7 @@
 
 #include "base/texts.h"
 #include "http/accesslog.h"
+#include "http/workers.h"
 
 #include <spdlog/spdlog.h>
 
@@ -20,6 +21,7 @@ constexpr int waitingConnections = 128;
 constexpr std::chrono::milliseconds nextRequestPatience{10};
 constexpr time_t keepAliveSeconds = 300;
 constexpr std::size_t keepAliveRequests = 1'000'000;
+constexpr std::size_t waitingOfAddress = 64;
 
 bool isTooLarge(const httplib::Request &request, std::size_t bodyBytes)
 {
@@ -39,6 +41,26 @@ bool takesBody(const httplib::Request &request)
     return request.method != "GET" && request.method != "HEAD" && request.method != "OPTIONS";
 }
 
+bool hasLength(const httplib::Request &request)
+{
+    return request.has_header("Content-Length") || request.has_header("Transfer-Encoding");
+}
+
+// Proxies and servers may read such a request differently.
+bool isAmbiguous(const httplib::Request &request)
+{
+    const std::size_t lengths = request.get_header_value_count("Content-Length");
+    return lengths > 1 || (lengths > 0 && request.has_header("Transfer-Encoding"));
+}
+
+// Kinds that the library would take apart on its own: a small packed body may become a thousand
+// times its size.
+bool isUnfit(const httplib::Request &request)
+{
+    const std::string encoding = request.get_header_value("Content-Encoding");
+    return (!encoding.empty() && encoding != "identity") || request.is_multipart_form_data();
+}
+
 // What the library would do with a request beyond our needs is taken out of it: answers are small
 // and the network is the house's own, so parts and compression cost more than they save.
 void simplify(httplib::Request &request)
@@ -54,10 +76,14 @@ const char *messageOf(int status)
         return "the request cannot be understood";
     case 404:
         return "there is nothing at this address";
+    case 411:
+        return "the request does not say how long its body is";
     case 413:
         return "the request is too large";
     case 414:
         return "the address is too long";
+    case 415:
+        return "bodies of this kind are not taken";
     default:
         return "the request cannot be answered";
     }
@@ -69,24 +95,13 @@ void explainFailure(const httplib::Request &, httplib::Response &response)
         answerError(response, response.status, messageOf(response.status));
 }
 
-void handleException(const httplib::Request &, httplib::Response &response, std::exception_ptr what)
-{
-    try {
-        std::rethrow_exception(what);
-    } catch (const std::exception &exception) {
-        spdlog::error("a request failed: {}", exception.what());
-    } catch (...) {
-        spdlog::error("a request failed");
-    }
-    answerError(response, 500, "the service has a problem; its log says which");
-}
-
 } // namespace
 
 HttpServer::HttpServer(const Router &router, const Settings &settings)
     : mRouter(router)
     , mSettings(settings)
     , mStopEvent(eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK))
+    , mTurns(std::size_t(std::max(1, settings.threads / 4)), waitingOfAddress)
 {
     setUp();
 }
@@ -99,7 +114,7 @@ HttpServer::~HttpServer()
 
 void HttpServer::setUp()
 {
-    new_task_queue = [this] { return mWorkers = new httplib::ThreadPool(mSettings.threads); };
+    new_task_queue = [this] { return mWorkers = new Workers(std::size_t(mSettings.threads)); };
     // Not as the library does: with a shared port two services would take turns unnoticed.
     set_socket_options([](socket_t socket) {
         const int on = 1;
@@ -120,10 +135,57 @@ void HttpServer::setUp()
     const Handler answer = [this](const httplib::Request &request, httplib::Response &response) {
         mRouter.answer(request, response);
     };
-    Post(".*", answer).Put(".*", answer).Patch(".*", answer).Delete(".*", answer);
+    Post(".*", [this](const httplib::Request &request, httplib::Response &response,
+                      const httplib::ContentReader &reader) { post(request, response, reader); });
+    Put(".*", answer).Patch(".*", answer).Delete(".*", answer);
     set_error_handler(Handler(explainFailure));
-    set_exception_handler(handleException);
+    set_exception_handler([this](const httplib::Request &, httplib::Response &response,
+                                 std::exception_ptr what) { explainException(response, what); });
     set_logger(logRequest);
+}
+
+// Nothing is done with a body that did not arrive whole. One that nobody wanted is read all the
+// same: it would be taken for the next request.
+void HttpServer::post(const httplib::Request &request, httplib::Response &response,
+                      const httplib::ContentReader &reader)
+{
+    bool isRead = false, isWhole = true;
+    std::size_t total = 0;
+    const Router::Body body = [&](const Router::Receiver &receiver) {
+        isRead = true;
+        isWhole = reader([&receiver, &total](const char *bytes, std::size_t size) {
+            total += size;
+            receiver({bytes, size});
+            return true;
+        });
+        return isWhole;
+    };
+    try {
+        mRouter.answer(request, response, body);
+    } catch (...) {
+        explainException(response, std::current_exception());
+    }
+    if (!isRead)
+        body([](std::string_view) {});
+    if (isWhole)
+        return;
+    httplib::Response refusal; // a body in chunks may turn out to be too long
+    const int status = total > mRouter.bodyLimit(request, refusal) ? 413 : 400;
+    answerError(response, status, messageOf(status));
+}
+
+void HttpServer::explainException(httplib::Response &response, std::exception_ptr what) const
+{
+    try {
+        std::rethrow_exception(what);
+    } catch (const std::exception &exception) {
+        spdlog::error("a request failed: {}", exception.what());
+        if (mSettings.isStorageFull && mSettings.isStorageFull(exception))
+            return answerError(response, 507, "the service has no room to store anything");
+    } catch (...) {
+        spdlog::error("a request failed");
+    }
+    answerError(response, 500, "the service has a problem; its log says which");
 }
 
 // A body has to be read first, if it is not too long.
@@ -131,9 +193,15 @@ HttpServer::HandlerResponse HttpServer::takeBody(const httplib::Request &request
                                                  httplib::Response &response)
 {
     httplib::Response refusal;
-    if (!isTooLarge(request, mRouter.bodyLimit(request, refusal)))
+    if (isAmbiguous(request))
+        answerError(refusal, 400, messageOf(400));
+    else if (isUnfit(request))
+        answerError(refusal, 415, messageOf(415));
+    else if (!hasLength(request) && request.method != "DELETE")
+        answerError(refusal, 411, messageOf(411));
+    else if (!isTooLarge(request, mRouter.bodyLimit(request, refusal)))
         return HandlerResponse::Unhandled;
-    if (refusal.body.empty())
+    else if (refusal.body.empty())
         answerError(refusal, 413, messageOf(413));
     response.status = refusal.status;
     response.body = std::move(refusal.body);
@@ -152,7 +220,9 @@ bool HttpServer::start()
     if (mPort <= 0 || ::listen(svr_sock_, waitingConnections) != 0)
         return false;
     mParking = std::make_unique<Parking>(
-        [this](Client client) { mWorkers->enqueue([this, client] { serve(client); }); },
+        [this](Client client) {
+            mWorkers->enqueue([this, client]() mutable { serve(std::move(client)); });
+        },
         Parking::Limits{std::chrono::seconds(keepAliveSeconds)});
     mListener = std::thread([this] { listen_after_bind(); });
     while (!is_running()) // stop() has no effect before
@@ -167,6 +237,7 @@ void HttpServer::stop()
     eventfd_write(mStopEvent, 1);
     if (mParking)
         mParking->stop();
+    mTurns.clear();
     httplib::Server::stop();
     if (mListener.joinable())
         mListener.join();
@@ -182,7 +253,16 @@ bool HttpServer::process_and_close_socket(socket_t socket)
     return true;
 }
 
-void HttpServer::serve(const Client &client)
+void HttpServer::serve(Client client)
+{
+    if (mStopping || !mTurns.take(client))
+        return;
+    const std::string address = client->address();
+    for (; client; client = mTurns.pass(address))
+        serveRequests(client);
+}
+
+void HttpServer::serveRequests(const Client &client)
 {
     if (mStopping)
         return;
@@ -215,7 +295,8 @@ bool HttpServer::serveRequest(ClientStream &client)
         simplify(request);
         noteRequestStart();
         // Bytes that nobody reads would be taken for the next request.
-        if (isTooLarge(request, limit) ||
+        if (isTooLarge(request, limit) || isUnfit(request) || isAmbiguous(request) ||
+            (takesBody(request) && !hasLength(request)) ||
             (hasBody(request) && (!takesBody(request) || request.path.size() > longestPath)))
             client.closeAfterAnswer();
     };

@@ -3,13 +3,14 @@
 #include "http/certificate.h"
 #include "http/parking.h"
 #include "http/router.h"
+#include "http/turns.h"
 
 #include <httplib.h>
 
 #include <atomic>
 
 // The HTTP library's server on connections of our own: a client that keeps its connection open
-// costs no thread while it is silent, and stopping waits for nobody.
+// costs no thread while it is silent, none can take all threads, and stopping waits for nobody.
 //
 //   listener --> Parking --(has something to say)--> worker: handshake, requests, answers
 //                   ^                                   |
@@ -20,9 +21,11 @@ public:
     struct Settings
     {
         std::string address;
-        int port = 0; // 0: a free one
-        int threads = 16;
+        int port = 0;               // 0: a free one
+        int threads = 128;          // requests at the same time; a quarter of them for one address
         SSL_CTX *context = nullptr; // no TLS without one
+        // Whether something failed because there is no room on the disk.
+        std::function<bool(const std::exception &)> isStorageFull;
     };
 
     HttpServer(const Router &router, const Settings &settings);
@@ -38,9 +41,13 @@ private:
 
     bool process_and_close_socket(socket_t socket) override;
     void setUp();
-    void serve(const Client &client);
+    void serve(Client client);
+    void serveRequests(const Client &client);
     bool serveRequest(ClientStream &client);
     HandlerResponse takeBody(const httplib::Request &request, httplib::Response &response);
+    void post(const httplib::Request &request, httplib::Response &response,
+              const httplib::ContentReader &reader);
+    void explainException(httplib::Response &response, std::exception_ptr what) const;
 
     const Router &mRouter;
     const Settings mSettings;
@@ -48,6 +55,7 @@ private:
     int mPort = 0;
     httplib::TaskQueue *mWorkers = nullptr; // owned by the library while it listens
     std::atomic<bool> mStopping{false};
+    Turns mTurns;
     std::unique_ptr<Parking> mParking;
     std::thread mListener;
 };

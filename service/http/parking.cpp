@@ -110,12 +110,19 @@ std::vector<Parking::Client> Parking::takePatientless()
     return clients;
 }
 
+// One device that opens hundreds must not push the others out.
 Parking::Client Parking::takeLongest()
 {
-    const auto longest =
-        std::min_element(mPlaces.begin(), mPlaces.end(), [](const auto &one, const auto &other) {
-            return one.second.since < other.second.since;
-        });
+    std::map<std::string, std::size_t> counts;
+    for (const auto &[socket, place] : mPlaces)
+        ++counts[place.client->address()];
+    const auto rank = [&counts](const auto &entry) {
+        const Place &place = entry.second;
+        return std::make_pair(counts[place.client->address()], Clock::now() - place.since);
+    };
+    const auto longest = std::max_element(
+        mPlaces.begin(), mPlaces.end(),
+        [&rank](const auto &one, const auto &other) { return rank(one) < rank(other); });
     Client client = std::move(longest->second.client);
     epoll_ctl(mEvents, EPOLL_CTL_DEL, longest->first, nullptr);
     mPlaces.erase(longest);

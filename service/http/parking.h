@@ -18,7 +18,8 @@ public:
     struct Limits
     {
         std::chrono::seconds patience{300}; // then a silent connection is closed
-        std::size_t clients = 512;          // beyond it the one that waits the longest goes
+        std::size_t clients =
+            512; // beyond it the longest waiting one goes, of the address with most
     };
 
     // `ready` is called on the watching thread.

@@ -46,10 +46,14 @@ std::optional<std::vector<std::string>> match(const std::vector<std::string> &pa
 
 } // namespace
 
-void Router::add(const std::string &method, const std::string &pattern, Handler handler,
-                 BodyLimit limit)
+void Router::add(const std::string &method, const std::string &pattern, Handler handler)
 {
-    mRoutes.push_back({method, splitPath("/" + pattern), std::move(handler), std::move(limit)});
+    mRoutes.push_back({method, splitPath("/" + pattern), std::move(handler), {}});
+}
+
+void Router::addReader(const std::string &pattern, Handler handler, BodyLimit limit)
+{
+    mRoutes.push_back({"POST", splitPath("/" + pattern), std::move(handler), std::move(limit)});
 }
 
 Router::Found Router::find(const httplib::Request &request) const
@@ -68,15 +72,22 @@ Router::Found Router::find(const httplib::Request &request) const
     return found;
 }
 
-void Router::answer(const httplib::Request &request, httplib::Response &response) const
+void Router::answer(const httplib::Request &request, httplib::Response &response,
+                    const Body &body) const
 {
     Found found = find(request);
-    if (found.route)
-        found.route->handler({request, std::move(found.places)}, response);
-    else if (found.isKnownPath)
-        answerError(response, 405, "this address does not take " + request.method);
-    else
-        answerError(response, 404, "there is nothing at this address");
+    if (!found.route) {
+        if (found.isKnownPath)
+            answerError(response, 405, "this address does not take " + request.method);
+        else
+            answerError(response, 404, "there is nothing at this address");
+        return;
+    }
+    if (!body || found.route->limit)
+        return found.route->handler({request, std::move(found.places), body}, response);
+    httplib::Request whole = request;
+    if (body([&whole](std::string_view bytes) { whole.body.append(bytes); }))
+        found.route->handler({whole, std::move(found.places), body}, response);
 }
 
 std::size_t Router::bodyLimit(const httplib::Request &request, httplib::Response &response) const
@@ -84,7 +95,8 @@ std::size_t Router::bodyLimit(const httplib::Request &request, httplib::Response
     Found found = find(request);
     if (!found.route || !found.route->limit)
         return standardBody;
-    return found.route->limit({request, std::move(found.places)}, response);
+    static const Body none;
+    return found.route->limit({request, std::move(found.places), none}, response);
 }
 
 void answerError(httplib::Response &response, int status, const std::string &message)

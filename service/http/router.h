@@ -12,10 +12,14 @@
 class Router
 {
 public:
+    using Receiver = std::function<void(std::string_view bytes)>;
+    // Reads a request's body, once, piece by piece; false when it does not arrive whole.
+    using Body = std::function<bool(const Receiver &receiver)>;
     struct Call
     {
         const httplib::Request &request;
         std::vector<std::string> pieces; // what stood in the place of each "*"
+        const Body &body;                // only for functions that read it themselves
     };
     using Handler = std::function<void(const Call &, httplib::Response &)>;
     // How many bytes of body a request may bring, decided by its head; an answer to one that brings
@@ -24,11 +28,14 @@ public:
     static constexpr std::size_t standardBody = 1024 * 1024;
 
     // `pattern` as in "photos/*/*"; a HEAD request goes to the function for GET.
-    void add(const std::string &method, const std::string &pattern, Handler handler,
-             BodyLimit limit = {});
+    void add(const std::string &method, const std::string &pattern, Handler handler);
+    // A function for POST that reads the body itself, however long it is.
+    void addReader(const std::string &pattern, Handler handler, BodyLimit limit);
 
-    // Calls the function of the route, or answers that there is none.
-    void answer(const httplib::Request &request, httplib::Response &response) const;
+    // Calls the function of the route, or answers that there is none. A `body`, if there is one, is
+    // put into the request first, unless the function reads it itself.
+    void answer(const httplib::Request &request, httplib::Response &response,
+                const Body &body = {}) const;
     std::size_t bodyLimit(const httplib::Request &request, httplib::Response &response) const;
 
 private:
@@ -37,7 +44,7 @@ private:
         std::string method;
         std::vector<std::string> pattern;
         Handler handler;
-        BodyLimit limit;
+        BodyLimit limit; // of those that read the body themselves
     };
     struct Found
     {

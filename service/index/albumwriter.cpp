@@ -11,6 +11,12 @@ namespace {
 constexpr std::size_t keyBytes = 16;
 constexpr std::int64_t nanoseconds = 1'000'000'000;
 
+struct AlbumPlace
+{
+    std::int64_t user;
+    std::int64_t album;
+};
+
 // The album's row, made or changed to the state.
 std::int64_t writeAlbum(Session &session, const FolderState &state)
 {
@@ -36,24 +42,51 @@ std::string timeOf(const FoundFile &file)
                                        : file.metadata.taken;
 }
 
+// What the photo is known by when its bytes are not.
+std::string sizeAndTime(const FoundFile &file)
+{
+    return std::to_string(file.size) + " " + std::to_string(file.changed);
+}
+
+// The photo takes its new place, with all that belongs to it. Another one that was there before and
+// is gone makes room. The result is the album that it has left.
+std::int64_t movePhoto(Session &session, std::int64_t albumId, const FoundFile &file)
+{
+    std::int64_t oldAlbum = 0;
+    {
+        Query query(session, "SELECT album FROM photos WHERE id = ?", file.movedFrom);
+        oldAlbum = query.next() ? query.number(0) : 0;
+    }
+    Query(session, "DELETE FROM photos WHERE album = ? AND name = ? AND present = 0 AND id <> ?",
+          albumId, file.name, file.movedFrom)
+        .run();
+    Query(session, "UPDATE OR IGNORE photos SET album = ?, name = ? WHERE id = ?", albumId,
+          file.name, file.movedFrom)
+        .run();
+    return oldAlbum;
+}
+
 // A file that changed keeps its id, its key, its comments and what people tagged it with.
-std::int64_t writePhoto(Session &session, std::int64_t albumId, const FoundFile &file)
+std::int64_t writePhoto(Session &session, const AlbumPlace &place, const FoundFile &file)
 {
     const PhotoMetadata &metadata = file.metadata;
     Query(session,
           "INSERT INTO photos (album, name, key, size, changed, present, error, mimeType, width, "
-          "height, title, caption, published, latitude, longitude) "
-          "VALUES (?1, ?2, ?3, ?4, ?5, 1, ?6, ?7, ?8, ?9, ?10, ?11, ?12, ?13, ?14) "
+          "height, title, caption, published, latitude, longitude, user, added, content) "
+          "VALUES (?1, ?2, ?3, ?4, ?5, 1, ?6, ?7, ?8, ?9, ?10, ?11, ?12, ?13, ?14, ?15, ?16, ?17) "
           "ON CONFLICT (album, name) DO UPDATE SET size = ?4, changed = ?5, present = 1, "
           "error = ?6, mimeType = ?7, width = ?8, height = ?9, "
           "title = CASE givenTitle WHEN '' THEN ?10 ELSE givenTitle END, "
           "caption = CASE givenCaption WHEN '' THEN ?11 ELSE givenCaption END, "
-          "published = ?12, latitude = ?13, longitude = ?14",
-          albumId, file.name, randomText(keyBytes), file.size, file.changed, file.error,
+          "published = ?12, latitude = ?13, longitude = ?14, content = ?17",
+          place.album, file.name, randomText(keyBytes), file.size, file.changed, file.error,
           metadata.mimeType, metadata.width, metadata.height, titleOf(file), metadata.caption,
-          timeOf(file), metadata.latitude, metadata.longitude)
+          timeOf(file), metadata.latitude, metadata.longitude, place.user,
+          file.added > 0 ? file.added : currentSeconds(),
+          file.content.empty() ? sizeAndTime(file) : file.content)
         .run();
-    Query query(session, "SELECT id FROM photos WHERE album = ? AND name = ?", albumId, file.name);
+    Query query(session, "SELECT id FROM photos WHERE album = ? AND name = ?", place.album,
+                file.name);
     return query.next() ? query.number(0) : 0;
 }
 
@@ -61,7 +94,10 @@ void writeKeywords(Session &session, std::int64_t photoId, const std::vector<std
 {
     Query(session, "DELETE FROM tags WHERE photo = ? AND author IS NULL", photoId).run();
     for (const std::string &keyword : keywords)
-        Query(session, "INSERT OR IGNORE INTO tags (photo, tag) VALUES (?, ?)", photoId, keyword)
+        Query(session,
+              "INSERT OR IGNORE INTO tags (photo, tag) SELECT ?1, ?2 WHERE NOT EXISTS "
+              "(SELECT 1 FROM droppedKeywords WHERE photo = ?1 AND tag = ?2)",
+              photoId, keyword)
             .run();
 }
 
@@ -92,12 +128,30 @@ bool isPrivacyChanged(Session &session, const FolderState &state)
     return query.next() && (query.number(0) != 0) != state.isPrivate;
 }
 
+// The addresses of an album's pictures, which take no token, end when the album becomes private.
+void renewKeys(Session &session, std::int64_t albumId)
+{
+    std::vector<std::int64_t> photoIds;
+    {
+        Query query(session, "SELECT id FROM photos WHERE album = ?", albumId);
+        while (query.next())
+            photoIds.push_back(query.number(0));
+    }
+    for (const std::int64_t id : photoIds)
+        Query(session, "UPDATE photos SET key = ? WHERE id = ?", randomText(keyBytes), id).run();
+}
+
 void writeFolder(Session &session, const FolderChanges &changes)
 {
     const bool privacyChanged = isPrivacyChanged(session, changes.state);
     const std::int64_t albumId = writeAlbum(session, changes.state);
     for (const FoundFile &file : changes.found) {
-        const std::int64_t photoId = writePhoto(session, albumId, file);
+        if (file.movedFrom != 0) {
+            const std::int64_t oldAlbum = movePhoto(session, albumId, file);
+            if (oldAlbum != albumId)
+                refreshAlbum(session, oldAlbum);
+        }
+        const std::int64_t photoId = writePhoto(session, {changes.state.userId, albumId}, file);
         writeKeywords(session, photoId, file.metadata.keywords);
         refreshPhotoSearch(session, photoId);
     }
@@ -105,6 +159,8 @@ void writeFolder(Session &session, const FolderChanges &changes)
         setPresent(session, photoId, false);
     for (const std::int64_t photoId : changes.back)
         setPresent(session, photoId, true);
+    if (privacyChanged && changes.state.isPrivate)
+        renewKeys(session, albumId);
     if (privacyChanged)
         refreshAlbumSearch(session, albumId);
     refreshAlbum(session, albumId);
@@ -132,16 +188,37 @@ std::map<std::string, KnownFile> knownFiles(Session &session, std::int64_t album
     return files;
 }
 
+std::vector<LikePhoto> photosLike(Session &session, std::int64_t userId, const FoundFile &file)
+{
+    std::vector<LikePhoto> photos;
+    const auto add = [&photos](Query &&query) {
+        while (query.next())
+            photos.push_back({query.number(0), query.text(1), query.text(2)});
+    };
+    // Folders that are renamed keep the names of their files.
+    add(Query(session,
+              "SELECT p.id, a.folder, p.name FROM photos p JOIN albums a ON a.id = p.album "
+              "WHERE p.content IN (?, ?) AND p.name = ? AND p.user = ? LIMIT 8",
+              file.content, sizeAndTime(file), file.name, userId));
+    add(Query(session,
+              "SELECT p.id, a.folder, p.name FROM photos p JOIN albums a ON a.id = p.album "
+              "WHERE p.content IN (?, ?) AND p.user = ? LIMIT 8",
+              file.content, sizeAndTime(file), userId));
+    return photos;
+}
+
 std::int64_t presentPhotos(Session &session, std::int64_t userId)
 {
     Query query(session, "SELECT coalesce(sum(photoCount), 0) FROM albums WHERE user = ?", userId);
     return query.next() ? query.number(0) : 0;
 }
 
-std::int64_t addPhoto(Database &database, const FolderState &state, const FoundFile &file,
+std::int64_t addPhoto(Database &database, FolderState state, const FoundFile &file,
                       const GivenTexts &texts)
 {
     Database::Writer writer(database);
+    if (isPrivacyChanged(writer, state)) // while the photo was on its way
+        state.isPrivate = !state.isPrivate;
     writeFolder(writer, {state, {file}, {}, {}});
     std::int64_t photoId = 0;
     {
@@ -161,6 +238,14 @@ std::int64_t addPhoto(Database &database, const FolderState &state, const FoundF
     raiseRevision(writer, Revision::Photos);
     writer.commit();
     return photoId;
+}
+
+void markShown(Database &database, const std::set<std::int64_t> &photoIds)
+{
+    Database::Writer writer(database);
+    for (const std::int64_t id : photoIds)
+        Query(writer, "UPDATE photos SET shown = 1 WHERE id = ? AND shown = 0", id).run();
+    writer.commit();
 }
 
 void writeChanges(Database &database, const std::vector<FolderChanges> &changes)

@@ -1,19 +1,9 @@
 #include "index/catalogue.h"
 
 #include "index/database.h"
-
-#include <cctype>
+#include "index/photorows.h"
 
 namespace {
-
-// One text for every list of photos: what follows it picks and orders.
-#define PHOTO_COLUMNS                                                                              \
-    "SELECT p.id, p.album, a.user, u.name, p.key, p.name, p.size, p.width, p.height, p.title, "    \
-    "p.caption, p.published, p.mimeType, "                                                         \
-    "(SELECT group_concat(tag, ', ') FROM (SELECT tag FROM tags WHERE photo = p.id ORDER BY "      \
-    "id)), "                                                                                       \
-    "(SELECT count(*) FROM comments WHERE photo = p.id), p.latitude, p.longitude "                 \
-    "FROM photos p JOIN albums a ON a.id = p.album JOIN users u ON u.id = a.user "
 
 #define ALBUM_COLUMNS                                                                              \
     "SELECT a.id, a.user, u.name, a.title, a.private, a.photoCount, a.published, a.cover "         \
@@ -22,35 +12,11 @@ namespace {
 #define PATH_OF_PHOTO                                                                              \
     "u.photos || '/' || CASE a.folder WHEN '' THEN '' ELSE a.folder || '/' END || p.name"
 
-PhotoRecord photoAt(const Query &query)
-{
-    PhotoRecord photo;
-    photo.id = query.number(0);
-    photo.albumId = query.number(1);
-    photo.userId = query.number(2);
-    photo.userName = query.text(3);
-    photo.key = query.text(4);
-    photo.fileName = query.text(5);
-    photo.fileSize = query.number(6);
-    photo.width = static_cast<int>(query.number(7));
-    photo.height = static_cast<int>(query.number(8));
-    photo.title = query.text(9);
-    photo.caption = query.text(10);
-    photo.published = query.text(11);
-    photo.mimeType = query.text(12);
-    photo.keywords = query.text(13);
-    photo.commentCount = static_cast<int>(query.number(14));
-    if (!query.isNull(15) && !query.isNull(16)) {
-        photo.latitude = query.real(15);
-        photo.longitude = query.real(16);
-    }
-    return photo;
-}
-
 AlbumRecord albumAt(const Query &query)
 {
     AlbumRecord album;
     album.id = query.number(0);
+    album.feedId = query.text(0);
     album.userId = query.number(1);
     album.userName = query.text(2);
     album.title = query.text(3);
@@ -60,19 +26,6 @@ AlbumRecord albumAt(const Query &query)
     if (!query.isNull(7))
         album.cover = query.number(7);
     return album;
-}
-
-std::vector<std::int64_t> numbersOf(Query &&query)
-{
-    std::vector<std::int64_t> numbers;
-    while (query.next())
-        numbers.push_back(query.number(0));
-    return numbers;
-}
-
-bool isWordByte(unsigned char byte)
-{
-    return byte >= 0x80 || std::isalnum(byte);
 }
 
 } // namespace
@@ -144,39 +97,6 @@ std::vector<PhotoRecord> photosWithIds(Session &session, const std::vector<std::
     return photos;
 }
 
-std::string searchExpression(const std::string &text)
-{
-    std::string expression, word;
-    const auto finishWord = [&] {
-        if (!word.empty())
-            expression += (expression.empty() ? "\"" : " \"") + word + "\"*";
-        word.clear();
-    };
-    for (const char c : text) {
-        if (isWordByte(static_cast<unsigned char>(c)))
-            word += c;
-        else
-            finishWord();
-    }
-    finishWord();
-    return expression;
-}
-
-std::int64_t searchCount(Session &session, const std::string &expression)
-{
-    Query query(session, "SELECT count(*) FROM photoSearch WHERE photoSearch MATCH ?", expression);
-    return query.next() ? query.number(0) : 0;
-}
-
-std::vector<std::int64_t> searchPhotos(Session &session, const std::string &expression,
-                                       const Page &page)
-{
-    return numbersOf(Query(session,
-                           "SELECT rowid FROM photoSearch WHERE photoSearch MATCH ? "
-                           "ORDER BY rowid DESC LIMIT ? OFFSET ?",
-                           expression, page.count, page.start - 1));
-}
-
 std::vector<CommentRecord> commentsOf(Session &session, std::int64_t photoId)
 {
     std::vector<CommentRecord> comments;
@@ -213,14 +133,15 @@ std::optional<PhotoRecord> portraitOf(Session &session, std::int64_t userId)
 std::optional<PhotoFile> fileWithKey(Session &session, const std::string &key)
 {
     Query query(session,
-                "SELECT " PATH_OF_PHOTO ", p.id, p.size, p.changed, u.photos FROM photos p "
+                "SELECT " PATH_OF_PHOTO
+                ", p.id, p.size, p.changed, u.photos, p.shown FROM photos p "
                 "JOIN albums a ON a.id = p.album JOIN users u ON u.id = a.user "
                 "WHERE p.key = ? AND p.present = 1",
                 key);
     if (!query.next())
         return std::nullopt;
     return PhotoFile{query.text(0), query.text(1) + "-" + query.text(2) + "-" + query.text(3),
-                     query.text(4)};
+                     query.text(4), query.number(1), query.number(5) != 0};
 }
 
 std::vector<UnreadablePhoto> unreadablePhotos(Session &session)

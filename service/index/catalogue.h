@@ -26,13 +26,6 @@ std::vector<PhotoRecord> photosOf(Session &session, std::int64_t albumId, const 
 std::optional<PhotoRecord> photoWithId(Session &session, std::int64_t photoId);
 std::vector<PhotoRecord> photosWithIds(Session &session, const std::vector<std::int64_t> &ids);
 
-// A MATCH expression for photos that hold a word beginning with each word of the text; empty for a
-// text without a word.
-std::string searchExpression(const std::string &text);
-std::int64_t searchCount(Session &session, const std::string &expression);
-std::vector<std::int64_t> searchPhotos(Session &session, const std::string &expression,
-                                       const Page &page);
-
 std::vector<CommentRecord> commentsOf(Session &session, std::int64_t photoId);
 std::vector<std::string> tagsOf(Session &session, std::int64_t photoId);
 // A public photo that may stand for the user.

@@ -1,5 +1,6 @@
 #include "index/database.h"
 
+#include "index/photosearch.h"
 #include "index/schema.h"
 
 #include <fcntl.h>
@@ -27,8 +28,10 @@ Session::Session(const std::string &file, bool readOnly)
                 (readOnly ? SQLite::OPEN_READONLY : SQLite::OPEN_READWRITE) | SQLite::OPEN_NOMUTEX,
                 busyMilliseconds)
 {
-    if (!readOnly)
+    if (!readOnly) {
         mDatabase.exec("PRAGMA journal_mode = WAL; PRAGMA foreign_keys = ON;");
+        addSearchFunctions(mDatabase);
+    }
     mDatabase.exec("PRAGMA cache_size = -4096; PRAGMA mmap_size = 268435456;");
 }
 

@@ -38,7 +38,8 @@ struct PhotoRecord
 
 struct AlbumRecord
 {
-    std::int64_t id = 0;
+    std::int64_t id = 0; // 0: gathered by the service, not a folder
+    std::string feedId;  // what feeds call it
     std::int64_t userId = 0;
     std::string userName;
     std::string title;
@@ -63,6 +64,8 @@ struct PhotoFile
     std::string path;
     std::string identity; // changes with the file
     std::string folder;   // of its owner
+    std::int64_t photoId = 0;
+    bool isShown = false; // has been on a screen
 };
 
 // A part of a list: `start` counts from 1.

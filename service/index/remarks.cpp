@@ -37,6 +37,7 @@ bool removeComment(Database &database, std::int64_t commentId)
 void addTag(Database &database, std::int64_t photoId, std::int64_t author, const std::string &tag)
 {
     Database::Writer writer(database);
+    Query(writer, "DELETE FROM droppedKeywords WHERE photo = ? AND tag = ?", photoId, tag).run();
     Query(writer, "INSERT OR IGNORE INTO tags (photo, tag, author) VALUES (?, ?, ?)", photoId, tag,
           author)
         .run();
@@ -49,6 +50,11 @@ bool removeTag(Database &database, std::int64_t photoId, const std::string &tag)
     Database::Writer writer(database);
     const bool found =
         Query(writer, "DELETE FROM tags WHERE photo = ? AND tag = ?", photoId, tag).run() > 0;
+    // Or the file's keyword comes back when the file changes.
+    if (found)
+        Query(writer, "INSERT OR IGNORE INTO droppedKeywords (photo, tag) VALUES (?, ?)", photoId,
+              tag)
+            .run();
     refreshPhotoSearch(writer, photoId);
     writer.commit();
     return found;

@@ -1,6 +1,7 @@
 #include "index/schema.h"
 
 #include "index/database.h"
+#include "index/photosearch.h"
 
 namespace {
 
@@ -109,7 +110,51 @@ CREATE INDEX showablePhotos ON photos (album, published, key, present, error)
     WHERE present = 1 AND error = '';
 )sql";
 
-const char *const steps[] = {firstVersion, givenTexts, featuredMemory};
+// What the albums need that the service gathers itself: whose photo it is without a look at its
+// album, when it came, and whether it has been on a screen. `scanned`: a walk through the user's
+// whole folder has ended, so what is found from now on is new.
+const char gatheredAlbums[] = R"sql(
+ALTER TABLE users ADD COLUMN scanned INTEGER NOT NULL DEFAULT 0;
+UPDATE users SET scanned = EXISTS (SELECT 1 FROM albums WHERE user = users.id);
+ALTER TABLE photos ADD COLUMN user INTEGER NOT NULL DEFAULT 0;
+ALTER TABLE photos ADD COLUMN added INTEGER NOT NULL DEFAULT 0;
+ALTER TABLE photos ADD COLUMN shown INTEGER NOT NULL DEFAULT 0;
+UPDATE photos SET user = (SELECT user FROM albums WHERE id = album), added = changed / 1000000000;
+CREATE INDEX photosByTime ON photos (user, published, name) WHERE present = 1 AND error = '';
+CREATE INDEX photosByDay ON photos (user, substr(published, 6, 5), published)
+    WHERE present = 1 AND error = '';
+CREATE INDEX photosByArrival ON photos (user, added, published)
+    WHERE present = 1 AND error = '';
+CREATE INDEX neverShownPhotos ON photos (user, published, name)
+    WHERE present = 1 AND error = '' AND shown = 0;
+CREATE INDEX tagsByName ON tags (tag COLLATE NOCASE, photo);
+)sql";
+
+// Search texts in one spelling, with people and dates. Photos stand under the number of their user,
+// as in "u7": a user who takes another name needs no new texts.
+const char searchInAnyScript[] = R"sql(
+DROP TABLE photoSearch;
+CREATE VIRTUAL TABLE photoSearch USING fts5 (
+    title, caption, tags, album, date, people,
+    tokenize = "unicode61 remove_diacritics 0 categories 'L* M* N*'", prefix = '1 2 3'
+);
+)sql" REFRESH_ALL_PHOTO_SEARCH;
+
+// What a file is known by when it lies elsewhere, and the keywords of files that people do not
+// want. For files read before, size and time have to do.
+const char movedFiles[] = R"sql(
+ALTER TABLE photos ADD COLUMN content TEXT NOT NULL DEFAULT '';
+UPDATE photos SET content = size || ' ' || changed;
+CREATE INDEX photosByContent ON photos (content, name);
+CREATE TABLE droppedKeywords (
+    photo INTEGER NOT NULL REFERENCES photos (id) ON DELETE CASCADE,
+    tag TEXT NOT NULL,
+    PRIMARY KEY (photo, tag)
+) WITHOUT ROWID;
+)sql";
+
+const char *const steps[] = {firstVersion,   givenTexts,        featuredMemory,
+                             gatheredAlbums, searchInAnyScript, movedFiles};
 constexpr int newestVersion = sizeof steps / sizeof steps[0];
 
 } // namespace

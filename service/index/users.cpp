@@ -44,6 +44,7 @@ std::int64_t saveUser(Session &writer, const UserRecord &user)
     Query(writer,
           "INSERT INTO users (mail, name, photos) VALUES (?1, ?2, ?3) "
           "ON CONFLICT (mail) DO UPDATE SET name = ?2, "
+          "scanned = CASE WHEN ?3 IN ('', photos) THEN scanned ELSE 0 END, "
           "photos = CASE WHEN ?3 = '' THEN photos ELSE ?3 END",
           user.mail, user.name, user.photos)
         .run();
@@ -73,6 +74,19 @@ bool removeUser(Database &database, const std::string &mail)
     raiseRevision(writer, Revision::Photos);
     writer.commit();
     return found;
+}
+
+bool isScanned(Session &session, std::int64_t userId)
+{
+    Query query(session, "SELECT scanned FROM users WHERE id = ?", userId);
+    return query.next() && query.number(0) != 0;
+}
+
+void noteScanned(Database &database, std::int64_t userId)
+{
+    Database::Writer writer(database);
+    Query(writer, "UPDATE users SET scanned = 1 WHERE id = ?", userId).run();
+    writer.commit();
 }
 
 std::int64_t usersRevision(Session &session)

@@ -19,5 +19,9 @@ std::int64_t saveUser(Database &database, const UserRecord &user);
 // With photos, comments and tokens; false if there was no such user. No file is touched.
 bool removeUser(Database &database, const std::string &mail);
 
+// Whether a walk through the user's whole folder has ended; a new folder starts anew.
+bool isScanned(Session &session, std::int64_t userId);
+void noteScanned(Database &database, std::int64_t userId);
+
 // Changes whenever a user comes, goes or is changed, by any process.
 std::int64_t usersRevision(Session &session);

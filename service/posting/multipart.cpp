@@ -6,7 +6,9 @@
 namespace {
 
 const std::string_view relatedType = "multipart/related";
-constexpr std::size_t mostParts = 10;
+constexpr int mostParts = 10;
+constexpr std::size_t longestHead = 8 * 1024;
+constexpr std::size_t longestBlanks = 200; // behind a boundary, in its line
 
 std::string lowered(std::string_view text)
 {
@@ -24,56 +26,111 @@ std::string_view trimmed(std::string_view text)
     return text.substr(first, text.find_last_not_of(" \t\r") - first + 1);
 }
 
-// Takes the first line, without its end, off the text.
-std::string_view takeLine(std::string_view &text)
-{
-    const std::size_t end = std::min(text.find('\n'), text.size());
-    const std::string_view line = text.substr(0, end);
-    text.remove_prefix(std::min(end + 1, text.size()));
-    return trimmed(line);
-}
-
-BodyPart partOf(std::string_view text)
-{
-    BodyPart part;
-    for (std::string_view line = takeLine(text); !line.empty(); line = takeLine(text)) {
-        const std::size_t colon = std::min(line.find(':'), line.size());
-        if (lowered(line.substr(0, colon)) == "content-type" && colon < line.size()) {
-            const std::string_view value = line.substr(colon + 1);
-            part.contentType = lowered(trimmed(value.substr(0, value.find(';'))));
-        }
-    }
-    part.content = text;
-    return part;
-}
-
-// A line that goes on in another way is content.
-bool endsDelimiter(std::string_view rest)
-{
-    const std::size_t end = rest.find_first_not_of(" \t\r");
-    return rest.substr(0, 2) == "--" || (end != std::string_view::npos && rest[end] == '\n');
-}
-
-// Where the next line that is a delimiter starts.
-std::size_t findDelimiter(std::string_view body, std::string_view delimiter, std::size_t from)
-{
-    for (std::size_t at = from; (at = body.find(delimiter, at)) != std::string_view::npos; ++at) {
-        if ((at == 0 || body[at - 1] == '\n') && endsDelimiter(body.substr(at + delimiter.size())))
-            return at;
-    }
-    return std::string_view::npos;
-}
-
-std::string_view withoutLineEnd(std::string_view text)
-{
-    for (const char end : {'\n', '\r'}) {
-        if (!text.empty() && text.back() == end)
-            text.remove_suffix(1);
-    }
-    return text;
-}
-
 } // namespace
+
+MultipartReader::MultipartReader(const std::string &boundary, Begin begin, Content content)
+    : mDelimiter("\n--" + boundary)
+    , mBegin(std::move(begin))
+    , mContent(std::move(content))
+{
+}
+
+void MultipartReader::feed(std::string_view bytes)
+{
+    if (mState == State::Behind || mState == State::Broken)
+        return;
+    mBytes.append(bytes);
+    while (step())
+        continue;
+}
+
+// True when there is more to do with the bytes that are here.
+bool MultipartReader::step()
+{
+    switch (mState) {
+    case State::Head:
+        return readHead();
+    case State::Before:
+    case State::Content:
+        return readContent();
+    default:
+        return false;
+    }
+}
+
+bool MultipartReader::readHead()
+{
+    const std::size_t end = mBytes.find('\n');
+    if (std::min(end, mBytes.size()) > longestHead)
+        mState = State::Broken;
+    if (mState == State::Broken || end == std::string::npos)
+        return false;
+    const std::string_view line = trimmed(std::string_view(mBytes).substr(0, end));
+    const std::size_t colon = std::min(line.find(':'), line.size());
+    if (line.empty()) {
+        mBegin(mType);
+        mState = State::Content;
+        mBytes.erase(0, end); // this very line end stands before the boundary of an empty part
+        mHasLineEnd = true;
+        return true;
+    }
+    if (lowered(line.substr(0, colon)) == "content-type" && colon < line.size()) {
+        const std::string_view value = line.substr(colon + 1);
+        mType = lowered(trimmed(value.substr(0, value.find(';'))));
+    }
+    mBytes.erase(0, end + 1);
+    return true;
+}
+
+bool MultipartReader::readContent()
+{
+    const std::size_t at = mBytes.find(mDelimiter);
+    if (at == std::string::npos) {
+        const std::size_t kept = mDelimiter.size() + 1; // may be its start, behind a "\r"
+        give(mBytes.size() - std::min(kept, mBytes.size()));
+        return false;
+    }
+    const Line line = lineAt(at + mDelimiter.size());
+    if (line == Line::Unknown)
+        return false;
+    if (line == Line::Content) {
+        give(at + 1);
+        return true;
+    }
+    const std::size_t end = at > 0 && mBytes[at - 1] == '\r' ? at - 1 : at;
+    give(end);
+    mBytes.erase(0, at - end + mDelimiter.size());
+    if (line == Line::Last) {
+        mState = State::Behind;
+        return false;
+    }
+    mBytes.erase(0, mBytes.find('\n') + 1);
+    mType.clear();
+    mState = ++mParts > mostParts ? State::Broken : State::Head;
+    return true;
+}
+
+// What the line is whose first bytes look like a boundary and whose rest starts at the place.
+MultipartReader::Line MultipartReader::lineAt(std::size_t place) const
+{
+    const std::string_view rest = std::string_view(mBytes).substr(place);
+    if (rest.substr(0, 2) == "--")
+        return Line::Last;
+    const std::size_t end = rest.find_first_not_of(" \t\r");
+    if (rest == "-" || (end == std::string_view::npos && rest.size() < longestBlanks))
+        return Line::Unknown;
+    return end != std::string_view::npos && rest[end] == '\n' ? Line::Delimiter : Line::Content;
+}
+
+// Hands over the first bytes that wait, except the line end of the part's head.
+void MultipartReader::give(std::size_t bytes)
+{
+    const std::size_t start = std::min<std::size_t>(mHasLineEnd ? 1 : 0, bytes);
+    if (mState == State::Content && bytes > start)
+        mContent(std::string_view(mBytes).substr(start, bytes - start));
+    mBytes.erase(0, bytes);
+    mHasLineEnd = mHasLineEnd && bytes == 0;
+}
 
 std::string boundaryOf(const std::string &contentType)
 {
@@ -85,22 +142,4 @@ std::string boundaryOf(const std::string &contentType)
     if (!value.empty() && value.front() == '"')
         return value.substr(1, value.find('"', 1) - 1);
     return value.substr(0, value.find_first_of(" \t;"));
-}
-
-std::optional<std::vector<BodyPart>> partsOf(std::string_view body, const std::string &boundary)
-{
-    const std::string delimiter = "--" + boundary;
-    std::vector<BodyPart> parts;
-    std::size_t start = findDelimiter(body, delimiter, 0);
-    while (start != std::string_view::npos && parts.size() <= mostParts) {
-        std::string_view rest = body.substr(start + delimiter.size());
-        if (rest.substr(0, 2) == "--")
-            return parts;
-        takeLine(rest);
-        const std::size_t begin = body.size() - rest.size();
-        start = findDelimiter(body, delimiter, begin);
-        if (start != std::string_view::npos)
-            parts.push_back(partOf(withoutLineEnd(body.substr(begin, start - begin))));
-    }
-    return std::nullopt;
 }

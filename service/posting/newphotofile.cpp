@@ -9,11 +9,13 @@
 
 #include <cerrno>
 #include <cstdio>
+#include <filesystem>
 
 namespace {
 
 constexpr std::size_t randomBytes = 12;
 constexpr std::size_t longestName = 100;
+const std::string hiddenStart = ".orvala-";
 constexpr int mostCopies = 10'000;
 
 bool writeAll(int file, std::string_view bytes)
@@ -38,27 +40,102 @@ void syncFolder(const std::string &folder)
     ::close(descriptor);
 }
 
+// File systems without renaming that spares what is there get an empty file first, which takes the
+// name.
+bool renameHidden(const std::string &path, const std::string &target)
+{
+    if (::renameat2(AT_FDCWD, path.c_str(), AT_FDCWD, target.c_str(), RENAME_NOREPLACE) == 0)
+        return true;
+    if (errno != EINVAL && errno != ENOSYS)
+        return false;
+    const int place = ::open(target.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0666);
+    if (place < 0)
+        return false;
+    ::close(place);
+    if (std::rename(path.c_str(), target.c_str()) == 0)
+        return true;
+    ::unlink(target.c_str());
+    return false;
+}
+
+// Hidden files of a day ago belong to a process that was killed.
+void removeLeftovers(const std::string &folder)
+{
+    namespace fs = std::filesystem;
+    const auto oldest = fs::file_time_type::clock::now() - std::chrono::hours(24);
+    std::error_code error;
+    for (fs::directory_iterator at(folder, error), end; !error && at != end; at.increment(error)) {
+        std::error_code ignored;
+        if (at->path().filename().string().rfind(hiddenStart, 0) == 0 &&
+            at->is_regular_file(ignored) && at->last_write_time(ignored) < oldest)
+            fs::remove(at->path(), ignored);
+    }
+}
+
 } // namespace
 
 NewPhotoFile::NewPhotoFile(std::string folder)
     : mFolder(std::move(folder))
-    , mName(".orvala-" + randomText(randomBytes))
 {
+    open();
 }
 
 NewPhotoFile::~NewPhotoFile()
 {
-    if (!mKept)
+    if (!mKept && !mName.empty())
         ::unlink(path().c_str());
+    if (mFile >= 0)
+        ::close(mFile);
 }
 
-bool NewPhotoFile::write(std::string_view bytes)
+void NewPhotoFile::open()
 {
-    const int file = ::open(path().c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0666);
-    if (file < 0)
+    mFile = ::open(mFolder.c_str(), O_TMPFILE | O_WRONLY | O_CLOEXEC, 0666);
+    if (mFile < 0 && (errno == EOPNOTSUPP || errno == EISDIR || errno == EINVAL)) {
+        removeLeftovers(mFolder);
+        mName = hiddenStart + randomText(randomBytes);
+        mFile = ::open(path().c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0666);
+    }
+    if (mFile < 0)
+        fail();
+}
+
+std::string NewPhotoFile::path() const
+{
+    return mName.empty() ? "/proc/self/fd/" + std::to_string(mFile) : mFolder + "/" + mName;
+}
+
+// Always false.
+bool NewPhotoFile::fail()
+{
+    if (mProblem != Problem::None)
         return false;
-    const bool isWritten = writeAll(file, bytes) && ::fsync(file) == 0;
-    return ::close(file) == 0 && isWritten;
+    switch (errno) {
+    case ENOSPC:
+    case EDQUOT:
+    case EFBIG:
+        mProblem = Problem::NoRoom;
+        break;
+    case EACCES:
+    case EPERM:
+    case EROFS:
+        mProblem = Problem::NoLeave;
+        break;
+    default:
+        mProblem = Problem::Other;
+    }
+    return false;
+}
+
+void NewPhotoFile::write(std::string_view bytes)
+{
+    if (mProblem == Problem::None && !writeAll(mFile, bytes))
+        fail();
+}
+
+bool NewPhotoFile::finish()
+{
+    return mProblem == Problem::None && (::fsync(mFile) == 0 || fail());
 }
 
 bool NewPhotoFile::publish(const std::string &title, const std::string &extension)
@@ -71,30 +148,21 @@ bool NewPhotoFile::publish(const std::string &title, const std::string &extensio
             return true;
         }
         if (errno != EEXIST)
-            return false;
+            return fail();
     }
-    return false;
+    return fail();
 }
 
-// False with EEXIST when the name is taken. File systems without this kind of renaming get an empty
-// file first, which takes the name.
+// False with EEXIST when the name is taken.
 bool NewPhotoFile::rename(const std::string &name)
 {
     const std::string target = mFolder + "/" + name;
-    if (::renameat2(AT_FDCWD, path().c_str(), AT_FDCWD, target.c_str(), RENAME_NOREPLACE) != 0) {
-        if (errno != EINVAL && errno != ENOSYS)
-            return false;
-        const int place = ::open(target.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0666);
-        if (place < 0)
-            return false;
-        ::close(place);
-        if (std::rename(path().c_str(), target.c_str()) != 0) {
-            ::unlink(target.c_str());
-            return false;
-        }
-    }
-    mName = name;
-    return true;
+    const bool isDone = mName.empty() ? ::linkat(AT_FDCWD, path().c_str(), AT_FDCWD, target.c_str(),
+                                                 AT_SYMLINK_FOLLOW) == 0
+                                      : renameHidden(path(), target);
+    if (isDone)
+        mName = name;
+    return isDone;
 }
 
 std::string fileNameFor(const std::string &title)

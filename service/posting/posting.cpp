@@ -9,6 +9,7 @@
 #include "posting/atomentry.h"
 #include "posting/multipart.h"
 #include "posting/newphotofile.h"
+#include "scan/contentmark.h"
 #include "scan/folderlist.h"
 
 #include <sys/stat.h>
@@ -73,16 +74,58 @@ FoundFile describe(const NewPhotoFile &file, PhotoMetadata metadata)
     {
     };
     ::stat(file.path().c_str(), &status);
-    return {file.name(), status.st_size,
-            status.st_mtim.tv_sec * nanoseconds + status.st_mtim.tv_nsec, std::move(metadata), ""};
+    return {file.name(),
+            status.st_size,
+            status.st_mtim.tv_sec * nanoseconds + status.st_mtim.tv_nsec,
+            std::move(metadata),
+            "",
+            0,
+            contentMark(file.path())};
 }
 
-const BodyPart *partOfType(const std::vector<BodyPart> &parts, const std::string &prefix)
+// What an upload brings: its entry, and its picture on the way into the album's folder. Further
+// parts are dropped.
+struct Upload
 {
-    const auto found = std::find_if(parts.begin(), parts.end(), [&](const BodyPart &part) {
-        return part.contentType.rfind(prefix, 0) == 0;
-    });
-    return found == parts.end() ? nullptr : &*found;
+    explicit Upload(const std::string &folder)
+        : file(folder)
+    {
+    }
+
+    void beginPart(const std::string &type)
+    {
+        part = Part::Other;
+        if (type == "application/atom+xml" && entry.empty())
+            part = Part::Entry;
+        else if (type.rfind("image/", 0) == 0 && !hasPicture)
+            part = Part::Picture;
+        hasPicture = hasPicture || part == Part::Picture;
+    }
+    void take(std::string_view bytes)
+    {
+        if (part == Part::Picture)
+            file.write(bytes);
+        else if (part == Part::Entry && entry.size() <= longestEntry)
+            entry.append(bytes);
+    }
+
+    enum class Part { Other, Entry, Picture };
+    Part part = Part::Other;
+    std::string entry;
+    bool hasPicture = false;
+    NewPhotoFile file;
+};
+
+void refuseFile(Asked &asked, NewPhotoFile::Problem problem)
+{
+    switch (problem) {
+    case NewPhotoFile::Problem::NoRoom:
+        return asked.refuse(507, "there is no room for more photos");
+    case NewPhotoFile::Problem::NoLeave:
+        return asked.refuse(forbidden, "the service may not write to the album's folder");
+    default:
+        return asked.refuse(500, "the album's folder cannot be written");
+    }
 }
 
 } // namespace
@@ -100,10 +143,10 @@ void Posting::addRoutes(Router &router)
     router.add("DELETE", "data/entry/" + photo + "/commentid/*",
                withToken(&Posting::deleteComment));
     router.add("DELETE", "data/entry/" + photo + "/tag/*", withToken(&Posting::deleteTag));
-    router.add("POST", "data/feed/" + album, withToken(&Posting::postPhoto),
-               [this](const Router::Call &call, httplib::Response &response) {
-                   return uploadLimit(call, response);
-               });
+    router.addReader("data/feed/" + album, withToken(&Posting::postPhoto),
+                     [this](const Router::Call &call, httplib::Response &response) {
+                         return uploadLimit(call, response);
+                     });
 }
 
 Router::Handler Posting::withToken(Answer answer)
@@ -205,38 +248,41 @@ void Posting::postPhoto(Asked &asked)
     const std::string boundary = boundaryOf(asked.call.request.get_header_value("Content-Type"));
     if (boundary.empty())
         return asked.refuse(unfitMedia, "a photo comes as multipart/related");
-    const auto parts = partsOf(asked.call.request.body, boundary);
-    const BodyPart *metadata = parts ? partOfType(*parts, "application/atom+xml") : nullptr;
-    const BodyPart *image = parts ? partOfType(*parts, "image/") : nullptr;
-    if (!metadata || !image)
+    const std::string folder = folderOfAlbum(asked.session, album->id).value_or("");
+    const std::string path = asked.owner.photos + (folder.empty() ? "" : "/" + folder);
+    if (!liesWithin(asked.owner.photos, path))
+        return asked.refuse(forbidden, "the album's folder is elsewhere");
+    Upload upload(path);
+    MultipartReader reader(
+        boundary, [&upload](const std::string &type) { upload.beginPart(type); },
+        [&upload](std::string_view bytes) { upload.take(bytes); });
+    const bool isRead = asked.call.body([&reader](std::string_view bytes) { reader.feed(bytes); });
+    if (!isRead || !reader.isWhole() || upload.entry.empty() || !upload.hasPicture)
         return asked.refuse(badRequest, "the body has been cut or lacks a part");
+    if (upload.entry.size() > longestEntry)
+        return asked.refuse(tooLarge, "the entry is too large");
     std::string error;
-    const auto entry = parseAtomEntry(std::string(metadata->content), &error);
+    const auto entry = parseAtomEntry(upload.entry, &error);
     if (!entry || entry->kind != AtomEntry::Kind::Photo)
         return asked.refuse(badRequest, entry ? "the entry is not that of a photo" : error);
-    storePhoto(asked, *album, *entry, image->content);
+    storePhoto(asked, {album->userId, folder, album->title, album->isPrivate}, *entry, upload.file);
 }
 
-void Posting::storePhoto(Asked &asked, const AlbumRecord &album, const AtomEntry &entry,
-                         std::string_view bytes)
+void Posting::storePhoto(Asked &asked, const FolderState &album, const AtomEntry &entry,
+                         NewPhotoFile &file)
 {
-    const std::string folder = folderOfAlbum(asked.session, album.id).value_or("");
-    NewPhotoFile file(asked.owner.photos + (folder.empty() ? "" : "/" + folder));
-    if (!liesWithin(asked.owner.photos, file.folder()))
-        return asked.refuse(forbidden, "the album's folder is elsewhere");
-    if (!file.write(bytes))
-        return asked.refuse(507, "the album's folder takes no more photos");
+    if (!file.finish())
+        return refuseFile(asked, file.problem());
     std::string error;
     auto metadata = readPhotoMetadata(file.path(), &error);
     if (!metadata)
         return asked.refuse(unfitMedia, error);
     if (!file.publish(entry.title, extensionFor(metadata->mimeType)))
-        return asked.refuse(507, "the album's folder takes no more photos");
+        return refuseFile(asked, file.problem());
     const std::string title =
         hasPhotoName(entry.title) ? withoutExtension(entry.title) : entry.title;
     const std::int64_t id =
-        addPhoto(mDatabase, {album.userId, folder, album.title, album.isPrivate},
-                 describe(file, std::move(*metadata)), {title, entry.summary});
+        addPhoto(mDatabase, album, describe(file, std::move(*metadata)), {title, entry.summary});
     file.keep();
     if (const auto photo = photoWithId(asked.session, id))
         sendEntry(asked, 201, photoEntry(*photo, asked.origin));

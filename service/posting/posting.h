@@ -4,8 +4,10 @@
 #include "index/records.h"
 
 class Database;
+class NewPhotoFile;
 struct Asked;
 struct AtomEntry;
+struct FolderState;
 
 // Writing to the service: comments and tags on photos, their deletion, and new photos. Everybody
 // comments on what they may see; tags and photos are for one's own albums, and a comment goes by
@@ -29,8 +31,8 @@ private:
     void deleteComment(Asked &asked);
     void deleteTag(Asked &asked);
     void postPhoto(Asked &asked);
-    void storePhoto(Asked &asked, const AlbumRecord &album, const AtomEntry &entry,
-                    std::string_view bytes);
+    void storePhoto(Asked &asked, const FolderState &album, const AtomEntry &entry,
+                    NewPhotoFile &file);
 
     Database &mDatabase;
     const std::string mScheme;

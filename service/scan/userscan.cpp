@@ -2,15 +2,28 @@
 
 #include "base/texts.h"
 #include "index/database.h"
+#include "index/users.h"
+#include "scan/contentmark.h"
 
 #include <spdlog/spdlog.h>
 
 #include <sys/stat.h>
 
+#include <cerrno>
+
 namespace {
 
 constexpr std::size_t filesPerBatch = 500;
 constexpr std::chrono::milliseconds batchTime{1000};
+constexpr std::int64_t nanoseconds = 1'000'000'000;
+
+bool isMissing(const std::string &path)
+{
+    struct stat status
+    {
+    };
+    return ::lstat(path.c_str(), &status) != 0 && (errno == ENOENT || errno == ENOTDIR);
+}
 
 std::string lastPiece(const std::string &path)
 {
@@ -35,6 +48,7 @@ bool UserScan::run()
     {
         auto reader = mDatabase.read();
         mKnownAlbums = knownAlbums(reader, mUser.id);
+        mIsFirst = !isScanned(reader, mUser.id);
     }
     struct stat status
     {
@@ -45,6 +59,8 @@ bool UserScan::run()
     if (!mStop)
         dropUnseenAlbums();
     write();
+    if (mIsFirst && !mStop)
+        noteScanned(mDatabase, mUser.id);
     return true;
 }
 
@@ -110,7 +126,7 @@ void UserScan::compare(const Place &place, const FolderListing &listing)
             add(std::exchange(changes, {stateOf(place), {}, {}, {}}), true);
     }
     for (const auto &[name, file] : known) {
-        if (file.isPresent)
+        if (file.isPresent && mMoved.count(file.id) == 0)
             changes.gone.push_back(file.id);
     }
     add(std::move(changes), isKnown && album->second.isPrivate != place.isPrivate);
@@ -120,23 +136,57 @@ void UserScan::compareFile(FolderChanges &changes, const std::string &folder,
                            const ListedFile &file, const KnownFile *known)
 {
     ++mTotals.files;
-    if (!known || known->size != file.size || known->changed != file.changed)
-        readFile(changes, folder, file);
-    else if (!known->isPresent)
+    if (!known || known->size != file.size || known->changed != file.changed) {
+        FoundFile found = readFile(folder, file);
+        if (!known || !known->isPresent)
+            found.movedFrom = formerPhoto(found);
+        changes.found.push_back(std::move(found));
+    } else if (!known->isPresent) {
         changes.back.push_back(known->id);
+    }
 }
 
-void UserScan::readFile(FolderChanges &changes, const std::string &folder, const ListedFile &file)
+FoundFile UserScan::readFile(const std::string &folder, const ListedFile &file)
 {
-    FoundFile found{file.name, file.size, file.changed, {}, {}};
-    auto metadata = readPhotoMetadata(pathOf(folder) + "/" + file.name, &found.error);
+    const std::string path = pathOf(folder) + "/" + file.name;
+    FoundFile found{file.name, file.size, file.changed, {}, {}, arrivalOf(file), contentMark(path)};
+    auto metadata = readPhotoMetadata(path, &found.error);
     if (metadata)
         found.metadata = std::move(*metadata);
     else if (found.error.empty())
         found.error = "not a photo that can be read";
     ++mTotals.read;
     mTotals.unreadable += metadata ? 0 : 1;
-    changes.found.push_back(std::move(found));
+    return found;
+}
+
+// The photo that lay elsewhere until now, 0 if there is none: moved and renamed files keep their
+// comments and tags.
+std::int64_t UserScan::formerPhoto(const FoundFile &file)
+{
+    if (mKnownAlbums.empty() || file.size == 0)
+        return 0;
+    auto reader = mDatabase.read();
+    for (const LikePhoto &photo : photosLike(reader, mUser.id, file)) {
+        if (hasLeft(photo, file.name) && mMoved.insert(photo.id).second)
+            return photo.id;
+    }
+    return 0;
+}
+
+// Whether its old place is empty only the disk can tell, since the walk may come there later. A
+// whole folder that is gone may come back with its disk: then the name has to be the same too.
+bool UserScan::hasLeft(const LikePhoto &photo, const std::string &newName) const
+{
+    const std::string path = pathOf(photo.folder) + "/" + photo.name;
+    return isMissing(path) && (photo.name == newName || !isMissing(pathOf(photo.folder)));
+}
+
+// When the photos of a folder came that the service has not known before only the files can tell.
+std::int64_t UserScan::arrivalOf(const ListedFile &file) const
+{
+    const std::int64_t now = currentSeconds();
+    return mIsFirst ? std::min(now, file.changed / nanoseconds) : now;
 }
 
 void UserScan::dropUnseenAlbums()
@@ -147,7 +197,7 @@ void UserScan::dropUnseenAlbums()
         FolderChanges changes{stateOf({folder, album.isPrivate}), {}, {}, {}};
         auto reader = mDatabase.read();
         for (const auto &[name, file] : knownFiles(reader, album.id)) {
-            if (file.isPresent)
+            if (file.isPresent && mMoved.count(file.id) == 0)
                 changes.gone.push_back(file.id);
         }
         add(std::move(changes), false);

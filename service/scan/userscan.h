@@ -47,7 +47,10 @@ private:
     void compare(const Place &place, const FolderListing &listing);
     void compareFile(FolderChanges &changes, const std::string &folder, const ListedFile &file,
                      const KnownFile *known);
-    void readFile(FolderChanges &changes, const std::string &folder, const ListedFile &file);
+    FoundFile readFile(const std::string &folder, const ListedFile &file);
+    std::int64_t formerPhoto(const FoundFile &file);
+    bool hasLeft(const LikePhoto &photo, const std::string &newName) const;
+    std::int64_t arrivalOf(const ListedFile &file) const;
     void dropUnseenAlbums();
     bool isBelowUnreadable(const std::string &folder) const;
     FolderState stateOf(const Place &place) const;
@@ -60,6 +63,8 @@ private:
     const UserRecord mUser;
     const std::atomic<bool> &mStop;
     Totals mTotals;
+    std::set<std::int64_t> mMoved; // photos that lie elsewhere now
+    bool mIsFirst = false;         // no walk through this folder has ended yet
     std::map<std::string, KnownAlbum> mKnownAlbums;
     std::set<std::string> mSeenFolders;
     std::set<std::string> mUnreadableFolders;

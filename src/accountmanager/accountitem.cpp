@@ -2,11 +2,10 @@
 
 #include "accountmanager/pagebutton.h"
 #include "base/i18n.h"
+#include "common/ui/stretchedpicture.h"
 
 #include <QMouseEvent>
 #include <QPainter>
-#include <QStyle>
-#include <QStyleOption>
 #include <QTextBoundaryFinder>
 
 namespace {
@@ -91,9 +90,10 @@ QColor AccountItem::colourOf(const QString &mail)
 void AccountItem::paintEvent(QPaintEvent *)
 {
     QPainter painter(this);
-    QStyleOption option;
-    option.initFrom(this);
-    style()->drawPrimitive(QStyle::PE_Widget, &option, &painter, this);
+    painter.drawPixmap(0, 0,
+                       stretchedPicture(hasFocus() ? QStringLiteral(":/res/Button_Focus.png")
+                                                   : QStringLiteral(":/res/Button_Normal.png"),
+                                        size(), kPictureBorder, this));
     painter.setRenderHint(QPainter::Antialiasing);
     paintDisc(&painter);
     paintTexts(&painter);

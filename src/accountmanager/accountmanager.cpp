@@ -4,6 +4,8 @@
 #include "accountmanager/accounttexts.h"
 #include "accountmanager/errordialog.h"
 #include "accountmanager/loginpage.h"
+#include "accountmanager/managerwidget.h"
+#include "accountmanager/protectioncode.h"
 #include "accountmanager/waitwidget.h"
 #include "base/i18n.h"
 #include "base/log.h"
@@ -28,9 +30,6 @@ namespace {
 constexpr int kSideSpace = 180;
 constexpr int kLogoHeight = 46;
 
-// What a web sign-in stores an account with, and signs it in with.
-const QString kDefaultPin = QStringLiteral("7305");
-
 // The sign-in page goes through the program's proxy. Setting it drops every open connection.
 void applyProxy()
 {
@@ -48,25 +47,26 @@ void applyProxy()
 AccountManager::AccountManager(QWidget *parent)
     : QWidget(parent)
     , mLoginPage(new LoginPage(this))
+    , mMiddle(new QHBoxLayout)
     , mShortcutBar(new ShortcutBar(this))
 {
     mShortcutBar->addEntry(DEVICE_RETURN_KEY, I18n::shortCut(2));
-    auto *middle = new QHBoxLayout;
-    middle->setSpacing(0);
-    middle->addSpacing(kSideSpace);
-    middle->addWidget(mLoginPage);
-    middle->addSpacing(kSideSpace);
+    mMiddle->setSpacing(0);
+    mMiddle->addSpacing(kSideSpace);
+    mMiddle->addWidget(mLoginPage);
+    mMiddle->addSpacing(kSideSpace);
 
     auto *column = new QVBoxLayout(this);
     column->setContentsMargins(SystemConfig::borderLeft(), SystemConfig::borderTop(),
                                SystemConfig::borderRight(), SystemConfig::borderBottom());
     column->addWidget(makeTitle(), 1);
-    column->addLayout(middle, 8);
+    column->addLayout(mMiddle, 8);
     column->addWidget(mShortcutBar, 2, Qt::AlignBottom);
 
     connect(mLoginPage, &LoginPage::oauthStarted, this, &AccountManager::startAuthorize);
     connect(mLoginPage, &LoginPage::loginSucessed, this, &AccountManager::startLoading);
     connect(mLoginPage, &LoginPage::exitApp, this, &AccountManager::onReturnClicked);
+    connect(mLoginPage, &LoginPage::formWanted, this, &AccountManager::showForm);
 }
 
 AccountManager::~AccountManager()
@@ -106,6 +106,7 @@ void AccountManager::startAuthorize()
     logLine("enter AccountManager::startAuthorize()");
     applyProxy();
     if (!prepareWizard()) {
+        closeForm();
         mLoginPage->showMessage(AccountTexts::text(AccountTexts::SignInUnavailable));
         return;
     }
@@ -147,7 +148,11 @@ void AccountManager::authorizeResult(bool allow)
     }
     if (!oauthWizard)
         return;
-    switch (storeAccount(oauthWizard->getAccountMail(), oauthWizard->getOauthAccessToken())) {
+    // Whoever came by the form is known by what was entered there.
+    const bool hasLoginId = mForm && !mForm->name().isEmpty();
+    const QString account = hasLoginId ? mForm->name() : oauthWizard->getAccountMail();
+    const QString pin = mForm ? mForm->password() : protectioncode::kDefault;
+    switch (storeAccount(account, pin, oauthWizard->getOauthAccessToken())) {
     case SignedIn:
         emit loginFinished();
         break;
@@ -161,20 +166,21 @@ void AccountManager::authorizeResult(bool allow)
     }
 }
 
-AccountManager::Outcome AccountManager::storeAccount(const QString &mail, const QString &token)
+AccountManager::Outcome AccountManager::storeAccount(const QString &account, const QString &pin,
+                                                     const QString &token)
 {
-    if (mail.isEmpty() || token.isEmpty())
+    if (account.isEmpty() || token.isEmpty())
         return NotStored;
-    const bool exists = mLoginPage->hasAccount(mail);
+    const bool exists = mLoginPage->hasAccount(account);
     const AccountManagerHelper::Session session;
-    const bool stored = exists ? AccountManagerHelper::updateToken(mail, token)
-                               : AccountManagerHelper::addAccount(mail, kDefaultPin, token);
+    const bool stored = exists ? AccountManagerHelper::updateToken(account, token)
+                               : AccountManagerHelper::addAccount(account, pin, token);
     if (!stored) {
         if (!exists)
             logLine(" Add account error: show a error dialog");
         return NotStored;
     }
-    if (AccountManagerHelper::login(mail, kDefaultPin))
+    if (AccountManagerHelper::login(account, pin))
         return SignedIn;
     return AccountManagerHelper::hasFailed() ? NotStored : NotSignedIn;
 }
@@ -205,6 +211,31 @@ void AccountManager::showAccounts()
 {
     mLoginPage->reload(); // an account may have been stored although it was not signed in
     emit showNewWidget(this);
+}
+
+void AccountManager::showForm(const QString &account)
+{
+    if (mForm)
+        return;
+    mForm = new ManagerWidget(this);
+    connect(mForm, &ManagerWidget::oauthStarted, this, &AccountManager::startAuthorize);
+    connect(mForm, &ManagerWidget::loginSucessed, this, &AccountManager::startLoading);
+    connect(mForm, &ManagerWidget::canceled, this, &AccountManager::closeForm);
+    if (!account.isEmpty())
+        mForm->askForCode(account);
+    mLoginPage->hide();
+    mMiddle->insertWidget(mMiddle->indexOf(mLoginPage), mForm);
+    mForm->show();
+}
+
+void AccountManager::closeForm()
+{
+    if (!mForm)
+        return;
+    mForm->hide();
+    mForm->deleteLater();
+    mForm.clear();
+    mLoginPage->show();
 }
 
 // Later: it is a key or an answer of its own that ends it.

@@ -5,7 +5,9 @@
 
 class ErrorDialog;
 class LoginPage;
+class ManagerWidget;
 class OAuthWidget;
+class QHBoxLayout;
 class QLabel;
 class ShortcutBar;
 class WaitWidget;
@@ -22,6 +24,8 @@ class WaitWidget;
 //     refused                authorizeResult(false): an error, then the program ends
 //     no answer              handleAuthorizeTimeOut(): an error on the account list
 //     Return                 handleAuthorizeCancel(): the account list
+//   formWanted()    ------>  showForm(): the account form in place of the list. Its account is
+//                            proved or chosen there, and signed in, or stored with its PIN
 //   exitApp(), Return ---->  onReturnClicked(): asks the platform to end the program
 class AccountManager : public QWidget
 {
@@ -44,6 +48,8 @@ public slots:
     void startLoading();
     void handleAuthorizeCancel();
     void handleAuthorizeTimeOut();
+    void showForm(const QString &account);
+    void closeForm();
 
 protected:
     void keyPressEvent(QKeyEvent *event) override;
@@ -55,12 +61,14 @@ private:
     QWidget *makeTitle();
     void showWaitWidget();
     bool prepareWizard();
-    Outcome storeAccount(const QString &mail, const QString &token);
+    Outcome storeAccount(const QString &account, const QString &pin, const QString &token);
     ErrorDialog *showError(const QString &text);
     void dropWizard();
     void showAccounts();
 
     LoginPage *mLoginPage;
+    QPointer<ManagerWidget> mForm; // in place of the list
+    QHBoxLayout *mMiddle;
     ShortcutBar *mShortcutBar;
     QPointer<WaitWidget> mWaitWidget;
     QPointer<OAuthWidget> oauthWizard;

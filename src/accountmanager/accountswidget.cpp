@@ -3,6 +3,7 @@
 #include "accountmanager/accountitem.h"
 
 #include <QKeyEvent>
+#include <QScrollBar>
 #include <QVBoxLayout>
 
 #include <algorithm>
@@ -83,7 +84,15 @@ void AccountsWidget::focusCurrent()
     if (mItems.isEmpty())
         return;
     mItems.at(mCurrent)->setFocus();
-    ensureWidgetVisible(mItems.at(mCurrent), 0, 0);
+    scrollToCurrent();
+}
+
+// By whole rows: the list begins with a row and ends with one.
+void AccountsWidget::scrollToCurrent()
+{
+    const int first = verticalScrollBar()->value() / kPitch;
+    const int last = std::max(0, mCurrent - rowsIn(height()) + 1);
+    verticalScrollBar()->setValue(qBound(last, first, mCurrent) * kPitch);
 }
 
 void AccountsWidget::focusDelete()
@@ -105,7 +114,7 @@ void AccountsWidget::moveFocus(int rows)
 
 void AccountsWidget::movePage(int pages)
 {
-    moveFocus(pages * rowsIn(viewport()->height()));
+    moveFocus(pages * rowsIn(height()));
 }
 
 bool AccountsWidget::hasRowFocus() const
@@ -134,4 +143,5 @@ void AccountsWidget::resizeEvent(QResizeEvent *event)
     const int rows = rowsIn(height()) * kPitch - kSpacing;
     setViewportMargins(0, 0, 0, std::max(0, height() - rows));
     QScrollArea::resizeEvent(event);
+    scrollToCurrent(); // what was in view need not be any more
 }

@@ -52,6 +52,7 @@ protected:
 
 private:
     void addRow(const Account &account);
+    void scrollToCurrent();
 
     QVBoxLayout *mRows;
     QVector<AccountItem *> mItems;

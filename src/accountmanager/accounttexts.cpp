@@ -13,6 +13,7 @@ const QVector<const char *> mAccountString = {
     "The sign-in went well, but this device could not store the account. Press \"Return\" to go "
     "back, and try again later.",
     "This account could not be deleted. Please try again later.",
+    "No account on this device has a protection code of its own yet.",
 };
 
 } // namespace

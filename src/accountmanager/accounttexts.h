@@ -14,6 +14,7 @@ public:
         SignInUnavailable = 4,
         NotStored = 5,
         NotDeleted = 6,
+        NoAccountWithCode = 7,
     };
 
     // The text, or "Unknown" for an index that has none.

@@ -4,6 +4,7 @@
 #include "accountmanager/accountswidget.h"
 #include "accountmanager/accounttexts.h"
 #include "accountmanager/pagebutton.h"
+#include "accountmanager/protectioncode.h"
 #include "base/i18n.h"
 #include "base/log.h"
 #include "common/ui/qconfirm.h"
@@ -79,6 +80,10 @@ void LoginPage::buildLayout()
     auto *buttons = new QVBoxLayout;
     buttons->setSpacing(12);
     mNewButton = makeButton(buttons, I18n::button(8));
+    if (protectioncode::isOffered()) {
+        mFormButton = makeButton(buttons, I18n::login(3));
+        connect(mFormButton, &QAbstractButton::clicked, this, &LoginPage::openForm);
+    }
     mExitButton = makeButton(buttons, I18n::button(9));
     buttons->addStretch();
     connect(mNewButton, &QAbstractButton::clicked, this, &LoginPage::startOauth);
@@ -90,7 +95,7 @@ void LoginPage::buildLayout()
     row->addWidget(mHint, 1, Qt::AlignTop);
     row->addLayout(buttons);
 
-    mMessage->setFixedHeight(52);
+    mMessage->setFixedHeight(48);
     mMessage->setAlignment(Qt::AlignLeft | Qt::AlignVCenter);
     auto *column = new QVBoxLayout(this);
     column->setContentsMargins(0, 0, 0, 0);
@@ -105,12 +110,13 @@ QAbstractButton *LoginPage::makeButton(QVBoxLayout *column, const QString &text)
     auto *button = new PageButton(text, this);
     button->setFixedSize(160, 52);
     column->addWidget(button);
+    mButtons << button;
     return button;
 }
 
 void LoginPage::reload()
 {
-    QWidget *button = focusWidget(); // where the user comes back to
+    auto *button = qobject_cast<QAbstractButton *>(focusWidget()); // where the user comes back to
     QVector<AccountsWidget::Account> accounts;
     const bool readable = readAccounts(&accounts);
     if (readable)
@@ -120,7 +126,7 @@ void LoginPage::reload()
     mHint->setVisible(empty);
     mHint->setText(
         AccountTexts::text(readable ? AccountTexts::NoAccounts : AccountTexts::AccountsUnreadable));
-    if (button && (button == mNewButton || button == mExitButton))
+    if (button && mButtons.contains(button))
         button->setFocus();
     else
         restoreFocus();
@@ -201,7 +207,15 @@ void LoginPage::handleUpOrDown(int rows)
     if (mAccounts->hasRowFocus() || mAccounts->hasDeleteFocus())
         mAccounts->moveFocus(rows);
     else
-        (rows < 0 ? mNewButton : mExitButton)->setFocus();
+        mButtons.at(qBound(0, focusedButton() + rows, mButtons.size() - 1))->setFocus();
+}
+
+int LoginPage::focusedButton() const
+{
+    int index = 0;
+    while (index < mButtons.size() && !mButtons.at(index)->hasFocus())
+        ++index;
+    return index;
 }
 
 void LoginPage::handleSelect()
@@ -210,6 +224,8 @@ void LoginPage::handleSelect()
         startOauth();
     else if (mExitButton->hasFocus())
         leave();
+    else if (mFormButton && mFormButton->hasFocus())
+        openForm();
     else if (mAccounts->hasDeleteFocus())
         popupConfirmDialog();
     else
@@ -222,17 +238,27 @@ void LoginPage::startOauth()
     emit oauthStarted();
 }
 
+void LoginPage::openForm()
+{
+    emit formWanted(QString());
+}
+
 void LoginPage::leave()
 {
     logLine("has foucus Exit, exitApp()");
     emit exitApp();
 }
 
-bool LoginPage::signIn(const QString &mail)
+LoginPage::Outcome LoginPage::signIn(const QString &mail)
 {
     const AccountManagerHelper::Session session;
     const QString pin = AccountManagerHelper::getPassword(mail);
-    return !AccountManagerHelper::hasFailed() && AccountManagerHelper::login(mail, pin);
+    if (AccountManagerHelper::hasFailed())
+        return Failed;
+    // An account that is gone has none: that is told, and nothing asked.
+    if (protectioncode::isOffered() && !pin.isEmpty() && pin != protectioncode::kDefault)
+        return NeedsCode;
+    return AccountManagerHelper::login(mail, pin) ? SignedIn : Failed;
 }
 
 void LoginPage::handleSelectIndex()
@@ -240,13 +266,19 @@ void LoginPage::handleSelectIndex()
     const QString mail = mAccounts->currentAccount();
     if (mail.isEmpty())
         return;
-    if (signIn(mail)) {
+    switch (signIn(mail)) {
+    case SignedIn:
         emit loginSucessed();
-        return;
+        break;
+    case NeedsCode:
+        emit formWanted(mail);
+        break;
+    case Failed:
+        reload();
+        showMessage(AccountTexts::text(hasAccount(mail) ? AccountTexts::SignInFailed
+                                                        : AccountTexts::AccountGone));
+        break;
     }
-    reload();
-    showMessage(AccountTexts::text(hasAccount(mail) ? AccountTexts::SignInFailed
-                                                    : AccountTexts::AccountGone));
 }
 
 void LoginPage::popupConfirmDialog()

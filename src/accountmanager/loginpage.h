@@ -1,5 +1,6 @@
 #pragma once
 
+#include <QList>
 #include <QPointer>
 #include <QWidget>
 
@@ -10,7 +11,9 @@ class QLabel;
 class QVBoxLayout;
 
 // The account list: the stored accounts, the one used last first, beside the buttons New and Exit.
-// Select on an account signs it in with its stored PIN; its button Delete asks first.
+// Select on an account signs it in with its stored PIN; its button Delete asks first. Where
+// protection codes are offered, a button between the two leads to the account form, and an account
+// with a code of its own is not signed in without it.
 class LoginPage : public QWidget
 {
     Q_OBJECT
@@ -28,6 +31,8 @@ signals:
     void oauthStarted();
     void loginSucessed();
     void exitApp();
+    // The account form is wanted, for the code of that account; an empty one: for a new one.
+    void formWanted(const QString &account);
 
 public slots:
     // Signs the current account in: loginSucessed(), or a message on the page.
@@ -46,17 +51,22 @@ protected:
 private:
     void buildLayout();
     QAbstractButton *makeButton(QVBoxLayout *column, const QString &text);
-    bool signIn(const QString &mail);
+    enum Outcome { SignedIn, NeedsCode, Failed };
+    static Outcome signIn(const QString &mail);
     void restoreFocus();
     void handleUpOrDown(int rows);
     void handleSelect();
+    int focusedButton() const;
     void startOauth();
+    void openForm();
     void leave();
 
     AccountsWidget *mAccounts;
     QAbstractButton *mNewButton = nullptr;
+    QAbstractButton *mFormButton = nullptr; // null where codes are not offered
     QAbstractButton *mExitButton = nullptr;
-    QLabel *mHint; // in place of the list when it is empty
+    QList<QAbstractButton *> mButtons; // from above
+    QLabel *mHint;                     // in place of the list when it is empty
     QLabel *mMessage;
     QPointer<QConfirm> mConfirm;
 };

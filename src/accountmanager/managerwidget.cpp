@@ -5,20 +5,22 @@
 #include "accountmanager/accounttexts.h"
 #include "accountmanager/pagebutton.h"
 #include "accountmanager/pinlineedit.h"
+#include "accountmanager/protectioncode.h"
 #include "accountmanager/usernamelineedit.h"
 #include "base/i18n.h"
 #include "base/log.h"
 #include "common/ui/qpopupform.h"
-#include "common/ui/remotekeys.h"
 
 #include <QGridLayout>
-#include <QKeyEvent>
 #include <QLabel>
 
 namespace {
 
 constexpr int kPinLength = 4;
 constexpr int kFieldHeight = 54;
+constexpr int kPinWidth = 78;
+constexpr int kLabelWidth = 210;
+constexpr int kListWidth = 180;
 
 const QString kStyle = QStringLiteral(
     "QLabel {color: white; font-size: 22px;}"
@@ -40,6 +42,21 @@ QLabel *makeLabel(QWidget *parent, const char *name)
     label->setTextFormat(Qt::PlainText);
     label->setWordWrap(true);
     return label;
+}
+
+// The accounts that somebody has given a code. When there are none, the text that says why
+// (AccountTexts), else -1.
+int readAccountsWithCode(QStringList *accounts)
+{
+    const AccountManagerHelper::Session session;
+    const QStringList stored = AccountManagerHelper::getAccounts(true);
+    if (AccountManagerHelper::hasFailed())
+        return AccountTexts::AccountsUnreadable;
+    for (const QString &account : stored) {
+        if (AccountManagerHelper::getPassword(account) != protectioncode::kDefault)
+            accounts->append(account);
+    }
+    return accounts->isEmpty() ? AccountTexts::NoAccountWithCode : -1;
 }
 
 } // namespace
@@ -94,13 +111,16 @@ void ManagerWidget::buildLayout()
     grid->addWidget(mLoginId, 2, 1, 1, 4);
     grid->addWidget(mListButton, 2, 5);
     grid->addWidget(mPinLabel, 3, 0);
-    for (int i = 0; i < kPinLength; ++i)
+    for (int i = 0; i < kPinLength; ++i) {
+        mPinBoxes.at(i)->setFixedWidth(kPinWidth);
         grid->addWidget(mPinBoxes.at(i), 3, 1 + i);
+    }
     grid->addWidget(mTip, 4, 0, 1, 6);
     grid->addWidget(mNextButton, 5, 1, 1, 2);
     grid->addWidget(mCancelButton, 5, 3, 1, 2);
-    grid->setColumnMinimumWidth(0, 230);
-    grid->setColumnMinimumWidth(5, 200);
+    grid->setColumnMinimumWidth(0, kLabelWidth);
+    grid->setColumnMinimumWidth(5, kListWidth);
+    grid->setColumnStretch(5, 1);
     grid->setRowStretch(6, 1);
 }
 
@@ -114,104 +134,6 @@ void ManagerWidget::retranslateUi()
     mListButton->setText(I18n::prompt(3));
     mNextButton->setText(I18n::button(3));
     mCancelButton->setText(I18n::button(4));
-}
-
-// The arrows and Return are the form's, whichever field they are pressed in.
-void ManagerWidget::registerEvents()
-{
-    for (int i = 0; i < FocusCount; ++i)
-        widgetAt(i)->installEventFilter(this);
-}
-
-QWidget *ManagerWidget::widgetAt(int index) const
-{
-    switch (index) {
-    case LoginId:
-        return mLoginId;
-    case ListButton:
-        return mListButton;
-    case Next:
-        return mNextButton;
-    case Cancel:
-        return mCancelButton;
-    default:
-        return mPinBoxes.at(index - FirstPin);
-    }
-}
-
-void ManagerWidget::focusAt(int index)
-{
-    mFocusIndex = index;
-    widgetAt(index)->setFocus();
-}
-
-// To the next place in that direction that takes the focus; the ends stay.
-void ManagerWidget::moveFocus(int step)
-{
-    for (int index = mFocusIndex + step; index >= 0 && index < FocusCount; index += step) {
-        if (widgetAt(index)->isEnabled())
-            return focusAt(index);
-    }
-}
-
-bool ManagerWidget::handleArrow(int key)
-{
-    const bool isPin = mFocusIndex >= FirstPin && mFocusIndex < Next;
-    switch (key) {
-    case DEVICE_LEFT_KEY:
-        moveFocus(-1);
-        return true;
-    case DEVICE_RIGHT_KEY:
-        moveFocus(1);
-        return true;
-    case DEVICE_UP_KEY:
-        focusAt(mFocusIndex >= Next ? FirstPin : LoginId);
-        return true;
-    case DEVICE_DOWN_KEY:
-        if (mFocusIndex < FirstPin)
-            focusAt(FirstPin);
-        else if (isPin)
-            focusAt(mNextButton->isEnabled() ? Next : Cancel);
-        return true;
-    default:
-        return false;
-    }
-}
-
-bool ManagerWidget::eventFilter(QObject *watched, QEvent *event)
-{
-    if (event->type() == QEvent::FocusIn) {
-        for (int i = 0; i < FocusCount; ++i) {
-            if (watched == widgetAt(i))
-                mFocusIndex = i;
-        }
-    }
-    if (event->type() != QEvent::KeyPress)
-        return QWidget::eventFilter(watched, event);
-    const int key = static_cast<QKeyEvent *>(event)->key();
-    if (key == DEVICE_RETURN_KEY) {
-        onCancelClicked();
-        return true;
-    }
-    return handleArrow(key) || QWidget::eventFilter(watched, event);
-}
-
-void ManagerWidget::keyPressEvent(QKeyEvent *event)
-{
-    if (event->key() != DEVICE_SELECT_KEY) {
-        event->ignore();
-        return;
-    }
-    if (mFocusIndex == LoginId)
-        showInputDialog();
-    else if (auto *button = qobject_cast<QAbstractButton *>(widgetAt(mFocusIndex)))
-        button->click();
-}
-
-void ManagerWidget::showEvent(QShowEvent *event)
-{
-    QWidget::showEvent(event);
-    focusAt(mFocusIndex);
 }
 
 void ManagerWidget::showInputDialog()
@@ -371,12 +293,9 @@ void ManagerWidget::showTip(const QString &text, bool isRed)
 void ManagerWidget::showAccountList()
 {
     QStringList accounts;
-    {
-        const AccountManagerHelper::Session session;
-        accounts = AccountManagerHelper::getAccounts(true);
-    }
-    if (accounts.isEmpty()) {
-        showTip(AccountTexts::text(AccountTexts::NoAccounts), true);
+    const int failure = readAccountsWithCode(&accounts);
+    if (failure >= 0) {
+        showTip(AccountTexts::text(failure), true);
         return;
     }
     mAccountList = new AccountList(accounts, window());
@@ -385,11 +304,16 @@ void ManagerWidget::showAccountList()
     mAccountList->show();
 }
 
-// An account of the list signs in by its PIN; its login ID may be longer than one that is typed.
 void ManagerWidget::handleSelectIndex(const QModelIndex &index)
 {
     const QString account = index.data().toString();
     cancelSelect();
+    askForCode(account);
+}
+
+// The login ID of a stored account may be longer than one that is typed.
+void ManagerWidget::askForCode(const QString &account)
+{
     mLoginId->showAccount(account);
     mMustProvePin = false;
     olduser = true;

@@ -44,6 +44,9 @@ public:
     QString password() const { return mPassword; } // the PIN that waits for its confirmation
     void setPassword(const QString &pin) { mPassword = pin; }
 
+    // Asks for the PIN of a stored account, to sign it in.
+    void askForCode(const QString &account);
+
     bool eventFilter(QObject *watched, QEvent *event) override;
 
 signals:

@@ -1,13 +1,14 @@
 #pragma once
 
+#include "common/ui/picturebutton.h"
+
 #include <QKeyEvent>
-#include <QPushButton>
 
 // A button that leaves every key to the page it is on.
-class PageButton : public QPushButton
+class PageButton : public PictureButton
 {
 public:
-    using QPushButton::QPushButton;
+    using PictureButton::PictureButton;
 
 protected:
     void keyPressEvent(QKeyEvent *event) override { event->ignore(); }

@@ -1,4 +1,5 @@
 #include "app/exitdeadline.h"
+#include "app/fontwarmup.h"
 #include "app/mainapplication.h"
 #include "app/mainwidget.h"
 #include "base/log.h"
@@ -9,8 +10,10 @@
 #include "platform/ipcthread.h"
 #include "res/resources.h"
 
+#include <QCursor>
 #include <QFontDatabase>
 #include <QLocale>
+#include <QPixmap>
 #include <QScreen>
 #include <QTextCodec>
 
@@ -43,6 +46,14 @@ void prepareProcess()
     qputenv("QT_XCB_GL_INTEGRATION", "none");
     QCoreApplication::addLibraryPath(QStringLiteral(ORVALA_PLUGIN_DIR));
     prepareScale();
+}
+
+// Nothing here is pointed at. Qt's own blank cursor would be looked for in every cursor theme.
+void hidePointer()
+{
+    QPixmap nothing(1, 1);
+    nothing.fill(Qt::transparent);
+    QApplication::setOverrideCursor(QCursor(nothing));
 }
 
 void readScreenSize()
@@ -117,7 +128,9 @@ void sayGoodbye()
 int main(int argc, char *argv[])
 {
     prepareProcess();
+    const FontWarmUp fonts;
     MainApplication application(argc, argv);
+    hidePointer();
     applyScale();
     readScreenSize();
     initResources();

@@ -1,6 +1,7 @@
 #include "data/mediauploader.h"
 
 #include "base/log.h"
+#include "data/picturecheck.h"
 #include "data/picturereader.h"
 #include "data/posthelper.h"
 
@@ -8,12 +9,26 @@
 #include <QImage>
 #include <QImageReader>
 
+namespace {
+
+// A small file may claim to be a huge picture, so it is looked at like one from the network.
+bool isPicture(const QString &filePath)
+{
+    QFile file(filePath);
+    if (!file.open(QIODevice::ReadOnly))
+        return false;
+    const QByteArray bytes = file.readAll();
+    return pictureFormat(bytes) ? !readPicture(bytes).isNull() : !QImage(filePath).isNull();
+}
+
+} // namespace
+
 ErrorCode MediaUploader::startToUpload(QString filePath, QString title, QString userId,
                                        QString albumId, QString summary, bool busy)
 {
     if (busy)
         return Busy;
-    if (QImage(filePath).isNull()) {
+    if (!isPicture(filePath)) {
         logLine("MediaUploader::MediaUploader image is null!");
         return NotAnImage;
     }

@@ -1,6 +1,6 @@
 #include "ui/backdrop.h"
 
-#include "ui/stretchedpicture.h"
+#include "common/ui/stretchedpicture.h"
 
 #include <QPainter>
 #include <QRegion>

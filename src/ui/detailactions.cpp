@@ -3,7 +3,7 @@
 #include "base/i18n.h"
 #include "common/ui/picture.h"
 #include "ui/detailtexts.h"
-#include "ui/stretchedpicture.h"
+#include "common/ui/stretchedpicture.h"
 
 #include <QPainter>
 

@@ -3,7 +3,7 @@
 #include "common/ui/picture.h"
 #include "common/ui/qprogressindicator.h"
 #include "common/ui/textfit.h"
-#include "ui/stretchedpicture.h"
+#include "common/ui/stretchedpicture.h"
 
 #include <QPainter>
 

@@ -36,7 +36,7 @@ HomeBars::HomeBars(QWidget *parent)
     , mShortcuts(new ShortcutBar(this))
 {
     auto *row = new QHBoxLayout(this);
-    row->setContentsMargins(10, 0, 10, 0);
+    row->setContentsMargins(0, 0, 0, 0);
     row->setSpacing(24);
     setFixedHeight(32);
     QSizePolicy policy = sizePolicy();

@@ -21,6 +21,7 @@ enum Kind { AddRow, NoteRow, MessageRow };
 constexpr int kWidth = 760;
 constexpr int kHeight = 400;
 constexpr int kPadding = 14;
+constexpr int kScrollBar = 10;
 constexpr int kDeleteWidth = 110;
 constexpr int kSlack = 6; // for letters of other fonts, which may be higher
 constexpr int kMostLines = 6;
@@ -114,7 +115,7 @@ private:
 
 QListWidgetItem *makeRow(Kind kind, const NoteList::Note &note)
 {
-    const int room = kWidth - 2 * kPadding - (note.canDelete ? kDeleteWidth + kPadding : 0);
+    const int room = kWidth - kScrollBar - 2 * kPadding - (note.canDelete ? kDeleteWidth + kPadding : 0);
     const QFontMetrics metrics(textFont());
     auto *row = new QListWidgetItem;
     row->setData(TextRole,
@@ -145,7 +146,11 @@ NoteList::NoteList(const QString &addText, QWidget *parent)
     mRows->setFrameShape(QFrame::NoFrame);
     mRows->setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
     mRows->setVerticalScrollMode(QAbstractItemView::ScrollPerPixel);
-    mRows->setStyleSheet(QStringLiteral("QListWidget{background:transparent;border:0px;}"));
+    mRows->setStyleSheet(QStringLiteral(
+        "QListWidget{background:transparent;border:0px;}"
+        "QScrollBar:vertical{width:10px;background:#1c2730;border-radius:5px;}"
+        "QScrollBar::handle:vertical{min-height:40px;background:#c9d5dd;border-radius:5px;}"
+        "QScrollBar::add-line,QScrollBar::sub-line{height:0px;}"));
     fill(QString());
 }
 

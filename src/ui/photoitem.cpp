@@ -3,7 +3,7 @@
 #include "common/ui/picture.h"
 #include "data/packageproperty.h"
 #include "network/systemconfig.h"
-#include "ui/stretchedpicture.h"
+#include "common/ui/stretchedpicture.h"
 
 #include <QPaintEvent>
 #include <QPainter>

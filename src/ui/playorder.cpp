@@ -62,6 +62,18 @@ PlayArray::PlayArray(playorder::RandomSource random)
 {
 }
 
+int PlayArray::at(int position) const
+{
+    const int size = mRecords.size();
+    return position < size ? mRecords.value(position, -1) : mNextRound.value(position - size, -1);
+}
+
+void PlayArray::clear()
+{
+    mRecords.clear();
+    mNextRound.clear();
+}
+
 void PlayArray::extend(int recordCount, int mode)
 {
     const int start = mRecords.size();
@@ -70,6 +82,7 @@ void PlayArray::extend(int recordCount, int mode)
     mRecords.resize(recordCount);
     std::iota(mRecords.begin() + start, mRecords.end(), start);
     playorder::order(mRecords, start, mode, mRandom);
+    drawNextRound(mode);
 }
 
 // From the normal order: an earlier random one may hold a record twice and lack another.
@@ -77,6 +90,7 @@ void PlayArray::reorder(int mode)
 {
     std::iota(mRecords.begin(), mRecords.end(), 0);
     playorder::order(mRecords, 0, mode, mRandom);
+    drawNextRound(mode);
 }
 
 void PlayArray::shrink(int recordCount, int mode)
@@ -85,9 +99,21 @@ void PlayArray::shrink(int recordCount, int mode)
     reorder(mode);
 }
 
-void PlayArray::startOver(int mode, int lastRecord)
+void PlayArray::startOver(int mode)
 {
-    reorder(mode);
-    for (int draw = 0; draw < playorder::kMostDraws && size() > 1 && at(0) == lastRecord; ++draw)
-        reorder(mode);
+    mRecords.swap(mNextRound);
+    drawNextRound(mode);
+}
+
+void PlayArray::drawNextRound(int mode)
+{
+    if (!mIsRound)
+        return;
+    mNextRound.resize(mRecords.size());
+    for (int draw = 0; draw < playorder::kMostDraws; ++draw) {
+        std::iota(mNextRound.begin(), mNextRound.end(), 0);
+        playorder::order(mNextRound, 0, mode, mRandom);
+        if (mNextRound.size() < 2 || mNextRound.first() != mRecords.last())
+            return;
+    }
 }

@@ -23,15 +23,19 @@ void order(QVector<int> &array, int start, int mode, const RandomSource &random)
 
 } // namespace playorder
 
-// The play array: for each position of the show the index of a record.
+// The play array: for each position of the show the index of a record. If the show goes round, the
+// order of the next round is drawn beforehand, so that its photos can be fetched before their time.
 class PlayArray
 {
 public:
     explicit PlayArray(playorder::RandomSource random = playorder::systemRandom());
 
+    void setRound(bool isRound) { mIsRound = isRound; }
+
     int size() const { return mRecords.size(); }
-    int at(int position) const { return mRecords.value(position, -1); }
-    void clear() { mRecords.clear(); }
+    // Positions from the size on are those of the next round; -1: no record.
+    int at(int position) const;
+    void clear();
 
     // Adds the records that have come since, in the mode's order among themselves.
     void extend(int recordCount, int mode);
@@ -39,10 +43,14 @@ public:
     void reorder(int mode);
     // Drops the records from that count on, for the list has fewer, and orders the rest anew.
     void shrink(int recordCount, int mode);
-    // Orders all of it for another round, which does not begin with the record shown last.
-    void startOver(int mode, int lastRecord);
+    // The next round becomes this one; it does not begin with the record that ended the last.
+    void startOver(int mode);
 
 private:
+    void drawNextRound(int mode);
+
     playorder::RandomSource mRandom;
+    bool mIsRound = false;
     QVector<int> mRecords;
+    QVector<int> mNextRound;
 };

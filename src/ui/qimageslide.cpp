@@ -1,15 +1,12 @@
 #include "ui/qimageslide.h"
 
 #include "base/log.h"
-#include "common/ui/remotekeys.h"
 #include "platform/ipcthread.h"
 #include "ui/paging.h"
 #include "ui/slidemarks.h"
 #include "ui/slidephotos.h"
 #include "ui/sliderecords.h"
 #include "ui/slidesetting.h"
-
-#include <QKeyEvent>
 
 #include <limits>
 #include <utility>
@@ -41,6 +38,7 @@ QImageSlide::QImageSlide(QWidget *parent, playorder::RandomSource random)
     , mPhotos(new SlidePhotos(mLabel, mOptions, this))
 {
     setFocusPolicy(Qt::StrongFocus);
+    mPlayArray.setRound(mOptions.loop);
     connect(&mPlayTimer, &QTimer::timeout, this, [this] { update(); });
     connect(mPhotos, &SlidePhotos::arrived, this, &QImageSlide::takeTurnHeld);
     if (IpcThread *thread = IpcThread::getInstance())
@@ -74,7 +72,8 @@ void QImageSlide::initParam(bool isPlay, int index)
     mPhotos->clear();
     mIndex = index;
     mIsShowing = true;
-    mIsHolding = false;
+    mIsHolding = mIsListLost = false;
+    mBlockWanted = 0;
     mSpeed = SlideSetting::SlideSpeed;
     mMode = SlideSetting::SlideMode;
     placeParts();
@@ -127,12 +126,11 @@ void QImageSlide::renewPlayArray(int refreshMode)
 void QImageSlide::update(bool isUpdateIndex)
 {
     logLine("enter QImageSlide::update()");
-    if (!sliderecords::hasList()) {
-        logLine("Wrong QImageSlide::update()");
-        emit recordsLost();
+    if (waitsForList(isUpdateIndex))
         return;
-    }
     if (mIsPlay && isUpdateIndex) {
+        if (mPlayArray.size() != sliderecords::count())
+            renewPlayArray(1); // what comes next is known only then
         if (holdsOn())
             return;
         advance();
@@ -146,14 +144,55 @@ void QImageSlide::update(bool isUpdateIndex)
     prefetch();
 }
 
+// Without a list nothing can be shown. Asks for it, or for the next block of search results when
+// this one has been played, again at each turn: the network may come back.
+bool QImageSlide::waitsForList(bool isUpdateIndex)
+{
+    const int count = sliderecords::count();
+    const bool isOver = mIsPlay && isUpdateIndex && count > 0 && mIndex + 1 >= count;
+    if (isOver && mOptions.wholeList && mBlockWanted == 0)
+        mBlockWanted = sliderecords::nextBlock(mOptions.loop);
+    if (mBlockWanted > 0) {
+        mIndex = -1; // the next turn's is its first
+        mPlayArray.clear();
+        emit blockWanted(mBlockWanted);
+        return true;
+    }
+    mIsListLost = !sliderecords::hasList();
+    if (mIsListLost) {
+        logLine("Wrong QImageSlide::update()");
+        emit recordsLost();
+    }
+    return mIsListLost;
+}
+
+void QImageSlide::takeList()
+{
+    const bool isWaiting = mIsListLost || mBlockWanted > 0;
+    if (!mIsShowing || !isWaiting || !sliderecords::hasList())
+        return;
+    const bool isNextTurn = mBlockWanted > 0 && mIsPlay;
+    mIsListLost = false;
+    mBlockWanted = 0;
+    if (isNextTurn) {
+        renewPlayArray(1);
+        prefetch();
+        restartTimer();
+    }
+    update(isNextTurn);
+}
+
 // The turn is over, but the next photo is not there yet: it may take one turn more.
 bool QImageSlide::holdsOn()
 {
     if (!mOptions.waitForPhoto || mIsHolding)
         return false;
-    const bool isLast = mIndex + 1 >= sliderecords::count();
-    mIsHolding = isLast ? mOptions.wholeList && sliderecords::count() < sliderecords::total()
-                        : !mPhotos->isSettled(urlAt(mIndex + 1));
+    const bool isPageAwaited =
+        mIndex + 1 >= sliderecords::count() && mOptions.wholeList && sliderecords::isMoreToCome();
+    const QString next = urlAt(mIndex + 1);
+    mIsHolding = isPageAwaited || !(next.isEmpty() || mPhotos->isSettled(next));
+    if (mIsHolding)
+        prefetch();
     return mIsHolding;
 }
 
@@ -167,16 +206,19 @@ void QImageSlide::takeTurnHeld(const QString &url)
 
 void QImageSlide::advance()
 {
-    const int count = sliderecords::count();
+    const int count = mPlayArray.size();
     ++mIndex;
-    while (mOptions.skipUnreadable && mIndex + 1 < count && mPhotos->hasFailed(urlAt(mIndex)))
+    for (int skipped = 1; skipped < count && isSkipped(mIndex); ++skipped)
         ++mIndex;
-    if (mOptions.loop && mIndex >= count && count > 0) {
-        const int last = mPlayArray.at(mPlayArray.size() - 1);
-        renewPlayArray(1);
-        mPlayArray.startOver(mMode, last);
-        mIndex = 0;
+    if (mOptions.loop && count > 0 && mIndex >= count) {
+        mPlayArray.startOver(mMode);
+        mIndex %= count;
     }
+}
+
+bool QImageSlide::isSkipped(int position) const
+{
+    return mOptions.skipUnreadable && mPhotos->hasFailed(urlAt(position));
 }
 
 void QImageSlide::refreshDatas()
@@ -184,7 +226,7 @@ void QImageSlide::refreshDatas()
     const int ahead = mIndex + paging::pageSize;
     const int total = sliderecords::total();
     const bool isMoreToCome =
-        mOptions.wholeList ? sliderecords::count() < total : ahead < total - paging::pageSize;
+        mOptions.wholeList ? sliderecords::isMoreToCome() : ahead < total - paging::pageSize;
     if (mIndex < paging::pageSize || ahead < sliderecords::count() || !isMoreToCome)
         return;
     logLine("QImageSlide::refreshDatas() notify to load next page datas, mIndex=", mIndex);
@@ -221,10 +263,7 @@ void QImageSlide::prefetch()
 {
     QStringList urls;
     for (int i = 1; i <= mOptions.ahead; ++i) {
-        int position = mIndex + i;
-        if (mOptions.loop && mMode == playorder::Normal && mPlayArray.size() > 0)
-            position %= mPlayArray.size();
-        const QString url = urlAt(position);
+        const QString url = urlAt(mIndex + i);
         if (!url.isEmpty() && !urls.contains(url))
             urls << url;
     }
@@ -234,120 +273,6 @@ void QImageSlide::prefetch()
 QString QImageSlide::urlAt(int position) const
 {
     return sliderecords::url(mPlayArray.at(position));
-}
-
-bool QImageSlide::isKeyAnswered() const
-{
-    if (mOptions.keysWhileLoading)
-        return true;
-    if (sliderecords::isDownloading()) {
-        logLine("{QImageSlide::keyPressEvent} data is downloading and return...");
-        return false;
-    }
-    if (!sliderecords::hasList())
-        logLine("{QImageSlide::keyPressEvent} mCurrentPackageData is NULL");
-    return sliderecords::hasList();
-}
-
-void QImageSlide::keyPressEvent(QKeyEvent *event)
-{
-    logLine("enter QImageSlide::keyPressEvent()");
-    if (!isKeyAnswered())
-        return;
-    mMarks->wake();
-    switch (event->key()) {
-    case DEVICE_PLAYPAUSE_KEY:
-        play(!mIsPlay);
-        break;
-    case DEVICE_PLAY_KEY:
-        play(true);
-        break;
-    case DEVICE_PAUSE_KEY:
-    case DEVICE_SELECT_KEY:
-        logLine("{QImageSlide::keyPressEvent} DEVICE_PAUSE_KEY");
-        play(false);
-        break;
-    case DEVICE_LEFT_KEY:
-    case DEVICE_PRE_KEY:
-        stepBack();
-        break;
-    case DEVICE_RIGHT_KEY:
-    case DEVICE_NEXT_KEY:
-        stepOn();
-        break;
-    case DEVICE_SETTING_KEY:
-        openSetting();
-        break;
-    case DEVICE_RETURN_KEY:
-        logLine("{QImageSlide::keyPressEvent} DEVICE_RETURN_KEY");
-        leave();
-        break;
-    default:
-        break;
-    }
-}
-
-void QImageSlide::play(bool isPlay)
-{
-    setPlaying(isPlay);
-    updatePlayState(isPlay);
-}
-
-// Below 0 as well, deliberately: the update puts the position right.
-void QImageSlide::stepBack()
-{
-    logLine("{QImageSlide::keyPressEvent} mIndex = ", mIndex);
-    if (mIndex == 0)
-        logLine("{QImageSlide::keyPressEvent} mIndex is 0, return here......");
-    --mIndex;
-    update(false);
-    restartTimer();
-}
-
-void QImageSlide::stepOn()
-{
-    if (mIndex >= sliderecords::count() - 1)
-        return;
-    ++mIndex;
-    update(false);
-    restartTimer();
-}
-
-void QImageSlide::openSetting()
-{
-    if (!mSetting) {
-        mSetting = new SlideSetting(this);
-        connect(mSetting, &SlideSetting::clickConfirm, this, &QImageSlide::saveSetting);
-        connect(mSetting, &SlideSetting::clickCancel, this, &QImageSlide::closeSetting);
-    }
-    mSetting->setGeometry(rect());
-    mSetting->show();
-    mSetting->raise();
-    mSetting->load();
-}
-
-void QImageSlide::saveSetting()
-{
-    if (!mSetting) {
-        logLine("Error: setting instance is not created!!");
-        return;
-    }
-    mMode = mSetting->mode();
-    mPlayArray.reorder(mMode);
-    mSpeed = mSetting->speed();
-    SlideSetting::SlideMode = mMode;
-    SlideSetting::SlideSpeed = mSpeed;
-    prefetch(); // what comes next is another photo now
-    closeSetting();
-}
-
-void QImageSlide::closeSetting()
-{
-    if (mSetting)
-        mSetting->close();
-    setFocus();
-    mSpeed = SlideSetting::SlideSpeed;
-    restartTimer();
 }
 
 void QImageSlide::leave()
@@ -366,7 +291,8 @@ void QImageSlide::leave()
     }
     if (wasPlaying)
         updatePlayState(false);
-    emit returnImageSlideUpdate(mIndex + 1);
+    const int shown = mOptions.returnToPhoto ? mPlayArray.at(mIndex) : mIndex;
+    emit returnImageSlideUpdate(qMax(0, shown) + 1);
 }
 
 void QImageSlide::resizeEvent(QResizeEvent *event)

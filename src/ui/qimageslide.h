@@ -46,6 +46,8 @@ public slots:
     void updatePlayState(bool isPlay);
     void saveSetting();
     void closeSetting();
+    // A list of the home screen has come: goes on if it was waited for.
+    void takeList();
 
 signals:
     // The page after the one of this record (from 1) is wanted, or the one before.
@@ -55,6 +57,8 @@ signals:
     void returnImageSlideUpdate(int newIndexValue);
     // The list has gone while it was being shown: it is to be fetched again.
     void recordsLost();
+    // The block of search results that begins with the record of this number is to be fetched.
+    void blockWanted(int number);
     void signalUpdatePlaybackinfo(int statusupdate, int status, int param3, int param4);
 
 protected:
@@ -69,6 +73,8 @@ private:
     bool clampIndex();
     void advance();
     bool holdsOn();
+    bool waitsForList(bool isUpdateIndex);
+    bool isSkipped(int position) const;
     void takeTurnHeld(const QString &url);
     void showCurrent(SlideLabel::Change change);
     void prefetch();
@@ -87,6 +93,8 @@ private:
     int mIndex = 0; // position in the play array
     bool mIsPlay = false;
     bool mIsHolding = false; // a turn is over, and the next photo is waited for
+    bool mIsListLost = false;
+    int mBlockWanted = 0; // its first record; 0: the block that is there
     int mSpeed;              // seconds
     int mMode;
     PlayArray mPlayArray;

@@ -2,12 +2,14 @@
 
 #include "common/ui/picture.h"
 #include "common/ui/remotekeys.h"
+#include "common/ui/stretchedpicture.h"
 #include "data/htmlentities.h"
 #include "network/systemconfig.h"
 
 #include <QHBoxLayout>
 #include <QKeyEvent>
 #include <QLabel>
+#include <QPainter>
 
 #include <limits>
 
@@ -16,6 +18,7 @@ namespace {
 constexpr int kSmallestNumber = 5;
 constexpr int kValueWidth = 150;
 constexpr int kRowHeight = 48;
+constexpr qreal kFrame = 2.5; // of the focused row
 
 QLabel *makeText(Qt::Alignment alignment, QWidget *parent)
 {
@@ -141,6 +144,21 @@ void SettingItem::focusOutEvent(QFocusEvent *event)
 {
     QFrame::focusOutEvent(event);
     showFocus(false);
+}
+
+// The picture alone is hardly brighter than the panel: the frame is what shows the focus.
+void SettingItem::paintEvent(QPaintEvent *)
+{
+    if (!hasFocus())
+        return;
+    QPainter painter(this);
+    painter.drawPixmap(0, 0,
+                       stretchedPicture(QStringLiteral(":/res/Button_Normal.png"), size(),
+                                        kPictureBorder, this));
+    painter.setRenderHint(QPainter::Antialiasing);
+    painter.setPen(QPen(QColor(0xf2, 0xf6, 0xf9), kFrame));
+    const qreal inset = kFrame / 2;
+    painter.drawRoundedRect(QRectF(rect()).adjusted(inset, inset, -inset, -inset), 5, 5);
 }
 
 void SettingItem::showFocus(bool hasFocus)

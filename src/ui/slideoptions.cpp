@@ -6,7 +6,7 @@ namespace {
 
 QString valueOf(const char *key)
 {
-    return SystemConfig::value(QStringLiteral("SlideShow/") + QLatin1String(key)).trimmed();
+    return SystemConfig::value(QLatin1String(key)).trimmed();
 }
 
 bool isOn(const char *key)
@@ -40,19 +40,20 @@ SlideCorner corner(const char *key)
 SlideOptions SlideOptions::configured()
 {
     SlideOptions options;
-    options.fade = number("Fade", 0, 5000);
-    options.motion = number("Motion", 0, 30);
-    options.blurredFill = isOn("BlurredFill");
-    options.caption = corner("Caption");
-    options.date = corner("Date");
-    options.clock = corner("Clock");
-    options.marksSeconds = number("MarksSeconds", 0, 3600);
-    options.ahead = qMax(1, number("Ahead", 1, 8));
-    options.sharpen = isOn("Sharpen");
-    options.waitForPhoto = isOn("WaitForPhoto");
-    options.loop = isOn("Loop");
-    options.wholeList = isOn("WholeList");
-    options.skipUnreadable = isOn("SkipUnreadable");
-    options.keysWhileLoading = isOn("KeysWhileLoading");
+    options.fade = number("SlideShow/Fade", 0, 5000);
+    options.motion = number("SlideShow/Motion", 0, 30);
+    options.blurredFill = isOn("SlideShow/BlurredFill");
+    options.caption = corner("SlideShow/Caption");
+    options.date = corner("SlideShow/Date");
+    options.clock = corner("SlideShow/Clock");
+    options.marksSeconds = number("SlideShow/MarksSeconds", 0, 3600);
+    options.ahead = qMax(1, number("SlideShow/Ahead", 1, 8));
+    options.sharpen = isOn("SlideShow/Sharpen");
+    options.waitForPhoto = isOn("SlideShow/WaitForPhoto");
+    options.loop = isOn("SlideShow/Loop");
+    options.wholeList = isOn("SlideShow/WholeList");
+    options.skipUnreadable = isOn("SlideShow/SkipUnreadable");
+    options.returnToPhoto = isOn("SlideShow/ReturnToPhoto");
+    options.keysWhileLoading = isOn("SlideShow/KeysWhileLoading");
     return options;
 }

@@ -13,8 +13,9 @@
 
 namespace {
 
-constexpr int kDrift = 4;         // pixels, each way
-constexpr int kShadow = 2;        // pixels around the letters
+constexpr int kDrift = 4;  // pixels, each way
+constexpr int kShadow = 2; // pixels around the letters
+constexpr qreal kRimOpacity = 110.0 / 255;
 constexpr int kLongestText = 500; // characters; a line holds fewer
 constexpr int kWidthShare = 2;    // a text is at most this part of the screen wide
 
@@ -33,16 +34,27 @@ bool isAtLeft(SlideCorner corner)
     return corner == SlideCorner::TopLeft || corner == SlideCorner::BottomLeft;
 }
 
-// Light letters with a dark rim: readable on any photo.
+// Light letters with a dark rim: readable on any photo. The letters of the rim are laid out once.
 void drawLine(QPainter &painter, const QRect &box, int flags, const QString &text)
 {
-    painter.setPen(QColor(0, 0, 0, 110));
+    const qreal ratio = painter.device()->devicePixelRatioF();
+    QPixmap letters((QSizeF(box.size()) * ratio).toSize());
+    letters.setDevicePixelRatio(ratio);
+    letters.fill(Qt::transparent);
+    QPainter dark(&letters);
+    dark.setFont(painter.font());
+    dark.setPen(Qt::black);
+    dark.drawText(QRect(QPoint(), box.size()), flags, text);
+    dark.end();
+
+    painter.setOpacity(kRimOpacity);
     for (int x = -kShadow; x <= kShadow; ++x) {
         for (int y = -kShadow; y <= kShadow; ++y) {
             if (x != 0 || y != 0)
-                painter.drawText(box.translated(x, y), flags, text);
+                painter.drawPixmap(box.topLeft() + QPoint(x, y), letters);
         }
     }
+    painter.setOpacity(1);
     painter.setPen(QColor(0xf2, 0xf6, 0xf9));
     painter.drawText(box, flags, text);
 }

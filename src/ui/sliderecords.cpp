@@ -7,6 +7,16 @@
 
 namespace sliderecords {
 
+namespace {
+
+// In the whole feed, of a record of the list held.
+int numberOf(int record)
+{
+    return HomeWidget::mWidgetInst->state().firstNumber() + record;
+}
+
+} // namespace
+
 bool hasList()
 {
     return HomeWidget::mCurrentPackageData;
@@ -20,6 +30,20 @@ int count()
 int total()
 {
     return hasList() ? HomeWidget::mCurrentPackageData->mTotalCount : 0;
+}
+
+bool isMoreToCome()
+{
+    return HomeWidget::mWidgetInst && numberOf(count()) <= total();
+}
+
+int nextBlock(bool isRound)
+{
+    if (!HomeWidget::mWidgetInst || !HomeWidget::mWidgetInst->state().isSearch())
+        return 0;
+    if (isMoreToCome())
+        return numberOf(count());
+    return isRound && numberOf(0) > 1 ? 1 : 0;
 }
 
 bool isDownloading()

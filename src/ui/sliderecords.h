@@ -10,6 +10,11 @@ bool hasList();
 // Records that are loaded, and records that the feed has in all (0: unknown, all are loaded).
 int count();
 int total();
+// Records of the feed lie behind those that are loaded.
+bool isMoreToCome();
+// Search results are held block by block, one at a time: the number of the record that begins the
+// next block, or after the last one, if the show goes round, the first block. 0: this list stays.
+int nextBlock(bool isRound);
 // A page of the list is on its way, and the home screen waits for it.
 bool isDownloading();
 

@@ -2,6 +2,7 @@
 
 #include "base/i18n.h"
 #include "common/ui/frames.h"
+#include "common/ui/picturebutton.h"
 #include "common/ui/remotekeys.h"
 #include "network/systemconfig.h"
 #include "ui/settingitem.h"
@@ -10,7 +11,6 @@
 #include <QKeyEvent>
 #include <QLabel>
 #include <QPainter>
-#include <QPushButton>
 #include <QVBoxLayout>
 
 int SlideSetting::SlideMode = 0;
@@ -97,7 +97,7 @@ void SlideSetting::buildRows(QFrame *content)
 
 QPushButton *SlideSetting::makeButton(const QString &text)
 {
-    auto *button = new QPushButton(text, this);
+    auto *button = new PictureButton(text, this);
     QFont font = button->font();
     font.setPointSize(SystemConfig::buttonFont());
     button->setFont(font);

@@ -1,9 +1,11 @@
 #include "ui/titleicon.h"
 
 #include "common/ui/remotekeys.h"
+#include "common/ui/stretchedpicture.h"
 #include "network/systemconfig.h"
 
 #include <QKeyEvent>
+#include <QPainter>
 
 namespace {
 
@@ -38,6 +40,23 @@ const char *const kSignOutStyles[] = {
     "QLabel { background-color: rgba(100,149,237,0);border-style: outset;border-width: "
     "2px;border-color: green;padding: 6px;text-align: left;margin: 0px }",
 };
+
+const QColor kGreen(0, 128, 0); // a style sheet's "green"
+const QColor kBlue(100, 149, 237);
+const QColor kLight(0xf4, 0xf8, 0xfa);
+constexpr qreal kTitleRadius = 10;
+constexpr qreal kSignOutRadius = 3;
+constexpr qreal kFocusFrame = 3;
+
+void paintBox(QPainter &painter, const QRect &area, const QPen &pen, const QBrush &brush,
+              qreal radius)
+{
+    const qreal inset = pen.widthF() / 2;
+    painter.setRenderHint(QPainter::Antialiasing);
+    painter.setPen(pen);
+    painter.setBrush(brush);
+    painter.drawRoundedRect(QRectF(area).adjusted(inset, inset, -inset, -inset), radius, radius);
+}
 
 QFont entryFont(QFont font, bool signOut)
 {
@@ -74,9 +93,50 @@ QString TitleIcon::style(Look look, bool signOut)
 
 void TitleIcon::setLook(Look look)
 {
+    mLook = look;
     const QString sheet = style(look, isSignOut);
     if (sheet != styleSheet())
         setStyleSheet(sheet);
+}
+
+// Green alone is too dark for this background, and beside a border-image a style sheet draws no
+// border: with the focus, the ground is light and the green frame drawn whatever else there is.
+void TitleIcon::paintGround(QPainter &painter) const
+{
+    const auto picture = [&](const char *name, int border) {
+        painter.drawPixmap(0, 0, stretchedPicture(QLatin1String(name), size(), border, this));
+    };
+    const QPen focus(kGreen, kFocusFrame);
+    if (isSignOut && mLook == Look::Normal)
+        picture(":/res/SignOut_Bg.png", 2);
+    else if (isSignOut && mLook == Look::Selected)
+        paintBox(painter, rect(), QPen(kBlue, 2), Qt::NoBrush, kSignOutRadius);
+    else if (isSignOut)
+        paintBox(painter, rect(), focus, kLight, kSignOutRadius);
+    else if (mLook == Look::Focused)
+        paintBox(painter, rect(), focus, kLight, kTitleRadius);
+    else if (mLook == Look::Selected)
+        picture(":/res/TopBarBg_Selected.png", kPictureBorder);
+    else if (mLook == Look::FocusedSelected)
+        picture(":/res/TopBarBg_Focus.png", kPictureBorder);
+}
+
+QColor TitleIcon::textColour() const
+{
+    if (mLook == Look::Focused || mLook == Look::FocusedSelected)
+        return kGreen;
+    if (isSignOut)
+        return mLook == Look::Normal ? QColor(7, 99, 170) : QColor(Qt::white);
+    return mLook == Look::Selected ? Qt::black : Qt::white;
+}
+
+void TitleIcon::paintEvent(QPaintEvent *)
+{
+    QPainter painter(this);
+    paintGround(painter);
+    painter.setFont(font());
+    painter.setPen(textColour());
+    painter.drawText(rect(), Qt::AlignCenter, text());
 }
 
 void TitleIcon::keyPressEvent(QKeyEvent *event)

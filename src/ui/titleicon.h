@@ -23,4 +23,13 @@ public:
 
 signals:
     void pressEnter();
+
+protected:
+    void paintEvent(QPaintEvent *event) override;
+
+private:
+    void paintGround(QPainter &painter) const;
+    QColor textColour() const;
+
+    Look mLook = Look::Normal;
 };

@@ -1,6 +1,6 @@
 #include "ui/widget.h"
 
-#include "data/packageproperty.h"
+#include "data/packagemanager.h"
 #include "ui/homewidget.h"
 #include "ui/qimageslide.h"
 
@@ -30,6 +30,8 @@ void Widget::connectParts()
     connect(mPlayer, &QImageSlide::handleSlidePageUp, this, &Widget::handleSlidePageUp);
     connect(mPlayer, &QImageSlide::recordsLost, this,
             [this] { turnPage(true, mPlayer->position() + 1); });
+    connect(mPlayer, &QImageSlide::blockWanted, this, &Widget::fetchBlock, Qt::QueuedConnection);
+    connect(mHomeWidget, &HomeWidget::packageReady, mPlayer, &QImageSlide::takeList);
 }
 
 void Widget::startSlideShow(int index)
@@ -70,6 +72,17 @@ void Widget::handleSlidePageDown(int diff)
 void Widget::handleSlidePageUp(int diff)
 {
     turnPage(false, diff);
+}
+
+// Search results that begin with that record take the place of those held, below the player.
+void Widget::fetchBlock(int record)
+{
+    if (!QImageSlide::mIsShowing)
+        return;
+    HomeWidget::mCurrentPackageData = nullptr;
+    mHomeWidget->preparePageData(record, true);
+    PackageProperty block = mHomeWidget->state().mCurrentProperty;
+    PackageManager::removeCache(block); // which does not tell whose records it holds
 }
 
 // The page of that record, which also fetches the one behind it. From the event loop: the photo

@@ -32,6 +32,7 @@ private:
     void connectParts();
     void showPlayer();
     void turnPage(bool isDown, int record);
+    void fetchBlock(int record);
 
     HomeWidget *mHomeWidget;
     QImageSlide *mPlayer;

@@ -5,6 +5,7 @@
 #include "accountmanager/accountswidget.h"
 #include "accountmanager/accounttexts.h"
 #include "accountmanager/loginpage.h"
+#include "accountmanager/managerwidget.h"
 #include "accountmanager/waitwidget.h"
 #include "common/ui/remotekeys.h"
 #include "oauth/signinplugin.h"
@@ -13,6 +14,7 @@
 
 #include <QAbstractButton>
 #include <QLabel>
+#include <QScrollBar>
 #include <QtTest>
 
 #include <memory>
@@ -51,6 +53,14 @@ class TestAccountScreens : public QObject
     std::unique_ptr<AccountFile> mFile;
     std::unique_ptr<AccountManager> mScreen;
 
+    // Whether the accounts may have codes of their own.
+    void offerCodes(bool offers)
+    {
+        QSettings config(mFile->folder() + "/config.ini", QSettings::IniFormat);
+        config.setValue("Accounts/ProtectionCodes", offers);
+        config.sync();
+        SystemConfig::setConfigFile(config.fileName());
+    }
     // Stores accounts "0", "1", ..., the one with that number used last, and shows the screen.
     void show(int accounts, int last = 0)
     {
@@ -120,6 +130,9 @@ private slots:
             const QRect place(row->mapTo(list->viewport(), QPoint()), row->size());
             return list->viewport()->rect().contains(place);
         };
+        list->verticalScrollBar()->setValue(30); // as before it gets its size
+        mScreen->resize(1280, 700);
+        QTRY_VERIFY(wholeRowIsSeen());
         for (int key : {DEVICE_PAGEDOWN_KEY, DEVICE_DOWN_KEY, DEVICE_DOWN_KEY, DEVICE_PAGEUP_KEY}) {
             press({key});
             QVERIFY(wholeRowIsSeen());
@@ -225,6 +238,38 @@ private slots:
         press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY, DEVICE_SELECT_KEY});
         QCOMPARE(label("message"), AccountTexts::text(AccountTexts::NotDeleted));
         QCOMPARE(focus(), QString("0"));
+    }
+
+    // An account with a code of its own is asked for it where codes are offered, and only there.
+    void protectionCodes_data()
+    {
+        QTest::addColumn<bool>("offered");
+        QTest::addColumn<QString>("pin");
+        QTest::addColumn<bool>("asked");
+        QTest::newRow("not offered") << false << "1234" << false;
+        QTest::newRow("its own") << true << "1234" << true;
+        QTest::newRow("none") << true << "7305" << false;
+    }
+
+    void protectionCodes()
+    {
+        QFETCH(bool, offered);
+        QFETCH(bool, asked);
+        QFETCH(QString, pin);
+        offerCodes(offered);
+        show(1);
+        OtherConnection(mFile->path()).rows("UPDATE orvala1 SET password='" + pin + '\'');
+        QSignalSpy finished(mScreen.get(), &AccountManager::loginFinished);
+        press({DEVICE_RIGHT_KEY, DEVICE_RIGHT_KEY, DEVICE_DOWN_KEY});
+        QCOMPARE(focus(), QString(offered ? "Login ID" : "Exit"));
+        press({DEVICE_LEFT_KEY, DEVICE_LEFT_KEY, DEVICE_SELECT_KEY});
+        QCOMPARE(finished.size(), asked ? 0 : 1);
+        const auto *form = mScreen->findChild<ManagerWidget *>();
+        QCOMPARE(form && form->isVisible() && form->isOldUser(), asked);
+        if (asked) {
+            press({DEVICE_RETURN_KEY});
+            QCOMPARE(focus(), QString("0"));
+        }
     }
 
     void newAndExit()

@@ -169,6 +169,9 @@ void TestPostHelper::refusesFiles()
     QCOMPARE(upload("anything", true), ErrorCode(MediaUploader::Busy));
     QCOMPARE(upload(file("text.jpg", "no picture"), false), ErrorCode(MediaUploader::NotAnImage));
     QCOMPARE(upload(file("empty.png", ""), false), ErrorCode(MediaUploader::NotAnImage));
+    QByteArray claimed = encoded(plain(3, 2), "PNG"); // 100,000 pixels wide and high
+    claimed.replace(16, 8, QByteArray("\0\x01\x86\xa0\0\x01\x86\xa0", 8));
+    QCOMPARE(upload(file("claimed.png", claimed), false), ErrorCode(MediaUploader::NotAnImage));
     QVERIFY(mServer->requests().isEmpty());
 }
 

@@ -60,10 +60,13 @@ bool AlbumService::addPhoto(const QString &path, const QColor &colour, const QSi
     return addFile(path, {}) && image.save(mFolder.filePath("photos/" + path));
 }
 
-bool AlbumService::addUser(const QString &mail, const QString &name, const QString &folder) const
+bool AlbumService::addUser(const QString &mail, const QString &name, const QString &folder,
+                           const QString &password) const
 {
     const QString photos = mFolder.filePath("photos/" + folder);
     run({"user", "add", mail, "--name", name, "--photos", photos});
+    if (!password.isEmpty())
+        run({"user", "passwd", mail}, password.toUtf8() + '\n');
     return run({"user", "list"}).contains(mail.toUtf8());
 }
 
@@ -73,8 +76,8 @@ bool AlbumService::start()
     QFile::remove(ready);
     mProcess.setProcessChannelMode(QProcess::ForwardedChannels);
     mProcess.start(ORVALA_SERVICE_PROGRAM,
-                   {"serve", "--data", mFolder.filePath("data"), "--port", QString::number(mPort),
-                    "--ready-file", ready, "--log-level", "error"});
+                   {"serve", "--gathered", "none", "--data", mFolder.filePath("data"), "--port",
+                    QString::number(mPort), "--ready-file", ready, "--log-level", "error"});
     QFile file(ready);
     const auto isReady = [&] {
         return file.exists() || mProcess.waitForFinished(0) ||
@@ -123,11 +126,13 @@ QByteArray AlbumService::tokens(const QString &mail) const
     return run({"user", "token", mail});
 }
 
-QByteArray AlbumService::run(const QStringList &arguments) const
+QByteArray AlbumService::run(const QStringList &arguments, const QByteArray &input) const
 {
     QProcess process;
     process.setProcessChannelMode(QProcess::ForwardedErrorChannel);
     process.start(ORVALA_SERVICE_PROGRAM,
                   arguments + QStringList{"--data", mFolder.filePath("data")});
+    process.write(input);
+    process.closeWriteChannel();
     return process.waitForFinished(PATIENCE_MS) ? process.readAllStandardOutput() : QByteArray();
 }

@@ -23,7 +23,9 @@ public:
     // Paths are below the folder of photos; each folder with photos in it is an album.
     bool addFile(const QString &path, const QByteArray &content) const;
     bool addPhoto(const QString &path, const QColor &colour, const QSize &size = {96, 64}) const;
-    bool addUser(const QString &mail, const QString &name, const QString &folder) const;
+    // Without a password the user cannot sign in on the service's pages.
+    bool addUser(const QString &mail, const QString &name, const QString &folder,
+                 const QString &password = {}) const;
 
     // Returns when the service answers; after the first time on the same port.
     bool start();
@@ -50,7 +52,7 @@ private:
         void setupChildProcess() override;
     };
 
-    QByteArray run(const QStringList &arguments) const;
+    QByteArray run(const QStringList &arguments, const QByteArray &input = {}) const;
 
     QTemporaryDir mFolder;
     Process mProcess;

@@ -67,8 +67,7 @@ void RemoteCase::switchOff()
 
 void RemoteCase::signIn(const QString &origin)
 {
-    mTv->set("Service/FeedBase", origin);
-    mTv->set("Service/OAuthBase", origin + "/o/oauth2/");
+    mTv->useService(origin);
     QVERIFY(mTv->addAccount(anna, "Anna", mService.tokens(anna)));
     QVERIFY(mTv->addAccount(ben, "Ben", mService.tokens(ben)));
     QVERIFY(mTv->switchOn());
@@ -83,13 +82,7 @@ void RemoteCase::signIn(const QString &origin)
 
 void RemoteCase::enter(int entry)
 {
-    for (int row = 0; row < 3 && mTv->menuEntry() < 0; ++row)
-        mTv->press(DEVICE_UP_KEY);
-    const int way = entry - mTv->menuEntry();
-    for (int i = 0; i < qAbs(way); ++i)
-        mTv->press(way > 0 ? DEVICE_RIGHT_KEY : DEVICE_LEFT_KEY);
-    QCOMPARE(mTv->menuEntry(), entry);
-    mTv->press(DEVICE_SELECT_KEY);
+    QVERIFY(mTv->enter(entry));
 }
 
 void RemoteCase::walkTo(const QString &caption)

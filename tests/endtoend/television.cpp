@@ -2,6 +2,9 @@
 
 #include "accountmanager/accountitem.h"
 #include "accountmanager/accountmanagerhelper.h"
+#include "common/keyrobot.h"
+#include "common/ui/keyboardlayout.h"
+#include "common/ui/qpopupform.h"
 #include "common/ui/qtoastwidget.h"
 #include "data/packagemanager.h"
 #include "data/photomanager.h"
@@ -15,9 +18,12 @@
 #include "ui/photoitem.h"
 #include "ui/upwidget.h"
 
+#include <QAbstractButton>
 #include <QApplication>
 #include <QKeyEvent>
+#include <QLabel>
 #include <QTest>
+#include <QWebView>
 #include <QWindow>
 
 namespace {
@@ -63,6 +69,13 @@ Television::~Television()
     delete netcommon::Ipc::getInstance();
 }
 
+void Television::useService(const QString &origin)
+{
+    set("Service/FeedBase", origin);
+    set("Service/OAuthBase", origin + "/o/oauth2/");
+    set("Service/SignInPage", origin + "/ServiceLogin");
+}
+
 bool Television::addAccount(const QString &mail, const QString &name, const QByteArray &tokens)
 {
     const JsonObject answer = JsonParser::parse(tokens);
@@ -98,6 +111,33 @@ void Television::press(const QList<int> &keys) const
         press(key);
 }
 
+bool Television::type(const QString &text) const
+{
+    press(DEVICE_SELECT_KEY);
+    for (QPopUpForm *form : mWindow->findChildren<QPopUpForm *>()) {
+        if (!form->isVisible())
+            continue;
+        KeyRobot robot(form);
+        const bool typed = robot.type(text);
+        robot.press(EnterKey);
+        return typed;
+    }
+    return false;
+}
+
+bool Television::enter(int entry) const
+{
+    for (int row = 0; row < 3 && menuEntry() < 0; ++row)
+        press(DEVICE_UP_KEY);
+    const int way = entry - menuEntry();
+    for (int i = 0; i < qAbs(way); ++i)
+        press(way > 0 ? DEVICE_RIGHT_KEY : DEVICE_LEFT_KEY);
+    if (menuEntry() != entry)
+        return false;
+    press(DEVICE_SELECT_KEY);
+    return true;
+}
+
 QString Television::focus() const
 {
     const QWidget *widget = QApplication::focusWidget();
@@ -105,6 +145,8 @@ QString Television::focus() const
         return item->mail();
     if (const auto *cell = qobject_cast<const PhotoItem *>(widget))
         return cell->caption();
+    if (const auto *button = qobject_cast<const QAbstractButton *>(widget))
+        return button->text();
     return widget ? widget->metaObject()->className() : QString();
 }
 
@@ -120,6 +162,12 @@ QStringList Television::accounts() const
     for (const AccountItem *item : mWindow->findChildren<AccountItem *>())
         mails << item->mail();
     return mails;
+}
+
+QWebView *Television::page() const
+{
+    auto *view = mWindow->findChild<QWebView *>();
+    return view && view->isVisible() ? view : nullptr;
 }
 
 HomeWidget *Television::home() const
@@ -179,4 +227,10 @@ QString Television::toast() const
 {
     const auto *toast = shown<QToastWidget>();
     return toast ? toast->text().simplified() : QString();
+}
+
+QString Television::label(const QString &name) const
+{
+    const auto *found = mWindow->findChild<QLabel *>(name);
+    return found && found->isVisible() ? found->text() : QString();
 }

@@ -3,6 +3,8 @@
 #include "common/ui/qpopupdialog.h"
 #include "common/ui/qpopupform.h"
 #include "common/ui/remotekeys.h"
+#include "data/mediauploader.h"
+#include "data/packagemanager.h"
 #include "endtoend/remotecase.h"
 #include "network/jsonparser.h"
 #include "platform/ipc.h"
@@ -45,6 +47,7 @@ private:
     void changeTags();
     void deleteComment();
     void leaveAlbum();
+    void findUpload();
     void search();
     void crossBlocks();
     void visitPerson();
@@ -80,7 +83,7 @@ void TestTour::tour()
     for (auto step :
          {&TestTour::walkFeatured, &TestTour::openOwnAlbum, &TestTour::walkPhotos,
           &TestTour::postComment, &TestTour::keepCommentOverRestart, &TestTour::changeTags,
-          &TestTour::deleteComment, &TestTour::leaveAlbum, &TestTour::search,
+          &TestTour::deleteComment, &TestTour::leaveAlbum, &TestTour::findUpload, &TestTour::search,
           &TestTour::crossBlocks, &TestTour::visitPerson, &TestTour::signOut, &TestTour::leave}) {
         if (QTest::currentTestFailed())
             return;
@@ -231,6 +234,30 @@ void TestTour::leaveAlbum()
     QVERIFY(mTv->shown<QConfirm>());
     mTv->press(DEVICE_RETURN_KEY);
     QCOMPARE(mTv->focus(), QStringLiteral("Sea\n10 photos"));
+}
+
+// What came from elsewhere is in the album when that is opened the next time.
+void TestTour::findUpload()
+{
+    const QString file = QDir(QDir::tempPath()).filePath("orvala-upload.png");
+    QImage picture(400, 300, QImage::Format_RGB32);
+    picture.fill(Qt::magenta);
+    QVERIFY(picture.save(file));
+    const QString title = QString::fromUtf8("<b> & \"\u044f\U0001F41F\" %1");
+    mColours.insert(title, Qt::magenta);
+    const QString album =
+        mTv->shown<HomeWidget>()->findChild<PictureDetailWidget *>()->photo().albumId;
+    QCOMPARE(MediaUploader::startToUpload(file, title, "default", album, "", false), NET_SUCCESS);
+    QVERIFY(QFile::remove(file));
+    PackageManager::clearAll(); // as after a minute
+    enter(UpWidget::MyPhotosEntry);
+    QTRY_COMPARE(mTv->captions().size(), 8);
+    walkTo("Sea\n11 photos");
+    mTv->press(DEVICE_SELECT_KEY);
+    QTRY_VERIFY(isListed("1/11", 8));
+    mTv->press(DEVICE_PAGEDOWN_KEY);
+    QTRY_VERIFY(isListed("9/11", 3));
+    QVERIFY(mTv->captions().contains(title));
 }
 
 void TestTour::search()

@@ -119,28 +119,6 @@ TEST_F(Feeds, pagesKeepToTheirLimits)
     }
 }
 
-TEST_F(Feeds, searchFindsTitlesCaptionsTagsAndAlbumsByTheBeginningsOfWords)
-{
-    const struct
-    {
-        const char *words;
-        Titles titles;
-    } rows[] = {{"dog", {"one"}},         {"DO%20SUM", {"one"}},
-                {"summ", {"two", "one"}}, {"thr", {"three"}},
-                {"winter", {"three"}},    {"hidden", {}},
-                {"secret", {}},           {"", {}},
-                {"%22%20OR%20*", {}},     {"NEAR%28one", {}},
-                {"%F0%9F%90%95", {}},     {"one%00", {"one"}}};
-    for (const auto &row : rows) {
-        const json found =
-            publicFeed(std::string(base) + "/all?q=" + row.words + "&max-results=100&alt=json");
-        EXPECT_EQ(titlesOf(found), row.titles) << row.words;
-        EXPECT_EQ(valueOf(found, "openSearch$totalResults"), std::to_string(row.titles.size()));
-    }
-    EXPECT_EQ(titlesOf(publicFeed(std::string(base) + "/all?q=summ&max-results=100&start-index=2")),
-              (Titles{"one"}));
-}
-
 TEST_F(Feeds, commentsAndTagsOfAPhoto)
 {
     const std::string text = "a < b & \"c\" <br /> \xF0\x9F\x98\x80";
@@ -174,43 +152,6 @@ TEST_F(Feeds, contactsAreTheOthers)
     EXPECT_EQ(valueOf(list["entry"][0], "gphoto$user"), "2");
     EXPECT_EQ(valueOf(list["entry"][0], "gphoto$nickname"), "Ben");
     EXPECT_EQ(statusOf(pathOf(valueOf(list["entry"][0], "gphoto$thumbnail"))), 200);
-}
-
-TEST_F(Feeds, tokensDecideWhoSeesWhat)
-{
-    const std::string ben = token("ben@orvala.example");
-    const json own = publicFeed(std::string(base) + "/user/default?access_token=" + ben);
-    ASSERT_EQ(own["entry"].size(), 2u);
-    std::string secret;
-    for (const json &entry : own["entry"]) {
-        if (valueOf(entry, "gphoto$access") == "private")
-            secret = pathOf(valueOf(entry, "id"));
-    }
-    EXPECT_EQ(titlesOf(publicFeed(secret + "?access_token=" + ben)), (Titles{"hidden"}));
-    const std::string anna = token("anna@orvala.example");
-    const std::string expired = token("anna@orvala.example", 0);
-    const struct
-    {
-        std::string path;
-        int status;
-    } rows[] = {{secret + "?access_token=" + anna, 403},
-                {secret + "/photoid/1?kind=comment&access_token=" + anna, 403},
-                {secret, 401},
-                {secret + "?access_token=" + ben + "x", 401},
-                {std::string(base) + "/user/1?access_token=" + expired, 401},
-                {std::string(base) + "/user/1?access_token=", 401},
-                {std::string(base) + "/user/9?access_token=" + anna, 404},
-                {std::string(base) + "/user/1/albumid/999?access_token=" + anna, 404},
-                {std::string(base) + "/user/1/albumid/x?access_token=" + anna, 404},
-                {photoPath(0) + "9999?kind=tag&access_token=" + anna, 404},
-                {photoPath(0) + "?kind=user&access_token=" + anna, 400},
-                {std::string(base) + "/user/ben@orvala.example?access_token=" + anna, 200}};
-    for (const auto &row : rows)
-        EXPECT_EQ(statusOf(row.path), row.status) << row.path;
-    EXPECT_EQ(titlesOf(publicFeed(std::string(base) + "/user/2?access_token=" + anna)),
-              (Titles{"ben"}));
-    EXPECT_EQ(get(std::string(base) + "/user/1", {{"Authorization", "Bearer " + anna}})->status,
-              200);
 }
 
 TEST_F(Feeds, addressesFollowTheHostThatWasAsked)

@@ -18,11 +18,14 @@ using Clock = std::chrono::steady_clock;
 class RawClient
 {
 public:
-    explicit RawClient(int port)
+    // `device`: which of the loopback addresses it comes from.
+    explicit RawClient(int port, std::uint32_t device = INADDR_LOOPBACK)
         : mSocket(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0))
     {
         sockaddr_in address{};
         address.sin_family = AF_INET;
+        address.sin_addr.s_addr = htonl(device);
+        ::bind(mSocket, reinterpret_cast<sockaddr *>(&address), sizeof address);
         address.sin_port = htons(static_cast<std::uint16_t>(port));
         address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
         mConnected =
@@ -101,6 +104,22 @@ TEST_F(Http, oddRequestsGetClearAnswers)
     EXPECT_EQ(answerTo("DELETE /data/feed/api/featured HTTP/1.1\r\n" + closing), answer + "405");
     EXPECT_EQ(answerTo("POST /o/oauth2/token HTTP/1.1\r\nContent-Length: 99999999\r\n" + closing),
               answer + "413");
+    const std::string post = "POST /o/oauth2/token HTTP/1.1\r\n";
+    EXPECT_EQ(answerTo(post + "Content-Length: -5\r\n" + closing), answer + "413");
+    EXPECT_EQ(answerTo(post + closing), answer + "411");
+    EXPECT_EQ(answerTo(post + "Content-Length: 3\r\nContent-Encoding: gzip\r\n" + closing + "abc"),
+              answer + "415");
+    EXPECT_EQ(answerTo(post + "Content-Length: 3\r\nContent-Type: multipart/form-data\r\n" +
+                       closing + "abc"),
+              answer + "415");
+    EXPECT_EQ(answerTo(post + "Content-Length: 3\r\nContent-Length: 30\r\n" + closing + "abc"),
+              answer + "400");
+    EXPECT_EQ(answerTo(post + "Content-Length: 30\r\nTransfer-Encoding: chunked\r\n" + closing),
+              answer + "400");
+    std::string chunks = post + "Transfer-Encoding: chunked\r\n" + closing;
+    for (int i = 0; i < 20; ++i)
+        chunks += "10000\r\n" + std::string(65536, 'x') + "\r\n";
+    EXPECT_EQ(answerTo(chunks + "0\r\n\r\n"), answer + "413");
     EXPECT_EQ(answerTo(page + "Range: bytes=0-1\r\n" + closing), answer + "200");
     EXPECT_EQ(get("/data/feed/api/featured?x=%zz%&&=&a")->status, 200);
 }
@@ -159,6 +178,22 @@ TEST_F(Http, silentClientsCostNobodyElse)
         EXPECT_EQ(client.Get("/data/feed/api/featured")->status, 200);
     // And with all of them open the service stops at once.
     const auto start = Clock::now();
+    stop();
+    EXPECT_LT(Clock::now() - start, std::chrono::seconds(1));
+}
+
+TEST_F(Http, slowClientsCostNobodyElse)
+{
+    start();
+    std::vector<std::unique_ptr<RawClient>> slow;
+    for (int i = 0; i < 200; ++i) { // more than there are threads
+        slow.push_back(std::make_unique<RawClient>(service().port(), INADDR_LOOPBACK + 1));
+        ASSERT_TRUE(slow.back()->send(
+            i % 2 ? page + "Host: x\r\nX: "
+                  : "POST /o/oauth2/token HTTP/1.1\r\nContent-Length: 100\r\n\r\nx"));
+    }
+    const auto start = Clock::now();
+    EXPECT_EQ(statusOf("/data/feed/api/featured"), 200);
     stop();
     EXPECT_LT(Clock::now() - start, std::chrono::seconds(1));
 }

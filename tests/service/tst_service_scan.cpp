@@ -2,6 +2,7 @@
 
 #include "base/texts.h"
 #include "index/catalogue.h"
+#include "index/remarks.h"
 #include "index/users.h"
 
 #include <gtest/gtest.h>
@@ -57,6 +58,77 @@ TEST_F(Scan, followsWhatHappensInTheFolder)
     EXPECT_EQ(valueOf(feed(album)["entry"][0], "summary"), "Now with a caption");
     EXPECT_EQ(titlesOf(publicFeed("/data/feed/api/all?q=capt")), (Titles{"one"}));
     EXPECT_EQ(titlesOf(publicFeed("/data/feed/api/all?q=three")), Titles{});
+}
+
+TEST_F(Scan, movedFilesKeepWhatBelongsToThem)
+{
+    const Titles names = {"m/rename", "m/later", "m/earlier", "old/one",
+                          "m/two",    "m/taken", "m/kept"};
+    for (std::size_t i = 0; i < names.size(); ++i)
+        addPhoto(names[i] + ".jpg", {{"Exif.Image.ImageDescription", std::to_string(i)}});
+    start();
+    scan();
+    json comments;
+    for (const std::string &name : names)
+        comments.push_back(
+            {{"photo", name + ".jpg"}, {"author", "anna@orvala.example"}, {"text", name}});
+    ASSERT_TRUE(import({{"comments", comments}}));
+    fs::remove(photo("m/taken.jpg"));
+    scan();
+    stop(); // what happens meanwhile counts too
+    const std::vector<std::pair<std::string, std::string>> moves = {
+        {"m/rename.jpg", "m/a new name.jpg"},
+        {"m/later.jpg", "z/later.jpg"},
+        {"m/earlier.jpg", "a/other.jpg"},
+        {"old", "new"}};
+    for (const auto &[from, to] : moves) {
+        fs::create_directories(fs::path(photo(to)).parent_path());
+        fs::rename(photo(from), photo(to));
+    }
+    fs::copy_file(photo("m/kept.jpg"), photo("z/copy.jpg"));
+    fs::rename(photo("m/two.jpg"), photo("m/taken.jpg")); // where another one was
+    start();
+    scan();
+    std::map<std::string, std::string> commentOf;
+    const json list = publicFeed("/data/feed/api/featured");
+    for (const json &entry : list["entry"]) {
+        const json notes = feed(pathOf(valueOf(entry, "id")) + "?kind=comment");
+        for (const json &note : notes["entry"])
+            commentOf[valueOf(entry, "title")] += valueOf(note, "content");
+    }
+    const std::map<std::string, std::string> expected = {
+        {"a new name", "m/rename"}, {"later", "m/later"}, {"other", "m/earlier"},
+        {"one", "old/one"},         {"taken", "m/two"},   {"kept", "m/kept"}};
+    EXPECT_EQ(commentOf, expected);
+    EXPECT_EQ(list["entry"].size(), 7u); // with the copy, which is a photo of its own
+    EXPECT_EQ(albums(), (Titles{"a", "m", "new", "z"}));
+    for (const json &album : feed("/data/feed/api/user/default")["entry"])
+        EXPECT_EQ(valueOf(album, "gphoto$numphotos"),
+                  std::to_string(feed(pathOf(valueOf(album, "id")))["entry"].size()));
+    EXPECT_EQ(titlesOf(publicFeed("/data/feed/api/all?q=new+one")), Titles{"one"});
+}
+
+TEST_F(Scan, aRemovedKeywordStaysAway)
+{
+    addPhoto("a/one.jpg", {{"Iptc.Application2.Keywords", "Dogs"}});
+    start();
+    scan();
+    const auto tags = [&] {
+        return valueOf(feed(albumPath("a"))["entry"][0]["media$group"], "media$keywords");
+    };
+    const auto touch = [&] {
+        addMetadata(photo("a/one.jpg"), "Exif.Image.ImageDescription", "Changed");
+        fs::last_write_time(photo("a/one.jpg"),
+                            fs::last_write_time(photo("a/one.jpg")) + std::chrono::hours(1));
+        scan();
+    };
+    EXPECT_EQ(tags(), "Dogs");
+    EXPECT_TRUE(removeTag(database(), 1, "Dogs"));
+    touch();
+    EXPECT_EQ(tags(), "");
+    addTag(database(), 1, 1, "Dogs");
+    touch();
+    EXPECT_EQ(tags(), "Dogs");
 }
 
 TEST_F(Scan, aLostDiskLosesNothing)
@@ -170,9 +242,13 @@ TEST_F(Scan, privacyFollowsItsMark)
     addPhoto("a/b/one.jpg");
     start();
     scan();
+    const std::string address = pathOf(
+        publicFeed("/data/feed/api/featured")["entry"][0]["content"]["src"].get<std::string>());
+    EXPECT_EQ(statusOf(address), 200);
     writeBytes(photo("a/.private"), "");
     scan();
     EXPECT_EQ(featured(), Titles{});
+    EXPECT_EQ(statusOf(address), 404); // whoever knew it
     EXPECT_EQ(titlesOf(publicFeed("/data/feed/api/all?q=one")), Titles{});
     EXPECT_EQ(albums(), Titles{"b"});
     fs::remove(photo("a/.private"));

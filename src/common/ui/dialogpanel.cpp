@@ -1,20 +1,20 @@
 #include "common/ui/dialogpanel.h"
 
 #include "common/ui/frames.h"
+#include "common/ui/picturebutton.h"
 #include "common/ui/popupoverlay.h"
+#include "common/ui/stretchedpicture.h"
 #include "common/ui/textfit.h"
 #include "network/systemconfig.h"
 
 #include <QHBoxLayout>
 #include <QLabel>
-#include <QPushButton>
 
 namespace {
 
 constexpr QSize kButtonSize(120, 40);
 constexpr int kButtonGap = 32;
 constexpr int kMargin = 32;
-constexpr int kBorder = 6; // of a button's picture
 
 int panelWidth()
 {
@@ -94,18 +94,18 @@ QFont DialogPanel::messageFont() const
 
 QPushButton *DialogPanel::addButton(const QString &text)
 {
-    auto *button = new QPushButton(this);
+    auto *button = new PictureButton(this);
     QFont font = button->font();
     font.setPointSize(SystemConfig::buttonFont());
     button->setFont(font);
-    button->setText(buttonText(text, font, kButtonSize.width() - 2 * kBorder));
+    button->setText(buttonText(text, font, kButtonSize.width() - 2 * kPictureBorder));
     button->setLayoutDirection(text.isRightToLeft() ? Qt::RightToLeft : Qt::LeftToRight);
     button->setFixedSize(kButtonSize);
     button->setFocusPolicy(Qt::NoFocus);
     setPopupColours(button);
-    button->setStyleSheet(mButtons.isEmpty() ? mStyles.focused : mStyles.normal);
     mButtonRow->insertWidget(mButtonRow->count() - 1, button);
     mButtons.append(button);
+    setMarked(mButtons.size() - 1, mButtons.size() == 1);
     return button;
 }
 
@@ -113,7 +113,13 @@ void DialogPanel::focusButton(int index)
 {
     if (index < 0 || index >= mButtons.size() || index == mFocusedButton)
         return;
-    mButtons.at(mFocusedButton)->setStyleSheet(mStyles.normal);
-    mButtons.at(index)->setStyleSheet(mStyles.focused);
+    setMarked(mFocusedButton, false);
+    setMarked(index, true);
     mFocusedButton = index;
+}
+
+void DialogPanel::setMarked(int index, bool marked)
+{
+    mButtons.at(index)->setStyleSheet(marked ? mStyles.focused : mStyles.normal);
+    mButtons.at(index)->setMarked(marked);
 }

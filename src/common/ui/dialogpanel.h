@@ -5,6 +5,7 @@
 
 class QHBoxLayout;
 class QLabel;
+class PictureButton;
 class QPushButton;
 
 // The panel of a dialog: a title bar, a message and a row of buttons, of which one carries the mark
@@ -37,11 +38,13 @@ public:
     void focusButton(int index);
 
 private:
+    void setMarked(int index, bool marked);
+
     ButtonStyles mStyles;
     QLabel *mTitle;
     QLabel *mMessage;
     QHBoxLayout *mButtonRow;
-    QList<QPushButton *> mButtons;
+    QList<PictureButton *> mButtons;
     int mFocusedButton = 0;
 };
 

@@ -2,7 +2,6 @@
 
 #include "common/ui/popupoverlay.h"
 
-#include <QStyleOptionButton>
 #include <QStylePainter>
 
 namespace {
@@ -12,27 +11,31 @@ constexpr int kSmallestText = 14;
 constexpr int kMargin = 6;
 constexpr qreal kDimmed = 0.35;
 
+const QString kMarkedPicture = QStringLiteral(":/res/KeyBoard_Bg_Focus.png");
+const QString kPlainPicture = QStringLiteral(":/res/KeyBoard_Bg_Normal.png");
+
 QString markedStyle()
 {
     return QStringLiteral("outline-width: 0px; border-image:url(%1);border-width: 6px;")
-        .arg(QLatin1String(":/res/KeyBoard_Bg_Focus.png"));
+        .arg(kMarkedPicture);
 }
 
 QString plainStyle()
 {
     return QStringLiteral("outline-width: 0px; border-image: url(%1);border-width: 6px;")
-        .arg(QLatin1String(":/res/KeyBoard_Bg_Normal.png"));
+        .arg(kPlainPicture);
 }
 
 } // namespace
 
 KeyButton::KeyButton(QWidget *parent)
-    : QPushButton(parent)
+    : PictureButton(parent)
 {
     setFocusPolicy(Qt::NoFocus);
     setPopupColours(this);
     setIconSize({28, 28});
     setSizePolicy(QSizePolicy::Ignored, QSizePolicy::Expanding);
+    setPictures(kMarkedPicture, kPlainPicture);
     setMarked(false);
 }
 
@@ -44,6 +47,7 @@ void KeyButton::setLabel(const QString &label)
 void KeyButton::setMarked(bool marked)
 {
     setStyleSheet(marked ? markedStyle() : plainStyle());
+    PictureButton::setMarked(marked);
 }
 
 QFont KeyButton::fittingFont() const
@@ -60,11 +64,7 @@ QFont KeyButton::fittingFont() const
 void KeyButton::paintEvent(QPaintEvent *)
 {
     QStylePainter painter(this);
-    QStyleOptionButton option;
-    initStyleOption(&option);
-    option.text.clear();
-    option.icon = QIcon();
-    painter.drawControl(QStyle::CE_PushButton, option);
+    paintPicture(painter);
     painter.setOpacity(isEnabled() ? 1 : kDimmed); // not the frame, which may show the focus
     QRect picture(QPoint(), iconSize());
     picture.moveCenter(rect().center());

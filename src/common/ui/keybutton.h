@@ -1,10 +1,10 @@
 #pragma once
 
-#include <QPushButton>
+#include "common/ui/picturebutton.h"
 
 // A key of the on-screen keyboard: its text may use the whole of it, where a button of a style
 // sheet would cut it at the border, and shrinks until it fits.
-class KeyButton : public QPushButton
+class KeyButton : public PictureButton
 {
     Q_OBJECT
 

@@ -105,6 +105,7 @@ void QPopUpForm::initConfirm(int type, const QString &text)
     confirm->init(type, text);
     connect(confirm, &QConfirm::clickConfirm, this, &QPopUpForm::handleClickConfirm);
     connect(confirm, &QConfirm::clickCancel, this, &QPopUpForm::handleReturn);
+    confirm->installEventFilter(this);
     setPanel(confirm);
     host(confirm);
 }
@@ -175,6 +176,17 @@ void QPopUpForm::handleShareComment(QString &text)
 void QPopUpForm::handleDelItem(int index)
 {
     emit delTag(index);
+}
+
+// A question leaves no key to its form, but Return answers it as well.
+bool QPopUpForm::eventFilter(QObject *watched, QEvent *event)
+{
+    const bool isReturn = watched == mHosted && event->type() == QEvent::KeyPress &&
+                          static_cast<QKeyEvent *>(event)->key() == DEVICE_RETURN_KEY;
+    if (!isReturn)
+        return PopupOverlay::eventFilter(watched, event);
+    handleReturn();
+    return true;
 }
 
 // What the hosted form leaves: its user must always find the way back.

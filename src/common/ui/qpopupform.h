@@ -56,6 +56,7 @@ public slots:
 
 protected:
     void keyPressEvent(QKeyEvent *event) override;
+    bool eventFilter(QObject *watched, QEvent *event) override;
     QWidget *focusReceiver() override;
 
 private:

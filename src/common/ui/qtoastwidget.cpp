@@ -31,7 +31,8 @@ QToastWidget::QToastWidget(QWidget *parent)
 void QToastWidget::showText(const QString &text, int milliseconds)
 {
     place();
-    const QSize box(width() - 4 * SystemConfig::borderLeft(), mLabel->height() * 3 / 4);
+    // What the picture's panel has room for.
+    const QSize box(width() * 2 / 3, mLabel->height() / 2);
     mLabel->setText(fitText(text, mLabel->font(), box));
     show();
     raise();

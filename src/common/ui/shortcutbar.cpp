@@ -4,14 +4,12 @@
 #include "common/ui/remotekeys.h"
 
 #include <QHBoxLayout>
-#include <QKeySequence>
 #include <QLabel>
 #include <QPixmap>
 
 namespace {
 
 constexpr int kTextHeight = 18; // pixels of the font
-constexpr int kCapHeight = 28;
 
 struct Cap
 {
@@ -22,6 +20,7 @@ struct Cap
 const Cap kCaps[] = {
     {DEVICE_SELECT_KEY, ":/res/hint_select.png"},
     {DEVICE_RETURN_KEY, ":/res/hint_return.png"},
+    {DEVICE_DOWN_KEY, ":/res/hint_down.png"},
     {DEVICE_PAGEUP_KEY, ":/res/hint_page_up.png"},
     {DEVICE_PAGEDOWN_KEY, ":/res/hint_page_down.png"},
     {DEVICE_PLAY_KEY, ":/res/hint_play.png"},
@@ -49,21 +48,17 @@ QLabel *makeLabel(QWidget *parent, const QString &text)
     QFont font = label->font();
     font.setPixelSize(kTextHeight);
     label->setFont(font);
+    // Not by a style sheet, which would keep the font that the program starts with.
+    QPalette palette = label->palette();
+    palette.setColor(QPalette::WindowText, QColor(0xc5, 0xd2, 0xdb));
+    label->setPalette(palette);
     return label;
 }
 
 QLabel *makeCap(QWidget *parent, int key)
 {
-    const QPixmap picture = pictureOf(key);
-    if (picture.isNull()) {
-        QLabel *cap = makeLabel(parent, QKeySequence(key).toString());
-        cap->setStyleSheet(QStringLiteral("color:#f2f6f9;background-color:#2a3641;border:2px solid "
-                                          "#9fb0bc;border-radius:7px;padding:0px 6px;"));
-        cap->setFixedHeight(kCapHeight);
-        return cap;
-    }
     auto *cap = new QLabel(parent);
-    cap->setPixmap(picture);
+    cap->setPixmap(pictureOf(key));
     return cap;
 }
 
@@ -86,7 +81,6 @@ void ShortcutBar::addEntry(int key, const QString &text)
     row->setSpacing(8);
     row->addWidget(makeCap(entry, key));
     QLabel *label = makeLabel(entry, text);
-    label->setStyleSheet(QStringLiteral("color:#c5d2db;"));
     row->addWidget(label);
     mRow->addWidget(entry);
     mEntries.insert(key, {entry, label});

@@ -29,6 +29,8 @@ void TestService::start(bool withTls)
     ServiceSettings settings;
     settings.data = file("data");
     settings.withTls = withTls;
+    settings.gathered = gathered;
+    settings.today = [this] { return today; };
     std::string error;
     mService = Service::start(settings, &error);
     ASSERT_TRUE(mService) << error;

@@ -19,6 +19,10 @@ public:
     // Photos below the folder "photos" belong to anna@orvala.example.
     TestService();
 
+    // Without gathered albums, unless a test asks for them.
+    GatheredKinds gathered = {};
+    std::string today = "2026-05-01";
+
     void start(bool withTls = false);
     void stop() { mService.reset(); }
     Service &service() { return *mService; }

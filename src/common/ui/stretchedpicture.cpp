@@ -1,5 +1,6 @@
-#include "ui/stretchedpicture.h"
+#include "common/ui/stretchedpicture.h"
 
+#include <QFile>
 #include <QPainter>
 #include <QPixmapCache>
 #include <QWidget>
@@ -14,6 +15,26 @@ QString keyOf(const QString &resource, const QSize &size, int margin)
              QString::number(margin));
 }
 
+// What a border picture is on a dense screen: the same, drawn that many times as large. Qt would
+// take a file named @3x for a style sheet as well, and cut it in the wrong places.
+constexpr int kLargeScale = 3;
+
+QString largeFile(const QString &resource)
+{
+    QString file = resource;
+    return file.insert(file.lastIndexOf(QLatin1Char('.')), QStringLiteral("-large"));
+}
+
+void drawStretched(QPainter &painter, const QString &resource, const QSize &size, int margin)
+{
+    const QString large = largeFile(resource);
+    const bool isLarge = painter.device()->devicePixelRatioF() > 1 && QFile::exists(large);
+    const QPixmap source(isLarge ? large : resource);
+    const int cut = isLarge ? margin * kLargeScale : margin;
+    qDrawBorderPixmap(&painter, QRect(QPoint(0, 0), size), QMargins(margin, margin, margin, margin),
+                      source, source.rect(), QMargins(cut, cut, cut, cut));
+}
+
 } // namespace
 
 QPixmap stretchedPicture(const QString &resource, const QSize &size, int margin,
@@ -25,16 +46,14 @@ QPixmap stretchedPicture(const QString &resource, const QSize &size, int margin,
     QPixmap stretched;
     if (QPixmapCache::find(key, &stretched))
         return stretched;
-    const QPixmap source(resource);
-    if (source.isNull() || pixels.isEmpty())
+    if (pixels.isEmpty() || !QFile::exists(resource))
         return QPixmap();
     stretched = QPixmap(pixels);
     stretched.fill(Qt::transparent);
     stretched.setDevicePixelRatio(ratio);
     QPainter painter(&stretched);
     painter.setRenderHint(QPainter::SmoothPixmapTransform);
-    qDrawBorderPixmap(&painter, QRect(QPoint(0, 0), size), QMargins(margin, margin, margin, margin),
-                      source);
+    drawStretched(painter, resource, size, margin);
     painter.end();
     QPixmapCache::insert(key, stretched);
     return stretched;

@@ -11,6 +11,9 @@ class QWidget;
 // style sheet's border-image would be stretched anew at every paint. Both keep what they made in
 // Qt's pixmap cache.
 
+// The border of most such pictures, in layout pixels.
+constexpr int kPictureBorder = 6;
+
 // The picture stretched over the size (in layout pixels), its outer margin of that many pixels kept
 // unstretched, as border-image does. Null when there is no such picture.
 QPixmap stretchedPicture(const QString &resource, const QSize &size, int margin,

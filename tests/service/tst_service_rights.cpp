@@ -1,0 +1,144 @@
+#include "support/testservice.h"
+
+#include "base/texts.h"
+#include "index/tokens.h"
+#include "index/users.h"
+
+#include <gtest/gtest.h>
+
+namespace {
+
+const std::string user = "/data/feed/api/user/";
+
+std::string entryOf(const std::string &content, const std::string &kind)
+{
+    return "<entry>" + content +
+           "<category scheme=\"https://schemas.orvala.example/2005#kind\" "
+           "term=\"https://schemas.orvala.example/photos/2007#" +
+           kind + "\"/></entry>";
+}
+
+// Every address that takes a token, with everybody who may come: Ben owns an open and a private
+// album, Anna is another user.
+class Rights : public testing::Test, protected TestService
+{
+protected:
+    struct Row
+    {
+        std::string method, path, body;
+        int annas; // what Anna gets
+    };
+
+    void SetUp() override
+    {
+        start();
+        addUser("ben@orvala.example", "Ben", "ben");
+        addUser("cleo@orvala.example", "Cleo", "cleo");
+        for (const std::string folder : {"ben/Open", "ben/Secret"}) {
+            std::filesystem::create_directories(file(folder));
+            writePicture(file(folder + "/one.jpg"), 32, 48);
+        }
+        writeBytes(file("ben/Secret/.private"), "");
+        addPhoto("own.jpg");
+        scan();
+        mAnna = token("anna@orvala.example");
+        mBen = token("ben@orvala.example");
+        const json albums = publicFeed(user + "default?access_token=" + mBen);
+        for (const json &entry : albums["entry"])
+            mAlbums[valueOf(entry, "title")] = pathOf(valueOf(entry, "id"));
+        for (const auto &[title, path] : mAlbums) {
+            const json photos = publicFeed(path + "?access_token=" + mBen);
+            mPhotos[title] = pathOf(valueOf(photos["entry"][0], "id"));
+            const auto answer =
+                ask({"POST", mPhotos[title], entryOf("<content>x</content>", "comment"), 0}, mBen);
+            mComments[title] = valueOf(json::parse(answer->body)["entry"], "gphoto$id");
+            ask({"POST", mPhotos[title], entryOf("<title>t</title>", "tag"), 0}, mBen);
+        }
+    }
+
+    httplib::Result ask(const Row &row, const std::string &token)
+    {
+        httplib::Client client("127.0.0.1", service().port());
+        const char mark = row.path.find('?') == std::string::npos ? '?' : '&';
+        const std::string target =
+            row.path + (token.empty() ? "" : mark + ("access_token=" + percentEncoded(token)));
+        if (row.method == "POST")
+            return client.Post(target, row.body, "multipart/related; boundary=B");
+        return row.method == "DELETE" ? client.Delete(target) : client.Get(target);
+    }
+
+    static std::string entry(std::string path, const std::string &rest)
+    {
+        return path.replace(path.find("/feed/"), 6, "/entry/") + rest;
+    }
+    std::vector<Row> rowsFor(const std::string &album, bool isPrivate)
+    {
+        const int seen = isPrivate ? 403 : 200;
+        const std::string photo = mPhotos[album];
+        return {{"GET", mAlbums[album], "", seen},
+                {"GET", photo + "?kind=comment", "", seen},
+                {"GET", photo + "?kind=tag", "", seen},
+                {"POST", photo, entryOf("<content>y</content>", "comment"), isPrivate ? 403 : 201},
+                {"POST", photo, entryOf("<title>u</title>", "tag"), 403},
+                {"POST", mAlbums[album], "--B\n\nx\n--B--", 403},
+                {"DELETE", entry(photo, "/commentid/" + mComments[album]), "", 403},
+                {"DELETE", entry(photo, "/tag/t"), "", 403}};
+    }
+
+    std::string mAnna, mBen;
+    std::map<std::string, std::string> mAlbums, mPhotos, mComments; // by the album's title
+};
+
+} // namespace
+
+TEST_F(Rights, everyAddressLooksAtTheToken)
+{
+    std::vector<Row> rows = {{"GET", user + "default", "", 200},
+                             {"GET", user + "2", "", 200},
+                             {"GET", user + "ben@orvala.example", "", 200},
+                             {"GET", user + "2/contacts", "", 200}};
+    for (const bool isPrivate : {false, true}) {
+        for (const Row &row : rowsFor(isPrivate ? "Secret" : "Open", isPrivate))
+            rows.push_back(row);
+    }
+    const Tokens expired = issueTokens(database(), 1, 0);
+    const std::string cleo = token("cleo@orvala.example");
+    ASSERT_TRUE(removeUser(database(), "cleo@orvala.example"));
+    for (const Row &row : rows) {
+        for (const std::string &token :
+             {std::string(), mBen + "x", mBen.substr(1), expired.access, expired.refresh, cleo,
+              std::string("' OR 1=1--"), std::string(5000, 'x')}) {
+            const auto answer = ask(row, token);
+            ASSERT_TRUE(answer) << row.method << row.path;
+            EXPECT_EQ(answer->status, 401) << row.method << row.path << " with " << token;
+            EXPECT_EQ(json::parse(answer->body)["error"]["code"], 401);
+        }
+        EXPECT_EQ(ask(row, mAnna)->status, row.annas) << row.method << row.path << row.body;
+    }
+    const json tags = publicFeed(mPhotos["Secret"] + "?kind=tag&access_token=" + mBen);
+    EXPECT_EQ(titlesOf(tags), std::vector<std::string>{"t"});
+    EXPECT_EQ(get(user + "1", {{"Authorization", "Bearer " + mAnna}})->status, 200);
+}
+
+TEST_F(Rights, nothingIsReachedThroughSomethingElse)
+{
+    const auto idOf = [](const std::string &path) { return path.substr(path.rfind('/') + 1); };
+    const std::string secret = idOf(mPhotos["Secret"]), open = idOf(mPhotos["Open"]);
+    const Row rows[] = {
+        {"GET", mAlbums["Open"] + "/photoid/" + secret + "?kind=comment", "", 404},
+        {"GET", user + "default/albumid/" + idOf(mAlbums["Secret"]), "", 404},
+        {"GET", user + "1/albumid/" + idOf(mAlbums["Secret"]) + "/photoid/" + secret, "", 404},
+        {"DELETE", entry(mPhotos["Open"], "/commentid/" + mComments["Secret"]), "", 404},
+        {"POST", mAlbums["Open"] + "/photoid/" + secret, "", 404},
+        {"GET", user + "9", "", 404},
+        {"GET", user + "2/albumid/x", "", 404},
+        {"GET", user + "2/albumid/%00", "", 404},
+        {"GET", user + "%2e%2e/albumid/1", "", 404},
+        {"GET", mPhotos["Open"] + "9999?kind=tag", "", 404},
+        {"GET", mPhotos["Open"] + "?kind=user", "", 400}};
+    for (const Row &row : rows)
+        EXPECT_EQ(ask(row, mAnna)->status, row.annas) << row.method << row.path;
+    EXPECT_EQ(titlesOf(publicFeed("/data/feed/api/featured")).size(), 2u);
+    EXPECT_EQ(titlesOf(publicFeed(user + "2?access_token=" + mAnna)),
+              std::vector<std::string>{"Open"});
+}
