@@ -10,12 +10,19 @@ set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bin)
 
 find_program(ORVALA_CCACHE ccache)
 if(ORVALA_CCACHE)
-  set(CMAKE_CXX_COMPILER_LAUNCHER ${ORVALA_CCACHE})
+  # What ccache asks for before it takes part in a build with precompiled headers.
+  set(CMAKE_CXX_COMPILER_LAUNCHER ${CMAKE_COMMAND} -E env
+      CCACHE_SLOPPINESS=pch_defines,time_macros,include_file_mtime,include_file_ctime
+      ${ORVALA_CCACHE})
 endif()
 
 function(orvala_settings target)
   target_compile_options(${target} PRIVATE -Wall -Wextra -Wpedantic -Wshadow -Wnon-virtual-dtor
                                            -Woverloaded-virtual)
+  if(CMAKE_CXX_COMPILER_ID STREQUAL Clang)
+    # It warns about what the kernel's macros do.
+    target_compile_options(${target} PRIVATE -Wno-sign-compare)
+  endif()
   if(ORVALA_WERROR)
     target_compile_options(${target} PRIVATE -Werror)
   endif()
@@ -23,12 +30,25 @@ function(orvala_settings target)
     target_compile_options(${target} PRIVATE -fsanitize=address,undefined -fno-omit-frame-pointer)
     target_link_options(${target} PRIVATE -fsanitize=address,undefined)
   endif()
+  if(ORVALA_FUZZ)
+    target_compile_options(${target} PRIVATE -fsanitize=fuzzer-no-link)
+  endif()
+endfunction()
+
+function(orvala_qt_definitions target)
+  target_compile_definitions(${target} PRIVATE QT_NO_FOREACH QT_NO_JAVA_STYLE_ITERATORS
+                                               QT_DEPRECATED_WARNINGS)
 endfunction()
 
 function(orvala_qt_settings target)
   set_target_properties(${target} PROPERTIES AUTOMOC ON)
-  target_compile_definitions(${target} PRIVATE QT_NO_FOREACH QT_NO_JAVA_STYLE_ITERATORS
-                                               QT_DEPRECATED_WARNINGS)
+  orvala_qt_definitions(${target})
+  get_target_property(type ${target} TYPE)
+  if(type STREQUAL EXECUTABLE)
+    orvala_use_headers(${target} orvala_qt_program_headers)
+  else()
+    orvala_use_headers(${target} orvala_qt_headers)
+  endif()
 endfunction()
 
 # orvala_library(<name> SOURCES <files> LINKS <targets>): a static library of the client, one for

@@ -68,6 +68,12 @@ void addServe(CLI::App &program, ServeOptions &options, int &result)
             "Seconds between scans of the photo folders (300)")
         ->check(CLI::Range(1, 86'400));
     command
+        ->add_option_function<std::int64_t>(
+            "--thumbnails",
+            [&service](std::int64_t megabytes) { service.thumbnailBytes = megabytes << 20; },
+            "Megabytes of made pictures that are kept (8192)")
+        ->check(CLI::Range(1, 1 << 30));
+    command
         ->add_option_function<int>(
             "--token-days",
             [&service](int days) { service.accessLife = std::chrono::hours(days * 24); },

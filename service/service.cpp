@@ -18,6 +18,8 @@
 
 #include <sqlite3.h>
 
+#include <cerrno>
+#include <cstring>
 #include <filesystem>
 
 namespace {
@@ -29,12 +31,27 @@ bool makeDataFolder(const std::string &folder, std::string *error)
     std::error_code code;
     const bool isNew = std::filesystem::create_directories(folder, code);
     if (code || !std::filesystem::is_directory(folder, code)) {
-        *error = "cannot make the folder " + folder;
+        *error = "cannot make the folder " + folder + (code ? ": " + code.message() : "") +
+                 "; --data names one that this user may write to";
         return false;
     }
     if (isNew)
         std::filesystem::permissions(folder, std::filesystem::perms::owner_all, code);
     return true;
+}
+
+std::string whyNotListening(int error)
+{
+    switch (error) {
+    case EADDRINUSE:
+        return ": another program does; --port takes another one";
+    case EADDRNOTAVAIL:
+        return ": this machine has no such address; --listen 0.0.0.0 takes all it has";
+    case EACCES:
+        return ": ports below 1024 are for root; --port takes another one";
+    default:
+        return ": --listen takes an address of this machine, as 0.0.0.0 for all";
+    }
 }
 
 bool isStorageFull(const std::exception &exception)
@@ -86,7 +103,9 @@ bool Service::Parts::takeLock(const ServiceSettings &settings, std::string *erro
     lock = ::open(file.c_str(), O_RDWR | O_CREAT | O_CLOEXEC, 0600);
     if (lock >= 0 && ::flock(lock, LOCK_EX | LOCK_NB) == 0)
         return true;
-    *error = "another service is running with the data folder " + settings.data;
+    *error = errno == EWOULDBLOCK
+                 ? "another service is running with the data folder " + settings.data
+                 : "cannot write " + file + ": " + std::strerror(errno);
     return false;
 }
 
@@ -117,7 +136,7 @@ bool Service::Parts::startServer(const ServiceSettings &settings, std::string *e
     SignInPages::Settings pages;
     pages.withTls = settings.withTls;
     signIn = std::make_unique<SignInPages>(*database, codes, pages);
-    addHealthRoute(router, *database);
+    addHealthRoute(router, *database, settings.data);
     feeds->addRoutes(router);
     posting->addRoutes(router);
     pictures->addRoutes(router);
@@ -132,7 +151,8 @@ bool Service::Parts::startServer(const ServiceSettings &settings, std::string *e
     server = std::make_unique<HttpServer>(router, http);
     if (server->start())
         return true;
-    *error = "cannot listen on " + settings.listen + ", port " + std::to_string(settings.port);
+    *error = "cannot listen on " + settings.listen + ", port " + std::to_string(settings.port) +
+             whyNotListening(errno);
     return false;
 }
 

@@ -21,7 +21,7 @@ struct ServiceSettings
     bool withTls = true;
     std::string certificate; // empty: self-signed, made once
     std::string key;         // empty: in the certificate's file
-    int threads = 128;
+    int threads = 64;
     std::chrono::seconds scanPause{300};
     std::chrono::hours accessLife{90 * 24};        // of an access token
     GatheredKinds gathered = allGatheredKinds();   // which albums the service makes up

@@ -1,11 +1,12 @@
-# Sourced by run and test: installs what packages.txt lists and configures the build.
+# Sourced by run, test and the tools: installs what packages.txt lists and configures the build.
 # Expects the working directory to be the checkout.
 
 if [ "$(id -u)" = 0 ]; then as_root=; else as_root=sudo; fi
 
+# install_packages [LIST]: packages.txt without one.
 install_packages() {
     local wanted missing
-    wanted=$(sed -e 's/#.*//' -e '/^[[:space:]]*$/d' packages.txt)
+    wanted=$(sed -e 's/#.*//' -e '/^[[:space:]]*$/d' "${1:-packages.txt}")
     # shellcheck disable=SC2086
     missing=$(comm -23 <(printf '%s\n' $wanted | sort -u) \
         <(dpkg-query -W -f='${db:Status-Status} ${Package}\n' | sed -n 's/^installed //p' | sort -u))

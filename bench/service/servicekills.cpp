@@ -81,7 +81,7 @@ private:
     {
         fs::remove(path("ready"));
         service.start({"serve", "--http", "--data", path("data"), "--ready-file", path("ready"),
-                       "--log-level", "off"});
+                       "--log-level", "off", "--gathered", "none"});
     }
     void sleepUpTo(int milliseconds)
     {

@@ -7,11 +7,19 @@
 
 #include <spdlog/spdlog.h>
 
+#include <sys/resource.h>
+#include <unistd.h>
+
+#include <algorithm>
 #include <csignal>
 #include <cstdio>
 #include <fstream>
+#include <thread>
 
 namespace {
+
+constexpr std::chrono::milliseconds endPatience{700};
+constexpr rlim_t openFiles = 8192;
 
 // Blocked before any thread begins, so that all threads leave them to the one that waits.
 sigset_t blockSignals()
@@ -32,6 +40,26 @@ bool writeReadyFile(const std::string &file, int port)
     stream << port << "\n";
     stream.close();
     return stream.good() && std::rename(unfinished.c_str(), file.c_str()) == 0;
+}
+
+// Connections, photos and the index' files may be more than the usual 1024.
+void raiseFileLimit()
+{
+    rlimit limit{};
+    if (::getrlimit(RLIMIT_NOFILE, &limit) != 0 || limit.rlim_cur >= openFiles)
+        return;
+    limit.rlim_cur = std::min(openFiles, limit.rlim_max);
+    ::setrlimit(RLIMIT_NOFILE, &limit);
+}
+
+// What is under way at the end, as a large photo being decoded, is not waited for any longer: all
+// that was acknowledged is on the disk, as it has to be for a power cut.
+void endSoon()
+{
+    std::thread([] {
+        std::this_thread::sleep_for(endPatience);
+        ::_exit(0);
+    }).detach();
 }
 
 int fail(const std::string &error)
@@ -73,6 +101,8 @@ void waitForEnd(const sigset_t &signals, Service &service)
 int runServe(const ServeOptions &options)
 {
     const sigset_t signals = blockSignals();
+    raiseFileLimit();
+    std::signal(SIGXFSZ, SIG_IGN); // a limit on the size of files is answered like a full disk
     spdlog::set_pattern("%Y-%m-%d %H:%M:%S.%e %L %v");
     spdlog::set_level(spdlog::level::from_str(options.logLevel));
     std::string error;
@@ -86,5 +116,6 @@ int runServe(const ServeOptions &options)
         return fail("cannot write " + options.readyFile);
     waitForEnd(signals, *service);
     spdlog::info("stopping");
+    endSoon();
     return 0;
 }

@@ -4,10 +4,27 @@
 
 #include <nlohmann/json.hpp>
 
-void addHealthRoute(Router &router, Database &database)
+#include <filesystem>
+
+namespace {
+
+constexpr std::uintmax_t leastBytes = 16u << 20;
+
+bool hasRoom(const std::string &folder)
 {
-    router.add("GET", "health", [&database](const Router::Call &, httplib::Response &response) {
+    std::error_code error;
+    const auto space = std::filesystem::space(folder, error);
+    return error || space.available >= leastBytes;
+}
+
+} // namespace
+
+void addHealthRoute(Router &router, Database &database, const std::string &dataFolder)
+{
+    const auto answer = [&database, dataFolder](const Router::Call &, httplib::Response &response) {
         response.set_header("Cache-Control", "no-store");
+        if (!hasRoom(dataFolder))
+            return answerError(response, 503, "the disk of the data folder is nearly full");
         try {
             auto reader = database.read();
             Query query(reader, "SELECT coalesce(sum(photoCount), 0) FROM albums");
@@ -17,5 +34,6 @@ void addHealthRoute(Router &router, Database &database)
         } catch (const SQLite::Exception &) {
             answerError(response, 503, "the index cannot be read");
         }
-    });
+    };
+    router.add("GET", "health", answer);
 }

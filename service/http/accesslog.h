@@ -3,7 +3,7 @@
 #include <httplib.h>
 
 // One line for each request: who, what, the answer's status and size, and how long it took. Tokens
-// and codes in the query are cut out.
+// and codes in the query and the keys of photos are cut out.
 void noteRequestStart();
 void logRequest(const httplib::Request &request, const httplib::Response &response);
 

@@ -7,7 +7,9 @@
 #include <fcntl.h>
 #include <unistd.h>
 
+#include <cerrno>
 #include <cstdio>
+#include <cstring>
 
 namespace {
 
@@ -125,6 +127,6 @@ bool ensureSelfSignedCertificate(const std::string &file, std::string *error)
     if (certificate && writePem(unfinished, key.get(), certificate.get()) &&
         std::rename(unfinished.c_str(), file.c_str()) == 0)
         return true;
-    *error = "cannot make the certificate " + file;
+    *error = "cannot make the certificate " + file + ": " + std::strerror(errno);
     return false;
 }

@@ -4,7 +4,11 @@
 #include "index/schema.h"
 
 #include <fcntl.h>
+#include <sqlite3.h>
 #include <unistd.h>
+
+#include <cerrno>
+#include <cstring>
 
 namespace {
 
@@ -19,6 +23,23 @@ bool makePrivate(const std::string &file)
         return false;
     ::close(descriptor);
     return true;
+}
+
+const char *adviceFor(const SQLite::Exception &exception)
+{
+    switch (exception.getErrorCode()) {
+    case SQLITE_FULL:
+    case SQLITE_IOERR: // as when the files beside the index find no room
+        return "; there has to be room on its disk";
+    case SQLITE_READONLY:
+    case SQLITE_CANTOPEN:
+        return "; this user has to be allowed to write it and its folder";
+    case SQLITE_NOTADB:
+    case SQLITE_CORRUPT:
+        return "; put back a copy, or move it away to begin with an empty index";
+    default:
+        return "";
+    }
 }
 
 } // namespace
@@ -54,7 +75,7 @@ Database::Database(const std::string &file)
 std::unique_ptr<Database> Database::open(const std::string &file, std::string *error)
 {
     if (!makePrivate(file)) {
-        *error = "cannot open " + file + " for writing";
+        *error = "cannot write " + file + ": " + std::strerror(errno);
         return nullptr;
     }
     try {
@@ -65,7 +86,7 @@ std::unique_ptr<Database> Database::open(const std::string &file, std::string *e
         writer.commit();
         return database;
     } catch (const SQLite::Exception &exception) {
-        *error = file + ": " + exception.what();
+        *error = file + ": " + exception.what() + adviceFor(exception);
         return nullptr;
     }
 }

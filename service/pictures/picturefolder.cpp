@@ -15,6 +15,10 @@ namespace {
 
 constexpr const char *temporariesName = ".incoming";
 
+// What others write to the same disk, as comments, counts more than pictures that can be made
+// again.
+constexpr std::uintmax_t sparedBytes = 64u << 20;
+
 struct KeptFile
 {
     fs::path path;
@@ -124,6 +128,8 @@ void PictureFolder::keep(const std::string &key, std::string_view bytes)
     const fs::path path = pathOf(key);
     const fs::path temporary = temporaryPath();
     std::error_code error;
+    if (fs::space(mFolder, error).available < sparedBytes && !error)
+        return;
     fs::create_directories(path.parent_path(), error);
     if (!writeFile(temporary, bytes)) {
         fs::remove(temporary, error);

@@ -21,7 +21,8 @@ public:
     // The picture kept under `key`, empty if there is none.
     std::string find(const std::string &key) const;
 
-    // Keeps the picture, whole or not at all; a failure loses nothing but the keeping.
+    // Keeps the picture, whole or not at all; a failure loses nothing but the keeping. A disk that
+    // is nearly full is left to others.
     void keep(const std::string &key, std::string_view bytes);
 
 private:

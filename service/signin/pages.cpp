@@ -10,7 +10,7 @@ const char frame[] = R"html(<!DOCTYPE html>
 <html lang="en"><head><meta charset="utf-8"><title>{title}</title>
 <style>
 html { font-size: 28px; font-size: 3.9vh; }
-body { margin: 0; padding: 10vh 8% 0; background: #14181f; color: #f4f1ea;
+body { margin: 0; padding: 15vh 8% 0; background: #14181f; color: #f4f1ea;
   font-family: Inter, "DejaVu Sans", sans-serif; font-size: 1rem; line-height: 1.35;
   overflow: hidden; text-align: center; }
 h1 { margin: 0 0 .7em; font-size: 1.5em; font-weight: bold; }
@@ -24,12 +24,14 @@ input { width: 100%; height: 2.2em; box-sizing: border-box; padding: 0 .6em; fon
 button { min-width: 9em; height: 2.3em; margin: .4em .5em 0; padding: 0 1.2em; font: inherit;
   font-weight: bold; color: #f4f1ea; background: #2f3a4d; border: 3px solid #8a8f99;
   border-radius: 6px; }
-input:focus, button:focus { border-color: #ffc94a; }
+input:focus, button:focus { border-color: #ffc94a; box-shadow: 0 0 0 .22em #ffc94a; }
+input:focus { background: #f8f4ea; }
 button:focus { color: #14181f; background: #ffc94a; }
 button:disabled { color: #8a8f99; }
 .message { display: inline-block; padding: .3em 1em; color: #14181f; background: #ffc94a;
   border-radius: 6px; font-weight: bold; }
-.name { margin: 1.5em 0 .2em; font-size: 1.3em; color: #ffc94a; font-weight: bold; }
+.name { margin: 1.5em 0 .2em; max-height: 2.7em; overflow: hidden; word-wrap: break-word;
+  font-size: 1.3em; color: #ffc94a; font-weight: bold; }
 svg { display: block; width: 9.4em; height: 2.9em; }
 </style></head>
 <body>{{body}}</body></html>

@@ -160,10 +160,21 @@ void AccountManager::authorizeResult(bool allow)
         oauthWizard->showMessage(AccountTexts::text(AccountTexts::NotStored));
         break;
     case NotSignedIn:
-        // Its PIN is another one, about which nothing is said: it signs in from the list.
-        oauthWizard->showMessage(QString());
+        askForOtherCode(account);
         break;
     }
+}
+
+// The account's PIN is not the one that New signs in with.
+void AccountManager::askForOtherCode(const QString &account)
+{
+    if (!protectioncode::isOffered()) {
+        oauthWizard->showMessage(QString()); // nothing is said: it signs in from the list
+        return;
+    }
+    showAccounts();
+    dropWizard();
+    showForm(account);
 }
 
 AccountManager::Outcome AccountManager::storeAccount(const QString &account, const QString &pin,

@@ -62,6 +62,7 @@ private:
     void showWaitWidget();
     bool prepareWizard();
     Outcome storeAccount(const QString &account, const QString &pin, const QString &token);
+    void askForOtherCode(const QString &account);
     ErrorDialog *showError(const QString &text);
     void dropWizard();
     void showAccounts();

@@ -39,6 +39,7 @@ QLabel *makeLabel(QWidget *parent, const char *name, const QString &text)
     label->setObjectName(QLatin1String(name));
     label->setTextFormat(Qt::PlainText);
     label->setWordWrap(true);
+    label->setIndent(0);
     label->setText(text);
     return label;
 }
@@ -95,6 +96,7 @@ void LoginPage::buildLayout()
     row->addWidget(mHint, 1, Qt::AlignTop);
     row->addLayout(buttons);
 
+    mHint->setIndent(0); // in line with the title
     mMessage->setFixedHeight(48);
     mMessage->setAlignment(Qt::AlignLeft | Qt::AlignVCenter);
     auto *column = new QVBoxLayout(this);
@@ -118,14 +120,14 @@ void LoginPage::reload()
 {
     auto *button = qobject_cast<QAbstractButton *>(focusWidget()); // where the user comes back to
     QVector<AccountsWidget::Account> accounts;
-    const bool readable = readAccounts(&accounts);
-    if (readable)
+    mIsReadable = readAccounts(&accounts);
+    if (mIsReadable)
         mAccounts->setAccounts(accounts);
     const bool empty = mAccounts->count() == 0;
     mAccounts->setVisible(!empty);
     mHint->setVisible(empty);
-    mHint->setText(
-        AccountTexts::text(readable ? AccountTexts::NoAccounts : AccountTexts::AccountsUnreadable));
+    mHint->setText(AccountTexts::text(mIsReadable ? AccountTexts::NoAccounts
+                                                  : AccountTexts::AccountsUnreadable));
     if (button && mButtons.contains(button))
         button->setFocus();
     else
@@ -167,6 +169,8 @@ void LoginPage::keyPressEvent(QKeyEvent *event)
 {
     logLine("enter LoginPage::keyPressEvent");
     showMessage(QString());
+    if (!mIsReadable && mAccounts->count() == 0)
+        reload();
     switch (event->key()) {
     case DEVICE_UP_KEY:
         handleUpOrDown(-1);

@@ -21,7 +21,8 @@ class LoginPage : public QWidget
 public:
     explicit LoginPage(QWidget *parent = nullptr);
 
-    // Reads the accounts again. A list that cannot be read leaves the rows as they are.
+    // Reads the accounts again. A list that cannot be read leaves the rows as they are; without
+    // any, each key tries anew.
     void reload();
     bool hasAccount(const QString &mail) const;
     // Shows a text below the list until the next key.
@@ -68,5 +69,6 @@ private:
     QList<QAbstractButton *> mButtons; // from above
     QLabel *mHint;                     // in place of the list when it is empty
     QLabel *mMessage;
+    bool mIsReadable = true; // the accounts, the last time
     QPointer<QConfirm> mConfirm;
 };

@@ -8,6 +8,7 @@
 
 #include <QFont>
 #include <QKeyEvent>
+#include <QPalette>
 #include <QScopedValueRollback>
 
 QPointer<QWidget> MainApplication::mDialogObj;
@@ -29,6 +30,11 @@ MainApplication::MainApplication(int &argc, char **argv)
     QFont appFont = font();
     appFont.setPointSize(SystemConfig::appNormalFont());
     setFont(appFont);
+    // A style sheet that leaves the ground of a field open takes it from here, whatever palette the
+    // field has: pure white is too much for a dark room.
+    QPalette colours = palette();
+    colours.setColor(QPalette::Base, QColor(0xe6, 0xec, 0xf0));
+    setPalette(colours);
     setApplicationVersion(SystemConfig::version());
 }
 

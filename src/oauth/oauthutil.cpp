@@ -133,6 +133,9 @@ void OAuthUtil::networkPost(const QString &url, const QByteArray &data)
     QNetworkRequest request(QUrl::fromEncoded(url.toLatin1()));
     request.setAttribute(QNetworkRequest::RedirectPolicyAttribute,
                          QNetworkRequest::ManualRedirectPolicy);
+    // The page's own requests allow HTTP/2: one that does not would open a second connection.
+    if (mPage && request.url().scheme() == QLatin1String("https"))
+        request.setAttribute(QNetworkRequest::Http2AllowedAttribute, true);
     connect(mManager, &QNetworkAccessManager::finished, this, &OAuthUtil::handleFinishedData,
             Qt::UniqueConnection);
     QNetworkReply *reply = mManager->post(request, data);

@@ -1,9 +1,9 @@
 #include "ui/photoitem.h"
 
 #include "common/ui/picture.h"
+#include "common/ui/stretchedpicture.h"
 #include "data/packageproperty.h"
 #include "network/systemconfig.h"
-#include "common/ui/stretchedpicture.h"
 
 #include <QPaintEvent>
 #include <QPainter>
@@ -12,6 +12,7 @@ namespace {
 
 constexpr int kLongestCaption = 10000; // characters that are laid out at most
 constexpr int kBorder = 2;
+const QColor kFocusTint(0x1d, 0x78, 0xbd, 190);
 constexpr int kSpaceBelow = 6; // between the caption and the edge of the focus bar
 
 const char *const kUnfocusedStyle =
@@ -233,6 +234,9 @@ void PhotoItem::paintFace(QPainter &painter, bool focused) const
     } else if (mDisplayType == TYPE_ALBUM_PHOTOS) {
         painter.fillRect(ground, Qt::white);
         painter.drawPixmap(ground.topLeft(), loadPicture(latin(kPhotoGround), ground.size()));
+        // The print covers most of the focus bar.
+        if (focused)
+            painter.fillRect(ground, kFocusTint);
     }
     painter.drawPixmap(pictureRect().topLeft(), mPicture);
     painter.setFont(mCaptionFont);

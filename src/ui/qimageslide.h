@@ -95,7 +95,7 @@ private:
     bool mIsHolding = false; // a turn is over, and the next photo is waited for
     bool mIsListLost = false;
     int mBlockWanted = 0; // its first record; 0: the block that is there
-    int mSpeed;              // seconds
+    int mSpeed;           // seconds
     int mMode;
     PlayArray mPlayArray;
     QTimer mPlayTimer;

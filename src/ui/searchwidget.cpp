@@ -9,6 +9,7 @@
 #include <QKeyEvent>
 #include <QLabel>
 #include <QLineEdit>
+#include <QPainter>
 
 namespace {
 
@@ -26,6 +27,9 @@ const char *const BAR_FOCUSED = "QLabel{border-width: 2px}";
 const char *const BAR_UNFOCUSED = "QFrame{border-width: 0px;}QLabel{border-width: 1px}";
 
 constexpr int kHeight = 60; // of field and button, pixels
+constexpr int kRing = 3;    // around the marked part, with a gap of as much
+constexpr int kRingRadius = 14;
+constexpr int kGap = 14; // between field and button
 
 // A sheet set anew costs a layout, so only one that differs is set.
 void setSheet(QWidget *widget, const char *sheet)
@@ -61,6 +65,7 @@ SearchWidget::SearchWidget(QWidget *parent)
 
     auto *row = new QHBoxLayout(this);
     row->setContentsMargins(0, 20, 0, 20);
+    row->setSpacing(kGap);
     row->addItem(makeSpacer());
     row->addWidget(mField);
     row->addWidget(mButton);
@@ -99,6 +104,21 @@ void SearchWidget::setFrame()
         setSheet(mField, FIELD_MARKED);
         showButton(!mField->text().isEmpty());
     }
+    update();
+}
+
+// A green line of two pixels is too little to be found across a room.
+void SearchWidget::paintEvent(QPaintEvent *)
+{
+    if (!hasFocus())
+        return;
+    QPainter painter(this);
+    painter.setRenderHint(QPainter::Antialiasing);
+    painter.setPen(QPen(QColor(0xf2, 0xf6, 0xf9), kRing));
+    const QWidget *marked = mCurrentFocus == Button ? static_cast<QWidget *>(mButton) : mField;
+    const qreal gap = 1.5 * kRing;
+    painter.drawRoundedRect(QRectF(marked->geometry()).adjusted(-gap, -gap, gap, gap), kRingRadius,
+                            kRingRadius);
 }
 
 void SearchWidget::keyPressEvent(QKeyEvent *event)

@@ -45,14 +45,13 @@ const QColor kGreen(0, 128, 0); // a style sheet's "green"
 const QColor kBlue(100, 149, 237);
 const QColor kLight(0xf4, 0xf8, 0xfa);
 constexpr qreal kTitleRadius = 10;
-constexpr qreal kSignOutRadius = 3;
 constexpr qreal kFocusFrame = 3;
 
 void paintBox(QPainter &painter, const QRect &area, const QPen &pen, const QBrush &brush,
               qreal radius)
 {
     const qreal inset = pen.widthF() / 2;
-    painter.setRenderHint(QPainter::Antialiasing);
+    painter.setRenderHint(QPainter::Antialiasing, radius > 0);
     painter.setPen(pen);
     painter.setBrush(brush);
     painter.drawRoundedRect(QRectF(area).adjusted(inset, inset, -inset, -inset), radius, radius);
@@ -106,13 +105,14 @@ void TitleIcon::paintGround(QPainter &painter) const
     const auto picture = [&](const char *name, int border) {
         painter.drawPixmap(0, 0, stretchedPicture(QLatin1String(name), size(), border, this));
     };
-    const QPen focus(kGreen, kFocusFrame);
+    const QPen focus(kGreen, kFocusFrame, Qt::SolidLine, Qt::FlatCap, Qt::MiterJoin);
     if (isSignOut && mLook == Look::Normal)
         picture(":/res/SignOut_Bg.png", 2);
     else if (isSignOut && mLook == Look::Selected)
-        paintBox(painter, rect(), QPen(kBlue, 2), Qt::NoBrush, kSignOutRadius);
+        paintBox(painter, rect(), QPen(kBlue, 2, Qt::SolidLine, Qt::FlatCap, Qt::MiterJoin),
+                 Qt::NoBrush, 0);
     else if (isSignOut)
-        paintBox(painter, rect(), focus, kLight, kSignOutRadius);
+        paintBox(painter, rect(), focus, kLight, 0);
     else if (mLook == Look::Focused)
         paintBox(painter, rect(), focus, kLight, kTitleRadius);
     else if (mLook == Look::Selected)

@@ -14,6 +14,7 @@
 namespace {
 
 constexpr int kLongestName = 10000; // characters that are laid out at most
+constexpr int kNameGap = 12;        // between the last entry and the name
 constexpr QSize kLogo(192, 52);     // leaves room for the widest name between usual borders
 
 void addSpacer(QHBoxLayout *row)
@@ -76,6 +77,7 @@ QWidget *UpWidget::makeUserColumn()
     font.setBold(true);
     font.setPointSize(int(SystemConfig::titleFont() * 0.9));
     mUserName->setFont(font);
+    mUserName->setContentsMargins(kNameGap, 0, 0, 0);
     mUserName->setAlignment(Qt::AlignRight);
     mUserName->setStyleSheet(QStringLiteral("color:#A2BBC9"));
     lines->addWidget(mUserName);

@@ -291,6 +291,9 @@ private slots:
         show(0);
         QCOMPARE(label("hint"), AccountTexts::text(AccountTexts::AccountsUnreadable));
         QCOMPARE(focus(), QString("New"));
+        QVERIFY(QFile::remove(mFile->path()));
+        press({DEVICE_UP_KEY});
+        QCOMPARE(label("hint"), AccountTexts::text(AccountTexts::NoAccounts));
     }
 
     void rowTexts()

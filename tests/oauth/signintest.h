@@ -117,11 +117,9 @@ protected:
         mScreen->press(DEVICE_DOWN_KEY);
         mScreen->press(DEVICE_SELECT_KEY);
     }
-    void answer(bool allow)
+    void allow()
     {
         QTRY_VERIFY(LogCapture::contains("documentStringList.at(0)=Anna & Ole"));
-        if (!allow)
-            mScreen->press(DEVICE_RIGHT_KEY);
         mScreen->press(DEVICE_SELECT_KEY);
     }
     QByteArray bodyOf(const QByteArray &path) const

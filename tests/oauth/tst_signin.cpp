@@ -1,5 +1,4 @@
-#include "accountmanager/accounttexts.h"
-#include "oauth/signinplugin.h"
+#include "accountmanager/managerwidget.h"
 #include "oauth/signintest.h"
 
 class TestSignIn : public SignInTest
@@ -13,7 +12,7 @@ private slots:
         start(&service);
         QSignalSpy finished(&mScreen->accounts, &AccountManager::loginFinished);
         signIn();
-        answer(true);
+        allow();
         QTRY_COMPARE(finished.size(), 1);
         QCOMPARE(bodyOf("/ServiceLogin"),
                  QByteArray("mail=anna%40home.example&pw=s3%27%5C%22%3C%2Fscript%3E"));
@@ -23,35 +22,37 @@ private slots:
         QCOMPARE(Helper::getExpires(), 3600);
     }
 
-    void allowedAgain()
+    // An account with a code of its own gets the new tokens and is asked for the code, or, where
+    // codes are not offered, stays signed out without a word.
+    void anotherCode_data()
     {
+        QTest::addColumn<bool>("offered");
+        QTest::newRow("offered") << true;
+        QTest::newRow("not offered") << false;
+    }
+
+    void anotherCode()
+    {
+        QFETCH(bool, offered);
         {
             const Helper::Session session;
-            Helper::addAccount(kMail, "7305", "old");
-            Helper::addAccount("ole", "7305", "old");
-            Helper::login("ole", "7305");
+            Helper::addAccount(kMail, "1234", "old");
         }
+        QSettings(mFile->folder() + "/config.ini", QSettings::IniFormat)
+            .setValue("Accounts/ProtectionCodes", offered);
         SignInCase service;
         start(&service);
         QSignalSpy finished(&mScreen->accounts, &AccountManager::loginFinished);
         signIn();
-        answer(true);
-        QTRY_COMPARE(finished.size(), 1);
-        QCOMPARE(rows(), QStringList({kMail + " 7305 before at rt true",
-                                      "ole 7305 before old before false"}));
-    }
-
-    void denied()
-    {
-        SignInCase service;
-        start(&service);
-        signIn();
-        answer(false);
-        QTRY_VERIFY(mScreen->findChild<ErrorDialog *>());
-        QCOMPARE(mScreen->currentWidget(), &mScreen->accounts);
-        QCOMPARE(Helper::getAccessToken(), QString("before"));
-        mScreen->press(DEVICE_SELECT_KEY);
-        QVERIFY(LogCapture::contains("Return key has been Pressed")); // the program is asked to end
+        allow();
+        QTRY_COMPARE(rows(), QStringList(kMail + " 1234 before at rt false"));
+        QCOMPARE(finished.size(), 0);
+        const auto *form = mScreen->accounts.findChild<ManagerWidget *>();
+        QCOMPARE(form && form->isVisible() && form->isOldUser(), offered);
+        if (!offered)
+            QVERIFY(message().isEmpty());
+        mScreen->press(DEVICE_RETURN_KEY);
+        QTRY_VERIFY(mScreen->isAtAccounts());
     }
 
     // Return leads back from every step, to a list on which New works again.
@@ -122,17 +123,6 @@ private slots:
         QVERIFY(mScreen->isPageShown());
         mScreen->press(DEVICE_RETURN_KEY); // leaves the page
         QTRY_VERIFY(mScreen->isAtAccounts());
-    }
-
-    void noPlugin()
-    {
-        SignInPlugin::setFile(mFile->path());
-        SignInCase service;
-        start(&service);
-        SignInPlugin::setFile(QString());
-        QVERIFY(mScreen->isAtAccounts());
-        QCOMPARE(mScreen->accounts.findChild<QLabel *>("message")->text(),
-                 AccountTexts::text(AccountTexts::SignInUnavailable));
     }
 };
 

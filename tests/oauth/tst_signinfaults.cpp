@@ -120,7 +120,7 @@ private slots:
         if (step > BadStep::SignInPage)
             signIn();
         if (step > BadStep::SignInPosted)
-            this->answer(true);
+            allow();
         waitForTimeOut();
         QCOMPARE(rows(), QStringList(kMail + " 7305 before old before false"));
     }
@@ -165,7 +165,7 @@ private slots:
         start(&service);
         QSignalSpy finished(&mScreen->accounts, &AccountManager::loginFinished);
         signIn();
-        answer(true);
+        allow();
         QTRY_COMPARE(finished.size(), 1);
         QCOMPARE(rows(),
                  QStringList(kMail + " 7305 Anna & Ole " + access + " r" + access + " true"));
@@ -213,7 +213,7 @@ private slots:
         QTRY_VERIFY(LogCapture::contains("documentStringList.at(0)=Anna & Ole"));
         {
             const std::shared_ptr<void> held = fault(*mFile);
-            answer(true);
+            allow();
             QTRY_COMPARE_WITH_TIMEOUT(message(), AccountTexts::text(AccountTexts::NotStored),
                                       15000);
         }

@@ -261,5 +261,8 @@ TEST(AccessLog, cutsSecretsOut)
               "/user/1?kind=tag&access_token=***&alt=json");
     EXPECT_EQ(withoutSecrets("/a?acc%65ss_token=abc"), "/a?acc%65ss_token=***");
     EXPECT_EQ(withoutSecrets("/a?code=x&&q=1?"), "/a?code=***&&q=1?");
+    EXPECT_EQ(withoutSecrets("/photos/kEy-1/s336/Sea.jpg?password=x"),
+              "/photos/***/s336/Sea.jpg?password=***");
+    EXPECT_EQ(withoutSecrets("/photos/kEy-1"), "/photos/***");
     EXPECT_EQ(withoutSecrets("/plain"), "/plain");
 }

@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 
 #include <spawn.h>
+#include <sys/resource.h>
 #include <sys/wait.h>
 
 #include <array>
@@ -35,6 +36,12 @@ public:
     {
         if (mId > 0)
             end(SIGKILL);
+    }
+    // How large its files may grow from now on.
+    void limitFiles(rlim_t bytes)
+    {
+        const rlimit limit{bytes, RLIM_INFINITY};
+        ::prlimit(mId, RLIMIT_FSIZE, &limit, nullptr);
     }
     // The wait status.
     int end(int signal)
@@ -77,9 +84,10 @@ protected:
     {
         const std::string ready = mFolder.file("ready");
         fs::remove(ready);
-        auto process = std::make_unique<Process>(
-            Words{"orvala-service", "serve", "--http", "--data", data(), "--photos",
-                  mFolder.file("photos"), "--ready-file", ready, "--log-level", "off"});
+        auto process =
+            std::make_unique<Process>(Words{"orvala-service", "serve", "--http", "--data", data(),
+                                            "--photos", mFolder.file("photos"), "--ready-file",
+                                            ready, "--log-level", "off", "--gathered", "none"});
         waitFor([&] { return fs::exists(ready); });
         mPort = fs::exists(ready) ? std::stoi(readWholeFile(ready)) : 0;
         return process;
@@ -120,6 +128,78 @@ TEST_F(Program, answersWhileItScansAndStopsWhenAsked)
     const auto start = std::chrono::steady_clock::now();
     EXPECT_EQ(process->end(SIGTERM), 0);
     EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::seconds(1));
+}
+
+TEST_F(Program, doesNotWaitForLargePhotosAtTheEnd)
+{
+    writePicture(mFolder.file("photos/a/large.png"), 6000, 4000);
+    const auto process = serve();
+    ASSERT_TRUE(waitFor([&] { return total() == "1"; }));
+    httplib::Client client("127.0.0.1", mPort);
+    const json feed = json::parse(client.Get("/data/feed/api/featured")->body)["feed"];
+    const std::string address = pathOf(feed["entry"][0]["content"]["src"]);
+    std::vector<std::thread> threads;
+    std::atomic<int> asked{0};
+    for (int width = 300; width < 320; ++width) {
+        threads.emplace_back([&, width] {
+            httplib::Client other("127.0.0.1", mPort);
+            std::string sized = address;
+            sized.insert(sized.rfind('/'), "/s" + std::to_string(width));
+            ++asked;
+            other.Get(sized);
+        });
+    }
+    waitFor([&] { return asked == 20; });
+    const auto start = std::chrono::steady_clock::now();
+    EXPECT_EQ(process->end(SIGTERM), 0);
+    EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::seconds(1));
+    for (std::thread &thread : threads)
+        thread.join();
+}
+
+TEST_F(Program, aFullDiskIsSaidAndHarmsNothing)
+{
+    writePicture(mFolder.file("photos/a/one.jpg"), 16, 16);
+    const auto process = serve();
+    ASSERT_TRUE(waitFor([&] { return total() == "1"; }));
+    const json tokens = json::parse(run("user token family@orvala.example --data " + data()).text);
+    const std::string token = "?access_token=" + tokens["access_token"].get<std::string>();
+    httplib::Client client("127.0.0.1", mPort);
+    const auto feed = [&](const std::string &path) {
+        return json::parse(client.Get(path)->body)["feed"]["entry"];
+    };
+    const std::string album = pathOf(valueOf(feed("/data/feed/api/user/default" + token)[0], "id"));
+    const std::string photo = pathOf(valueOf(feed(album + token)[0], "id"));
+    const std::string kind = "<category scheme=\"https://schemas.orvala.example/2005#kind\" "
+                             "term=\"https://schemas.orvala.example/photos/2007#";
+    const auto comment = [&] {
+        return client
+            .Post(photo + token,
+                  "<entry><content>" + std::string(9000, 'x') + "</content>" + kind +
+                      "comment\"/></entry>",
+                  "application/atom+xml")
+            ->status;
+    };
+    const std::string picture = readWholeFile(mFolder.file("photos/a/one.jpg"));
+    const auto upload = [&] {
+        const std::string body = "--B\nContent-Type: application/atom+xml\n\n<entry>" + kind +
+                                 "photo\"/></entry>\n--B\nContent-Type: image/jpeg\n\n" + picture +
+                                 std::string(500'000, 'x') + "\n--B--";
+        return client.Post(album + token, body, "multipart/related; boundary=B")->status;
+    };
+    process->limitFiles(400'000);
+    std::size_t stored = 0;
+    int status = 201;
+    for (; stored < 1000 && (status = comment()) == 201; ++stored)
+        continue;
+    EXPECT_EQ(status, 507);
+    EXPECT_EQ(upload(), 507);
+    EXPECT_EQ(feed(photo + token + "&kind=comment").size(), stored);
+    EXPECT_EQ(contentsOf(mFolder.file("photos/a")).files, 1);
+    process->limitFiles(RLIM_INFINITY);
+    EXPECT_EQ(comment(), 201);
+    EXPECT_EQ(upload(), 201);
+    EXPECT_EQ(process->end(SIGTERM), 0);
 }
 
 TEST_F(Program, survivesBeingKilledAtAnyMoment)
@@ -202,6 +282,15 @@ TEST_F(Program, mistakesAreExplained)
         const Output output = run(std::string(arguments) + " --data " + data());
         EXPECT_EQ(output.status, 1) << arguments;
         EXPECT_EQ(output.text.rfind("orvala-service: ", 0), 0u) << output.text;
+    }
+    writeBytes(mFolder.file("file"), "no folder, no index");
+    fs::create_directories(mFolder.file("broken/index.db"));
+    for (const std::string &arguments :
+         {"--data " + mFolder.file("file/data"), "--data " + mFolder.file("broken"),
+          "--listen 192.0.2.1 --data " + data()}) {
+        const Output output = run("serve --http " + arguments);
+        EXPECT_EQ(output.status, 1) << arguments;
+        EXPECT_NE(output.text.find(": "), std::string::npos) << output.text;
     }
     EXPECT_NE(run("serve --port 70000").status, 0);
     writeBytes(mFolder.file("settings"), "[serve]\nport = 70000\n");

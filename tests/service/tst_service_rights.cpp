@@ -96,7 +96,9 @@ TEST_F(Rights, everyAddressLooksAtTheToken)
     std::vector<Row> rows = {{"GET", user + "default", "", 200},
                              {"GET", user + "2", "", 200},
                              {"GET", user + "ben@orvala.example", "", 200},
-                             {"GET", user + "2/contacts", "", 200}};
+                             {"GET", user + "2/contacts", "", 200},
+                             {"GET", user + "2/albumid/recent", "", 404}, // gathered for Ben alone
+                             {"POST", user + "1/albumid/recent", "--B--", 404}};
     for (const bool isPrivate : {false, true}) {
         for (const Row &row : rowsFor(isPrivate ? "Secret" : "Open", isPrivate))
             rows.push_back(row);

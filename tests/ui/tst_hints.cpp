@@ -3,6 +3,8 @@
 #include "common/ui/remotekeys.h"
 #include "common/ui/shortcutbar.h"
 #include "data/testconfig.h"
+#include "res/resources.h"
+#include "ui/titleicon.h"
 #include "ui/upwidget.h"
 
 #include <QtTest>
@@ -17,6 +19,7 @@ private slots:
     void theIndicatorTurns();
     void hintsFollowTheState();
     void theMenusMark();
+    void theMenusMarkIsNotColourAlone();
     void longNamesAreCut();
 
 private:
@@ -93,6 +96,26 @@ void TestHints::theMenusMark()
     menu.cancelSignOut();
     QCOMPARE(menu.selectedIndex(), 1);
     QCOMPARE(menu.focusIndex(), 1);
+}
+
+void TestHints::theMenusMarkIsNotColourAlone()
+{
+    initResources();
+    for (bool signOut : {false, true}) {
+        TitleIcon entry("Home", signOut);
+        const auto grey = [&entry](TitleIcon::Look look) {
+            entry.setLook(look);
+            return entry.grab().toImage().convertToFormat(QImage::Format_Grayscale8);
+        };
+        const QImage plain = grey(TitleIcon::Look::Normal);
+        const QImage marked = grey(TitleIcon::Look::Focused);
+        int changed = 0;
+        for (int i = 0; i < plain.width() * plain.height(); ++i) {
+            const QPoint place(i % plain.width(), i / plain.width());
+            changed += qAbs(qGray(plain.pixel(place)) - qGray(marked.pixel(place))) > 60;
+        }
+        QVERIFY(changed > plain.width() * plain.height() / 20);
+    }
 }
 
 void TestHints::longNamesAreCut()

@@ -5,12 +5,14 @@
 #include "common/ui/qkeyboard.h"
 #include "common/ui/remotekeys.h"
 #include "common/ui/shortcutbar.h"
+#include "common/ui/stretchedpicture.h"
 #include "network/systemconfig.h"
 
 #include <QClipboard>
 #include <QGuiApplication>
 #include <QInputMethodEvent>
 #include <QKeyEvent>
+#include <QPainter>
 #include <QPlainTextEdit>
 #include <QVBoxLayout>
 
@@ -54,8 +56,8 @@ QKeyBoardInput::QKeyBoardInput(QWidget *parent)
 void QKeyBoardInput::buildBox()
 {
     mBox->setStyleSheet(
-        QStringLiteral("QPlainTextEdit{border-image:url(:/res/InputBox_Focus.png);border-width:6px;"
-                       "padding:4px 10px;background-color:transparent;color:#f2f6f9;}"));
+        QStringLiteral("QPlainTextEdit{border:0px;padding:10px 16px;background-color:transparent;"
+                       "color:#f2f6f9;}"));
     QFont font = mBox->font();
     font.setPixelSize(kTextHeight);
     mBox->setFont(font);
@@ -83,6 +85,14 @@ void QKeyBoardInput::build()
     rows->addWidget(mBox);
     rows->addWidget(mKeyBoard, 0, Qt::AlignHCenter);
     rows->addWidget(hints, 0, Qt::AlignHCenter);
+}
+
+// The box's own picture, behind it.
+void QKeyBoardInput::paintEvent(QPaintEvent *)
+{
+    QPainter painter(this);
+    painter.drawPixmap(mBox->pos(), stretchedPicture(QStringLiteral(":/res/InputBox_Focus.png"),
+                                                     mBox->size(), kPictureBorder, this));
 }
 
 void QKeyBoardInput::setText(const QString &text)
