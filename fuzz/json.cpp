@@ -30,9 +30,11 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size
     const QByteArray bytes(reinterpret_cast<const char *>(data), int(size));
     const JsonObject object = JsonParser::parse(bytes);
     walk(object);
-    // The same text in the other shape gives the same tree.
-    if (JsonParser::parse(QString::fromUtf8(bytes.constData(), bytes.size())).size() !=
-        object.size())
+    // The same text in the other shape gives the same tree; in that shape, a byte-order mark is
+    // gone.
+    if (!bytes.startsWith("\xEF\xBB\xBF") &&
+        JsonParser::parse(QString::fromUtf8(bytes.constData(), bytes.size())).size() !=
+            object.size())
         broken();
     return 0;
 }

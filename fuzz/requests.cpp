@@ -4,7 +4,7 @@
 #include "http/accesslog.h"
 #include "http/form.h"
 #include "http/router.h"
-#include "index/catalogue.h"
+#include "index/searchtext.h"
 
 #include <cstring>
 
@@ -50,7 +50,9 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size
         withoutSecrets(request.target).find(token) != std::string::npos)
         broken();
     Form(request.body).value("code");
-    searchExpression(request.get_param_value("q"));
+    searchWords(request.get_param_value("q"));
+    searchText(request.path);
+    searchDate(request.path);
     parseTime(request.path);
 
     Router router;

@@ -27,17 +27,6 @@ constexpr int PER_PAGE = 8;
 constexpr int PATIENCE_MS = 30000;
 const QString mail = QStringLiteral("anna@orvala.example");
 
-template <typename Condition>
-void handleEventsUntil(Condition condition)
-{
-    const QDeadlineTimer deadline(PATIENCE_MS);
-    while (!condition()) {
-        if (deadline.hasExpired())
-            qFatal("the page does not come");
-        QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
-    }
-}
-
 } // namespace
 
 HomeScreen::HomeScreen(int &argc, char **argv, int cacheMegabytes)
@@ -79,10 +68,25 @@ void HomeScreen::configure(const QString &origin)
     SystemConfig::setConfigFile(settings.fileName());
 }
 
-void HomeScreen::serve(int pages, const QByteArray &firstPhoto)
+void HomeScreen::handleEventsUntil(const std::function<bool()> &condition)
+{
+    const QDeadlineTimer deadline(PATIENCE_MS);
+    while (!condition()) {
+        if (deadline.hasExpired())
+            qFatal("the page does not come");
+        QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents);
+    }
+}
+
+QString HomeScreen::user()
+{
+    return mail;
+}
+
+void HomeScreen::serve(int pages, const QByteArray &firstPhoto, const QSize &size)
 {
     mPhotos = pages * PER_PAGE;
-    const QByteArray photo = photoJpeg(640, 480);
+    const QByteArray photo = photoJpeg(size.width(), size.height());
     bool isWritten = true;
     for (int i = 0; i < mPhotos; ++i)
         isWritten &=
@@ -114,12 +118,23 @@ bool HomeScreen::isLastPage() const
 
 void HomeScreen::turn(bool forward)
 {
-    QKeyEvent press(QEvent::KeyPress, forward ? DEVICE_PAGEDOWN_KEY : DEVICE_PAGEUP_KEY,
-                    Qt::NoModifier);
+    press(forward ? DEVICE_PAGEDOWN_KEY : DEVICE_PAGEUP_KEY);
+}
+
+void HomeScreen::openAlbums()
+{
+    for (int key : {DEVICE_UP_KEY, DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY})
+        press(key);
+    handleEventsUntil([this] { return !mHome->isLoading(); });
+}
+
+void HomeScreen::press(int key)
+{
+    QKeyEvent event(QEvent::KeyPress, key, Qt::NoModifier);
     QWidget *focused = QApplication::focusWidget();
     if (!focused)
         qFatal("nothing has the focus");
-    QApplication::sendEvent(focused, &press);
+    QApplication::sendEvent(focused, &event);
 }
 
 void HomeScreen::forgetPictures()

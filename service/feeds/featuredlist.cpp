@@ -7,11 +7,13 @@
 
 #include <spdlog/spdlog.h>
 
+#include <utility>
+
 namespace {
 
 constexpr std::chrono::milliseconds cheap{10};
 constexpr int restFactor = 50; // how many times the cost of reading passes before the next reading
-constexpr std::size_t shownPerWrite = 100;
+constexpr std::size_t shownPerWrite = 24; // three pages of a grid
 
 } // namespace
 
@@ -33,6 +35,7 @@ FeaturedList::Ids FeaturedList::photos(Session &session)
     if (day != mDay) {
         writeShown();
         mDay = day;
+        mIsDayBegun = false;
         mRevision = -1;
         mCost = {};
     }
@@ -71,6 +74,8 @@ void FeaturedList::writeShown()
     if (mShown.empty())
         return;
     try {
+        if (!std::exchange(mIsDayBegun, true))
+            beginFeaturedDay(mDatabase, mDay);
         markFeatured(mDatabase, mShown, mDay);
     } catch (const SQLite::Exception &exception) {
         spdlog::warn("what has been shown cannot be written down: {}", exception.what());

@@ -43,6 +43,7 @@ private:
     Clock::time_point mRead{};
     std::int64_t mRevision = -1;
     std::string mDay;
+    bool mIsDayBegun = false;
     Ids mIds;
     std::vector<std::int64_t> mShown; // not yet written
 };

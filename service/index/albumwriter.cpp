@@ -70,23 +70,21 @@ std::int64_t movePhoto(Session &session, std::int64_t albumId, const FoundFile &
 std::int64_t writePhoto(Session &session, const AlbumPlace &place, const FoundFile &file)
 {
     const PhotoMetadata &metadata = file.metadata;
-    Query(session,
-          "INSERT INTO photos (album, name, key, size, changed, present, error, mimeType, width, "
-          "height, title, caption, published, latitude, longitude, user, added, content) "
-          "VALUES (?1, ?2, ?3, ?4, ?5, 1, ?6, ?7, ?8, ?9, ?10, ?11, ?12, ?13, ?14, ?15, ?16, ?17) "
-          "ON CONFLICT (album, name) DO UPDATE SET size = ?4, changed = ?5, present = 1, "
-          "error = ?6, mimeType = ?7, width = ?8, height = ?9, "
-          "title = CASE givenTitle WHEN '' THEN ?10 ELSE givenTitle END, "
-          "caption = CASE givenCaption WHEN '' THEN ?11 ELSE givenCaption END, "
-          "published = ?12, latitude = ?13, longitude = ?14, content = ?17",
-          place.album, file.name, randomText(keyBytes), file.size, file.changed, file.error,
-          metadata.mimeType, metadata.width, metadata.height, titleOf(file), metadata.caption,
-          timeOf(file), metadata.latitude, metadata.longitude, place.user,
-          file.added > 0 ? file.added : currentSeconds(),
-          file.content.empty() ? sizeAndTime(file) : file.content)
-        .run();
-    Query query(session, "SELECT id FROM photos WHERE album = ? AND name = ?", place.album,
-                file.name);
+    Query query(
+        session,
+        "INSERT INTO photos (album, name, key, size, changed, present, error, mimeType, width, "
+        "height, title, caption, published, latitude, longitude, user, added, content) "
+        "VALUES (?1, ?2, ?3, ?4, ?5, 1, ?6, ?7, ?8, ?9, ?10, ?11, ?12, ?13, ?14, ?15, ?16, ?17) "
+        "ON CONFLICT (album, name) DO UPDATE SET size = ?4, changed = ?5, present = 1, "
+        "error = ?6, mimeType = ?7, width = ?8, height = ?9, "
+        "title = CASE givenTitle WHEN '' THEN ?10 ELSE givenTitle END, "
+        "caption = CASE givenCaption WHEN '' THEN ?11 ELSE givenCaption END, "
+        "published = ?12, latitude = ?13, longitude = ?14, content = ?17 RETURNING id",
+        place.album, file.name, randomText(keyBytes), file.size, file.changed, file.error,
+        metadata.mimeType, metadata.width, metadata.height, titleOf(file), metadata.caption,
+        timeOf(file), metadata.latitude, metadata.longitude, place.user,
+        file.added > 0 ? file.added : currentSeconds(),
+        file.content.empty() ? sizeAndTime(file) : file.content);
     return query.next() ? query.number(0) : 0;
 }
 
@@ -238,6 +236,27 @@ std::int64_t addPhoto(Database &database, FolderState state, const FoundFile &fi
     raiseRevision(writer, Revision::Photos);
     writer.commit();
     return photoId;
+}
+
+void writeLeftOut(Database &database, std::int64_t userId, const LeftOut &leftOut)
+{
+    LeftOut known;
+    {
+        auto reader = database.read();
+        Query query(reader, "SELECT path, reason FROM leftOut WHERE user = ?", userId);
+        while (query.next())
+            known[query.text(0)] = query.text(1);
+    }
+    if (known == leftOut)
+        return;
+    Database::Writer writer(database);
+    Query(writer, "DELETE FROM leftOut WHERE user = ?", userId).run();
+    for (const auto &[path, reason] : leftOut)
+        Query(writer,
+              "INSERT INTO leftOut (user, path, reason) SELECT id, ?2, ?3 FROM users WHERE id = ?1",
+              userId, path, reason)
+            .run();
+    writer.commit();
 }
 
 void markShown(Database &database, const std::set<std::int64_t> &photoIds)

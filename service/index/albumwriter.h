@@ -79,6 +79,10 @@ struct GivenTexts
 std::int64_t addPhoto(Database &database, FolderState state, const FoundFile &file,
                       const GivenTexts &texts);
 
+// All that was left out in the user's folders: paths below the user's folder, and why.
+using LeftOut = std::map<std::string, std::string>;
+void writeLeftOut(Database &database, std::int64_t userId, const LeftOut &leftOut);
+
 // These photos have been on a screen.
 void markShown(Database &database, const std::set<std::int64_t> &photoIds);
 

@@ -149,7 +149,9 @@ std::vector<UnreadablePhoto> unreadablePhotos(Session &session)
     std::vector<UnreadablePhoto> photos;
     Query query(session, "SELECT " PATH_OF_PHOTO ", p.error FROM photos p "
                          "JOIN albums a ON a.id = p.album JOIN users u ON u.id = a.user "
-                         "WHERE p.error <> '' AND p.present = 1 ORDER BY 1");
+                         "WHERE p.error <> '' AND p.present = 1 "
+                         "UNION ALL SELECT u.photos || '/' || l.path, l.reason FROM leftOut l "
+                         "JOIN users u ON u.id = l.user ORDER BY 1");
     while (query.next())
         photos.push_back({query.text(0), query.text(1)});
     return photos;

@@ -33,6 +33,7 @@ std::optional<PhotoRecord> portraitOf(Session &session, std::int64_t userId);
 
 std::optional<PhotoFile> fileWithKey(Session &session, const std::string &key);
 
+// A file that is no photo, or anything else in the folders that the scan left out.
 struct UnreadablePhoto
 {
     std::string path;

@@ -53,7 +53,9 @@ Session::Session(const std::string &file, bool readOnly)
         mDatabase.exec("PRAGMA journal_mode = WAL; PRAGMA foreign_keys = ON;");
         addSearchFunctions(mDatabase);
     }
-    mDatabase.exec("PRAGMA cache_size = -4096; PRAGMA mmap_size = 268435456;");
+    // A batch of the scan touches pages all over the index.
+    mDatabase.exec(readOnly ? "PRAGMA cache_size = -4096" : "PRAGMA cache_size = -32768");
+    mDatabase.exec("PRAGMA mmap_size = 268435456;");
 }
 
 SQLite::Statement &Session::statement(std::string_view sql)

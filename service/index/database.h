@@ -48,6 +48,13 @@ public:
     int run() { return mStatement.exec(); }
 
     std::string text(int column) const { return mStatement.getColumn(column).getString(); }
+    // Valid until the next row.
+    std::string_view view(int column) const
+    {
+        const SQLite::Column value = mStatement.getColumn(column);
+        const char *const start = value.getText();
+        return {start, static_cast<std::size_t>(value.getBytes())};
+    }
     std::int64_t number(int column) const { return mStatement.getColumn(column).getInt64(); }
     double real(int column) const { return mStatement.getColumn(column).getDouble(); }
     bool isNull(int column) const { return mStatement.isColumnNull(column); }

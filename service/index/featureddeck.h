@@ -14,5 +14,8 @@ class Session;
 // `day` is a date as 2026-05-01.
 std::vector<std::int64_t> featuredOrder(Session &session, const std::string &day);
 
+// To be called once a day before the first photo is marked: when all had been shown before the day,
+// a new round begins, which leaves the day's order as it is.
+void beginFeaturedDay(Database &database, const std::string &day);
 void markFeatured(Database &database, const std::vector<std::int64_t> &photoIds,
                   const std::string &day);

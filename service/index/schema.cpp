@@ -153,23 +153,33 @@ CREATE TABLE droppedKeywords (
 ) WITHOUT ROWID;
 )sql";
 
-const char *const steps[] = {firstVersion,   givenTexts,        featuredMemory,
-                             gatheredAlbums, searchInAnyScript, movedFiles};
-constexpr int newestVersion = sizeof steps / sizeof steps[0];
+// What lies in the folders and cannot be shown, but for files with the name of a photo.
+const char leftOut[] = R"sql(
+CREATE TABLE leftOut (
+    user INTEGER NOT NULL REFERENCES users (id) ON DELETE CASCADE,
+    path TEXT NOT NULL,
+    reason TEXT NOT NULL,
+    PRIMARY KEY (user, path)
+) WITHOUT ROWID;
+)sql";
+
+const char *const steps[] = {firstVersion,      givenTexts, featuredMemory, gatheredAlbums,
+                             searchInAnyScript, movedFiles, leftOut};
+static_assert(sizeof steps / sizeof steps[0] == newestSchema);
 
 } // namespace
 
-bool upgradeSchema(Session &session, std::string *error)
+bool upgradeSchema(Session &session, std::string *error, int version)
 {
     SQLite::Database &database = session.database();
-    const int version = database.execAndGet("PRAGMA user_version").getInt();
-    if (version > newestVersion) {
+    const int present = database.execAndGet("PRAGMA user_version").getInt();
+    if (present > newestSchema) {
         *error = "the index was written by a newer version of this program";
         return false;
     }
-    for (int step = version; step < newestVersion; ++step)
+    for (int step = present; step < version; ++step)
         database.exec(steps[step]);
-    if (version < newestVersion)
-        database.exec("PRAGMA user_version = " + std::to_string(newestVersion));
+    if (present < version)
+        database.exec("PRAGMA user_version = " + std::to_string(version));
     return true;
 }

@@ -10,6 +10,7 @@
 #include <sys/stat.h>
 
 #include <cerrno>
+#include <cstring>
 
 namespace {
 
@@ -23,6 +24,11 @@ bool isMissing(const std::string &path)
     {
     };
     return ::lstat(path.c_str(), &status) != 0 && (errno == ENOENT || errno == ENOTDIR);
+}
+
+std::string joined(const std::string &folder, const std::string &name)
+{
+    return folder.empty() ? name : folder + "/" + name;
 }
 
 std::string lastPiece(const std::string &path)
@@ -59,6 +65,9 @@ bool UserScan::run()
     if (!mStop)
         dropUnseenAlbums();
     write();
+    finishWriting();
+    if (!mStop)
+        writeLeftOut(mDatabase, mUser.id, mLeftOut);
     if (mIsFirst && !mStop)
         noteScanned(mDatabase, mUser.id);
     return true;
@@ -87,9 +96,8 @@ void UserScan::walk(const Place &place, const FolderListing &listing)
 // Links may lead in circles: each folder is entered once.
 void UserScan::enter(const Place &parent, const ListedFolder &folder)
 {
-    const std::string path =
-        parent.folder.empty() ? folder.name : parent.folder + "/" + folder.name;
-    if (isForeignLink(folder.isLink, path) ||
+    const std::string path = joined(parent.folder, folder.name);
+    if (leavesOutLink(folder.isLink, path) ||
         !mEntered.emplace(folder.device, folder.number).second)
         return;
     const auto listing = listFolder(pathOf(path));
@@ -98,6 +106,7 @@ void UserScan::enter(const Place &parent, const ListedFolder &folder)
         return;
     }
     spdlog::warn("the folder {} cannot be read", validUtf8(pathOf(path)));
+    mLeftOut[path] = std::string("the folder cannot be read: ") + std::strerror(errno);
     mUnreadableFolders.insert(path);
 }
 
@@ -116,7 +125,7 @@ void UserScan::compare(const Place &place, const FolderListing &listing)
     for (const ListedFile &file : listing.files) {
         if (mStop)
             return;
-        if (isForeignLink(file.isLink, place.folder + "/" + file.name))
+        if (leavesOutLink(file.isLink, joined(place.folder, file.name)))
             continue;
         const auto entry = known.find(file.name);
         compareFile(changes, place.folder, file, entry == known.end() ? nullptr : &entry->second);
@@ -233,9 +242,12 @@ std::set<std::string> UserScan::walkedFolders() const
 }
 
 // What is shown lies in the user's folder, whatever links say.
-bool UserScan::isForeignLink(bool isLink, const std::string &path) const
+bool UserScan::leavesOutLink(bool isLink, const std::string &path)
 {
-    return isLink && !liesWithin(mUser.photos, pathOf(path));
+    if (!isLink || liesWithin(mUser.photos, pathOf(path)))
+        return false;
+    mLeftOut[path] = "a link that leads out of the photo folder";
+    return true;
 }
 
 void UserScan::add(FolderChanges changes, bool isChanged)
@@ -249,11 +261,21 @@ void UserScan::add(FolderChanges changes, bool isChanged)
         write();
 }
 
+// Written while the walk reads on, one batch at a time and in their order.
 void UserScan::write()
 {
+    finishWriting();
     if (!mBatch.empty())
-        writeChanges(mDatabase, mBatch);
+        mWriting = std::async(std::launch::async, [this, batch = std::move(mBatch)] {
+            writeChanges(mDatabase, batch);
+        });
     mBatch.clear();
     mBatchFiles = 0;
     mLastWrite = std::chrono::steady_clock::now();
+}
+
+void UserScan::finishWriting()
+{
+    if (mWriting.valid())
+        mWriting.get();
 }

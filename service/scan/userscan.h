@@ -5,6 +5,7 @@
 
 #include <atomic>
 #include <chrono>
+#include <future>
 #include <set>
 
 class Database;
@@ -55,9 +56,10 @@ private:
     bool isBelowUnreadable(const std::string &folder) const;
     FolderState stateOf(const Place &place) const;
     std::string pathOf(const std::string &folder) const;
-    bool isForeignLink(bool isLink, const std::string &path) const;
+    bool leavesOutLink(bool isLink, const std::string &path);
     void add(FolderChanges changes, bool isChanged);
     void write();
+    void finishWriting();
 
     Database &mDatabase;
     const UserRecord mUser;
@@ -68,8 +70,10 @@ private:
     std::map<std::string, KnownAlbum> mKnownAlbums;
     std::set<std::string> mSeenFolders;
     std::set<std::string> mUnreadableFolders;
+    LeftOut mLeftOut;
     std::set<std::pair<std::uint64_t, std::uint64_t>> mEntered;
     std::vector<FolderChanges> mBatch;
     std::size_t mBatchFiles = 0;
     std::chrono::steady_clock::time_point mLastWrite;
+    std::future<void> mWriting;
 };

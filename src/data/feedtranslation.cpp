@@ -11,14 +11,18 @@ using namespace jsonwalk;
 
 namespace {
 
+const QString kFeed = QStringLiteral("feed");
+
 bool hasTotalCount(int type)
 {
     return type == FEATURED_PHOTOS_LIST || type == SEARCH_PHOTOS_LIST ||
            type == SEARCH_MORE_PHOTOS_LIST;
 }
 
-void appendRecords(const DataCreator &creator, const JsonObject &feed, Package *package)
+void appendRecords(const DataCreator &creator, const JsonObject &document, Package *package)
 {
+    const JsonObject &feed = object(document, kFeed);
+    package->mIsFeed = document.contains(kFeed);
     const QVariantList &entries = list(feed, QStringLiteral("entry"));
     if (package->mProperty.mType == SEARCH_MORE_PHOTOS_LIST)
         package->retireRecords();
@@ -46,8 +50,6 @@ template <typename Text>
 ErrorCode create(const PackageProperty &property, const Text &feedText, Package **out)
 {
     const JsonObject document = JsonParser::parse(feedText);
-    const JsonObject &feed = object(document, QStringLiteral("feed"));
-
     std::unique_ptr<Package> package(new (std::nothrow) Package);
     if (!package) {
         logLine("Error: Failed to allocate memory!");
@@ -61,8 +63,8 @@ ErrorCode create(const PackageProperty &property, const Text &feedText, Package 
         logLine("Error: Unkown Type.");
         return NET_REJECTED;
     }
-    appendRecords(*creator, feed, package.get());
-    applyFeedMembers(feed, package.get());
+    appendRecords(*creator, document, package.get());
+    applyFeedMembers(object(document, kFeed), package.get());
     *out = package.release();
     return NET_SUCCESS;
 }
@@ -75,7 +77,7 @@ ErrorCode append(const PackageProperty &property, const Text &feedText, Package 
         return NET_SUCCESS;
     }
     const JsonObject document = JsonParser::parse(feedText);
-    appendRecords(OrvalaPhotoCreator(), object(document, QStringLiteral("feed")), package);
+    appendRecords(OrvalaPhotoCreator(), document, package);
     return NET_SUCCESS;
 }
 

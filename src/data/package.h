@@ -41,6 +41,7 @@ public:
     PackageProperty mProperty;
     QList<OrvalaData *> mDataList;
     int mTotalCount = 0; // of the whole feed, for featured photos and searches
+    bool mIsFeed = true; // false: the text that came last was something else, without records
 
 private:
     QList<OrvalaData *> mRetiredDataList;

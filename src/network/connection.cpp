@@ -189,7 +189,7 @@ bool Connection::takeArrived()
         mInflater = Inflater::create(mReply->rawHeader("Content-Encoding"));
     if (mInflater)
         mInflater->feed(mReply->readAll(), mBody, mMaximumSize);
-    if (mTaken + getAvailable() <= mMaximumSize)
+    if (mTaken + getAvailable() <= mMaximumSize && !(mInflater && mInflater->isBomb()))
         return true;
     mIsTooLarge = true;
     mReply->abort();

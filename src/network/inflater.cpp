@@ -8,6 +8,9 @@ constexpr int anyHeader = MAX_WBITS + 32; // gzip's or zlib's
 constexpr int noHeader = -MAX_WBITS;
 constexpr int blockSize = 32 * 1024;
 
+// Feeds shrink to a tenth or a twentieth; zeros to a thousandth.
+constexpr unsigned long harmlessSize = 2 * 1024 * 1024, largestRatio = 250;
+
 } // namespace
 
 std::unique_ptr<Inflater> Inflater::create(const QByteArray &contentEncoding)
@@ -35,12 +38,15 @@ void Inflater::feed(const QByteArray &bytes, QByteArray &body, qint64 most)
     mStream->avail_in = uInt(bytes.size());
     char block[blockSize];
     bool isBlockFull = true; // more may wait inside the stream
-    while (!mIsDamaged && body.size() <= most && (mStream->avail_in > 0 || isBlockFull)) {
+    while (!mIsDamaged && !mIsBomb && body.size() <= most &&
+           (mStream->avail_in > 0 || isBlockFull)) {
         mStream->next_out = reinterpret_cast<Bytef *>(block);
         mStream->avail_out = blockSize;
         const int result = inflate(mStream.get(), Z_NO_FLUSH);
         body.append(block, blockSize - int(mStream->avail_out));
         isBlockFull = mStream->avail_out == 0;
+        mIsBomb = mStream->total_out > harmlessSize &&
+                  mStream->total_out / largestRatio > mStream->total_in;
         if (result == Z_DATA_ERROR && !mIsStarted)
             retryWithoutHeader(bytes);
         else if (result == Z_STREAM_END)

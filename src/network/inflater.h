@@ -18,6 +18,9 @@ public:
     // Appends what the bytes stand for to the body, until that has more than `most` bytes. Bytes
     // after the first damaged one are dropped: whoever reads the body finds it cut.
     void feed(const QByteArray &bytes, QByteArray &body, qint64 most);
+    // The bytes stand for so much more than themselves that this is no honest answer; the rest of
+    // it is not looked at, which would keep the screen waiting.
+    bool isBomb() const { return mIsBomb; }
 
 private:
     Inflater();
@@ -27,4 +30,5 @@ private:
     std::unique_ptr<z_stream_s> mStream;
     bool mIsStarted = false;
     bool mIsDamaged = false;
+    bool mIsBomb = false;
 };

@@ -1,5 +1,7 @@
 #include "ui/detailnotes.h"
 
+#include "ui/cachedlist.h"
+
 #include <algorithm>
 
 namespace {
@@ -26,7 +28,7 @@ void DetailNotes::request(PackageManager::Callback callback)
 void DetailNotes::requestList(int type, PackageManager::Callback callback)
 {
     PackageProperty property = mPhoto.request(type);
-    if (PackageManager::getPackage(property))
+    if (cachedList(property))
         take(property, NET_SUCCESS);
     else if (!PackageManager::downloadPage(property, callback))
         take(property, NET_FAILED);
@@ -45,7 +47,7 @@ bool DetailNotes::take(const PackageProperty &property, ErrorCode code)
     PackageProperty wanted = mPhoto.request(property.mType);
     if (property != wanted)
         return false;
-    const Package *package = code == NET_SUCCESS ? PackageManager::getPackage(wanted) : nullptr;
+    const Package *package = code == NET_SUCCESS ? cachedList(wanted) : nullptr;
     if (property.mType == PHOTO_TAGS_LIST) {
         if (package)
             readTags(*package);

@@ -15,11 +15,11 @@ namespace {
 const int kKeys[] = {DEVICE_SELECT_KEY,   DEVICE_DOWN_KEY,   DEVICE_PLAY_KEY, DEVICE_PAGEUP_KEY,
                      DEVICE_PAGEDOWN_KEY, DEVICE_RETURN_KEY, DEVICE_RED_KEY};
 
-HomeBars::Hints gridHints(const HomeState &state, const Package *package, bool canPlay)
+HomeBars::Hints gridHints(const HomeState &state, const Package *package)
 {
     HomeBars::Hints hints{{DEVICE_SELECT_KEY, ScreenTexts::hint(ScreenTexts::OpenHint)}};
     const int start = state.mCurrentProperty.mStartIndex;
-    if (state.isPhotoList() && canPlay)
+    if (state.isPhotoList())
         hints << qMakePair(int(DEVICE_PLAY_KEY), I18n::shortCut(9));
     if (paging::pageUp(start, paging::onePage).exists)
         hints << qMakePair(int(DEVICE_PAGEUP_KEY), I18n::shortCut(0));
@@ -49,13 +49,13 @@ HomeBars::HomeBars(QWidget *parent)
 }
 
 HomeBars::Hints HomeBars::usefulKeys(const HomeState &state, HomePages::Page page,
-                                     const Package *package, bool canPlay)
+                                     const Package *package)
 {
     if (page == HomePages::Loading)
         return {};
     Hints hints;
     if (page == HomePages::Grid)
-        hints = gridHints(state, package, canPlay);
+        hints = gridHints(state, package);
     else if (page == HomePages::Failure)
         hints << qMakePair(int(DEVICE_SELECT_KEY), ScreenTexts::hint(ScreenTexts::RetryHint));
     if (state.back() != HomeState::Back::SignOut)

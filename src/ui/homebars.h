@@ -26,8 +26,7 @@ public:
     using Hints = QList<QPair<int, QString>>;
     void showHints(const Hints &hints);
     // The keys that lead somewhere on a page of the home screen.
-    static Hints usefulKeys(const HomeState &state, HomePages::Page page, const Package *package,
-                            bool canPlay);
+    static Hints usefulKeys(const HomeState &state, HomePages::Page page, const Package *package);
     bool isKeyShown(int key) const;
 
 private:

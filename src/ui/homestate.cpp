@@ -127,6 +127,31 @@ void HomeState::followTo(int number)
         mCurrentProperty.mType = TYPE_SEARCH_MORE_PHOTOS;
 }
 
+void HomeState::updateInitIndex(int number)
+{
+    if (number < 1)
+        return;
+    const int before = mCurrentProperty.mStartIndex;
+    followTo(number);
+    const int start = mCurrentProperty.mStartIndex;
+    if (start > before)
+        logLine("HomeWidget::updateInitIndex() Page DOWN!!!");
+    else if (start < before)
+        logLine("HomeWidget::updateInitIndex() Page UP!!!");
+    else
+        logLine("HomeWidget::updateInitIndex() do not switch page");
+    mInitIndex = number - start;
+}
+
+bool HomeState::takeFirstCellWish()
+{
+    const bool isWished = mIsReturnFromDetail || mIsPageDown;
+    if (mCurrentProperty.mType != TYPE_FEATURED_PHOTOS || !isWished)
+        return false;
+    mIsReturnFromDetail = mIsPageDown = false;
+    return true;
+}
+
 bool HomeState::pageUp(int arg)
 {
     const bool startsBlock = isSearch() && mCurrentProperty.mStartIndex % paging::blockSize == 1;

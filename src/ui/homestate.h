@@ -57,6 +57,13 @@ struct HomeState
     // lie in another block.
     void followTo(int number);
 
+    // The same on the way back from the photo screen, where this photo was shown last: its cell is
+    // to be focused.
+    void updateInitIndex(int number);
+
+    // Whether the page that has come is to have the focus on its first cell; once.
+    bool takeFirstCellWish();
+
     // The list wanted has come, or a cell of it takes the focus.
     void packageArrived(const Package &package);
     void moveTo(int cell, const Package *package);

@@ -2,39 +2,29 @@
 
 #include "data/package.h"
 #include "network/errorcode.h"
-#include "ui/backdrop.h"
-#include "ui/cellfiller.h"
 #include "ui/gridowner.h"
 #include "ui/homestate.h"
+#include "ui/homeview.h"
 
 #include <QWidget>
 
-#include <memory>
-
 class AccountQuestions;
-class FormScrollArea;
-class HomeBars;
-class HomePages;
-class PhotoPopups;
-class PictureDetailWidget;
+class ListLoader;
 class SearchFlow;
-class UpWidget;
 
 extern bool isHomeMenu; // featured photos are shown
 
 // The screen that the user lives in after signing in: the menu, one page of one list, and the bar
 // of key hints. There is one instance, which the static call-back reaches.
 //
-//   menu or cell --> HomeState --> requestPage(): loading page, then
-//       in the cache: packageReady --> tryToShowCurrentPackage --> CellFiller
-//       else PackageManager --> downloadPackageCB --> packageReady, or the failure page
+//   menu, cell, key --> HomeState --> ListLoader --> tryToShowCurrentPackage() --> HomeView
 //
 // A page that fails, or does not come within "Network/PageSeconds", ends in the failure page; an
 // answer to what is no longer wanted is left alone. While the photo screen is up the list moves on
 // below it: whoever returns finds the page, and the cell, of the photo shown last.
 //
-// Searching, what pops up over the photo screen, and the questions before signing out are objects
-// of their own: SearchFlow, PhotoPopups, AccountQuestions.
+// The rest are objects of their own, too: SearchFlow for searching, PhotoPopups over the photo
+// screen, and AccountQuestions before signing out.
 class HomeWidget : public QWidget, public GridOwner
 {
     Q_OBJECT
@@ -99,36 +89,19 @@ private:
     void connectParts();
     void connectDetail();
 
-    void requestPage();
-    void tryToDownload(PackageProperty property);
-    void showFailure(ErrorCode code);
-    void leaveFailure();
-    Package *takeUsablePackage();
-    void fetchAnew();
     void holdPackage();
     void pushPackageData();
-    void focusAfterPageDown();
-    void startAtFirstCell();
     void openList();
     void showOtherPage(const char *otherType);
     void reshow();
-    void refreshBars();
-    void focusContent();
-    void showDetail(int itemIndex, bool isEnterPress);
-    void updateInitIndex();
-    static bool mayFocus();
+    void leaveFailure();
     bool goBack();
     void play();
 
     HomeState mState;
-    UpWidget *mTitleWidget;
-    HomePages *mPages;
-    FormScrollArea *mCommentArea;
+    HomeView mView;
     PictureDetailWidget *mDetail;
-    HomeBars *mBars;
-    std::unique_ptr<CellFiller> mCells;
     SearchFlow *mSearch;
-    PhotoPopups *mPopups;
     AccountQuestions *mQuestions;
-    Backdrop mBackdrop;
+    ListLoader *mLoader;
 };

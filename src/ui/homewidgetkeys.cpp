@@ -10,14 +10,13 @@
 #include "ui/accountquestions.h"
 #include "ui/formscrollarea.h"
 #include "ui/formscrollwidget.h"
-#include "ui/homepages.h"
+#include "ui/listloader.h"
 #include "ui/paging.h"
 #include "ui/picturedetailwidget.h"
 #include "ui/searchflow.h"
 #include "ui/upwidget.h"
 
 #include <QKeyEvent>
-#include <QScrollBar>
 
 namespace {
 
@@ -55,7 +54,7 @@ void HomeWidget::handleCommentEnter(int itemIndex, bool isEnterPress)
     }
     const int type = mState.mCurrentProperty.mType;
     if (mState.isPhotoList())
-        showDetail(itemIndex, isEnterPress);
+        mView.showPhoto(itemIndex, mCurrentPackageData, mIsSelfPhoto, isEnterPress);
     else if (type == TYPE_ALBUM_LIST ? openAlbum(mState, *mCurrentPackageData, itemIndex)
                                      : openPerson(mState, *mCurrentPackageData, itemIndex))
         openList();
@@ -64,49 +63,23 @@ void HomeWidget::handleCommentEnter(int itemIndex, bool isEnterPress)
 // Shows the list that the state has turned to, from its first cell on.
 void HomeWidget::openList()
 {
-    startAtFirstCell();
-    mCommentArea->verticalScrollBar()->setValue(0);
-    requestPage();
-}
-
-void HomeWidget::showDetail(int itemIndex, bool isEnterPress)
-{
-    CellFiller::cancelThumbnails();
-    mPages->show(HomePages::Detail);
-    mDetail->showPhoto(mState.recordIndex(itemIndex), mCurrentPackageData, mIsSelfPhoto,
-                       isEnterPress, mState.firstNumber());
-    mDetail->setFocus();
+    mView.startAtFirstCell();
+    mView.scrollToTop();
+    mLoader->request();
 }
 
 void HomeWidget::returnFromDetail(int index)
 {
     logLine("enter HomeWidget::returnFromDetail(), index = ", index);
-    if (!mPages->isShown(HomePages::Detail))
+    if (!mView.isShown(HomePages::Detail))
         return;
-    updateInitIndex();
-    mPages->show(HomePages::Grid);
+    mState.updateInitIndex(mDetail->number());
+    mView.pages()->show(HomePages::Grid);
     if (mState.isSearch())
         mCurrentPackageData = nullptr; // may be another block by now
     holdPackage();
     mState.mIsReturnFromDetail = !mCurrentPackageData;
     reshow();
-}
-
-void HomeWidget::updateInitIndex()
-{
-    const int number = mDetail->number();
-    if (number < 1)
-        return;
-    const int before = mState.mCurrentProperty.mStartIndex;
-    mState.followTo(number);
-    const int start = mState.mCurrentProperty.mStartIndex;
-    if (start > before)
-        logLine("HomeWidget::updateInitIndex() Page DOWN!!!");
-    else if (start < before)
-        logLine("HomeWidget::updateInitIndex() Page UP!!!");
-    else
-        logLine("HomeWidget::updateInitIndex() do not switch page");
-    mState.mInitIndex = number - start;
 }
 
 bool HomeWidget::preparePageData(int startIndex, bool nextPage)
@@ -126,7 +99,7 @@ bool HomeWidget::preparePageData(int startIndex, bool nextPage)
 
 bool HomeWidget::handlePageUp(int arg)
 {
-    if (mPages->isShown(HomePages::Detail))
+    if (mView.isShown(HomePages::Detail))
         return preparePageData(arg, false);
     if (!mState.pageUp(arg))
         return arg == paging::onePage && mSearch->changeBlock(false);
@@ -137,9 +110,9 @@ bool HomeWidget::handlePageUp(int arg)
 bool HomeWidget::handlePageDown(int arg)
 {
     logLine("enter HomeWidget::handlePageDown()");
-    if (mPages->isShown(HomePages::Detail))
+    if (mView.isShown(HomePages::Detail))
         return preparePageData(arg, true);
-    if (!mCurrentPackageData && mPages->isShown(HomePages::Grid))
+    if (!mCurrentPackageData && mView.isShown(HomePages::Grid))
         reshow(); // the cache has let go of the list; what it holds is known when it is back
     if (!mState.pageDown(arg, mCurrentPackageData))
         return arg == paging::onePage && mSearch->changeBlock(true);
@@ -161,7 +134,7 @@ void HomeWidget::showOtherPage(const char *otherType)
 
 void HomeWidget::showRecord(int number)
 {
-    if (mPages->isShown(HomePages::Detail) && mCurrentPackageData) {
+    if (mView.isShown(HomePages::Detail) && mCurrentPackageData) {
         const int first = mState.firstNumber(); // the play began on the photo screen
         mState.followTo(first + number - 1);
         mDetail->showPhoto(number - 1, mCurrentPackageData, mIsSelfPhoto, false, first);
@@ -169,11 +142,11 @@ void HomeWidget::showRecord(int number)
         return;
     }
     mState.selectRecord(number);
-    mTitleWidget->clearFocus();
-    if (mPages->isShown(HomePages::Detail))
-        mPages->show(HomePages::Grid);
+    mView.menu()->clearFocus();
+    if (mView.isShown(HomePages::Detail))
+        mView.pages()->show(HomePages::Grid);
     if (mState.mCurrentProperty.mType == TYPE_FEATURED_PHOTOS)
-        requestPage();
+        mLoader->request();
     else
         reshow();
 }
@@ -186,7 +159,7 @@ void HomeWidget::reshow()
         return;
     }
     mState.restart();
-    requestPage();
+    mLoader->request();
 }
 
 void HomeWidget::changeBlock(bool next)
@@ -210,26 +183,26 @@ void HomeWidget::keyPressEvent(QKeyEvent *event)
         break;
     case DEVICE_DOWN_KEY:
         logLine("<DEVICE_DOWN_KEY> setFocus()");
-        focusContent();
+        mView.focusContent();
         break;
     case DEVICE_UP_KEY:
         logLine("<DEVICE_UP_KEY> mTitleWidget->setFocus()");
-        mTitleWidget->setFocus();
+        mView.menu()->setFocus();
         break;
     case DEVICE_PLAY_KEY:
     case DEVICE_PLAYPAUSE_KEY:
         play();
         break;
     case DEVICE_RED_KEY:
-        mTitleWidget->returnToHome();
+        mView.menu()->returnToHome();
         updatePhotoRatio(0);
         break;
     case DEVICE_PAGEUP_KEY:
-        if (mPages->isShown(HomePages::Grid))
+        if (mView.isShown(HomePages::Grid))
             handlePageUp(paging::onePage);
         break;
     case DEVICE_PAGEDOWN_KEY:
-        if (mPages->isShown(HomePages::Grid))
+        if (mView.isShown(HomePages::Grid))
             handlePageDown(paging::onePage);
         break;
     default:
@@ -239,7 +212,7 @@ void HomeWidget::keyPressEvent(QKeyEvent *event)
 
 bool HomeWidget::goBack()
 {
-    if (mPages->isShown(HomePages::Detail)) {
+    if (mView.isShown(HomePages::Detail)) {
         returnFromDetail(1);
         return true;
     }
@@ -257,20 +230,20 @@ bool HomeWidget::goBack()
     default:
         return false;
     }
-    requestPage();
+    mLoader->request();
     return true;
 }
 
 void HomeWidget::play()
 {
-    if (mPages->isShown(HomePages::Detail)) {
+    if (mView.isShown(HomePages::Detail)) {
         holdPackage();
         emit slidePlay(mDetail->recordIndex());
         return;
     }
     if (!mState.isPhotoList() || (mState.isSearch() && !mState.mIsSearchShown))
         return;
-    const int cell = mCommentArea->content()->getIndex();
+    const int cell = mView.grid()->content()->getIndex();
     const int index = mState.recordIndex(cell);
     if (cell >= 0 && mState.mCanPlay && index >= 0 && index < recordCount())
         emit slidePlay(index);
@@ -290,7 +263,7 @@ void HomeWidget::doLogout()
 
 void HomeWidget::returnFromLogoutCancel()
 {
-    mTitleWidget->cancelSignOut();
+    mView.menu()->cancelSignOut();
 }
 
 // Return on the failure page: to the list or page before, or up to the menu.
@@ -298,5 +271,5 @@ void HomeWidget::leaveFailure()
 {
     if (goBack() || handlePageUp(paging::onePage))
         return;
-    mTitleWidget->setFocus();
+    mView.menu()->setFocus();
 }

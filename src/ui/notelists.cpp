@@ -8,14 +8,13 @@
 #include "common/ui/qtoastwidget.h"
 #include "data/packagemanager.h"
 #include "data/posthelper.h"
+#include "ui/cachedlist.h"
 #include "ui/detailphoto.h"
 #include "ui/picturedetailwidget.h"
 #include "ui/screentexts.h"
 #include "ui/sendingnotice.h"
 
 #include <algorithm>
-
-NoteLists *NoteLists::mInstance = nullptr;
 
 namespace {
 
@@ -42,13 +41,6 @@ NoteLists::NoteLists(QWidget *screen, QToastWidget *toast)
     , mScreen(screen)
     , mToast(toast)
 {
-    mInstance = this;
-}
-
-NoteLists::~NoteLists()
-{
-    if (mInstance == this)
-        mInstance = nullptr;
 }
 
 void NoteLists::showTagList(const PackageProperty &tags, bool isSelfPhoto)
@@ -112,26 +104,25 @@ void NoteLists::refresh()
 
 void NoteLists::request()
 {
-    if (PackageManager::getPackage(mProperty)) {
+    if (cachedList(mProperty)) {
         listArrived(NET_SUCCESS);
         return;
     }
     if (mList->count() == 0)
         mList->showMessage(ScreenTexts::question(ScreenTexts::Loading));
-    if (!PackageManager::downloadPage(mProperty, downloadPackageCB))
+    if (!PackageManager::downloadPage(mProperty, PictureDetailWidget::downloadPackageCB))
         listArrived(NET_FAILED);
 }
 
-void NoteLists::downloadPackageCB(PackageProperty &property, ErrorCode code)
+void NoteLists::take(const PackageProperty &property, ErrorCode code)
 {
-    PictureDetailWidget::downloadPackageCB(property, code);
-    if (mInstance && mInstance->mList && property == mInstance->mProperty)
-        mInstance->listArrived(code);
+    if (mList && property == mProperty)
+        listArrived(code);
 }
 
 void NoteLists::listArrived(ErrorCode code)
 {
-    const Package *package = code == NET_SUCCESS ? PackageManager::getPackage(mProperty) : nullptr;
+    const Package *package = code == NET_SUCCESS ? cachedList(mProperty) : nullptr;
     if (package)
         mList->showNotes(isTagList() ? tagsOf(*package) : commentsOf(*package));
     if (!package)

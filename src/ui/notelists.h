@@ -15,7 +15,7 @@ class QToastWidget;
 
 // The lists of a photo's tags and comments in a pop-up, and deleting from them. One list at a time.
 //
-//   showTagList() -> from the cache, or downloadPackageCB() -> fill
+//   showTagList() -> from the cache, or take() -> fill
 //   Select on a tag -> question -> updateTagList() -> changed() -> the list fetched anew
 class NoteLists : public QObject
 {
@@ -24,17 +24,14 @@ class NoteLists : public QObject
 public:
     // The screen is what the lists pop up over; the toast tells how a deletion ended.
     NoteLists(QWidget *screen, QToastWidget *toast);
-    ~NoteLists() override;
 
     // The property asks for the tags of a photo; the user's own can be changed.
     void showTagList(const PackageProperty &tags, bool isSelfPhoto);
     void showMoreComment(const PackageProperty &comments, bool isSelfPhoto);
     // Fetches the list that is shown anew.
     void refresh();
-
-    // Answer of the package manager; the photo screen, which may wait for the same list, hears it
-    // too.
-    static void downloadPackageCB(PackageProperty &property, ErrorCode code);
+    // The photo screen asks for the same lists, and its call-back hears every answer.
+    void take(const PackageProperty &property, ErrorCode code);
 
 public slots:
     void returnFromTag();
@@ -59,8 +56,6 @@ private:
     void runDeletion(int index);
     void tellWhetherGone(ErrorCode code);
     bool isTagList() const { return mProperty.mType == PHOTO_TAGS_LIST; }
-
-    static NoteLists *mInstance;
 
     QWidget *mScreen;
     QToastWidget *mToast;

@@ -20,32 +20,33 @@ PhotoPopups::PhotoPopups(PictureDetailWidget *detail, QWidget *screen)
             &PhotoPopups::showMoreComment);
     connect(mLists, &NoteLists::addCommentWanted, this, &PhotoPopups::showInputCommentDialog);
     connect(mLists, &NoteLists::addTagWanted, this, &PhotoPopups::showInputTagDialog);
+    connect(detail, &PictureDetailWidget::notesArrived, mLists, &NoteLists::take);
     connect(mInput, &NoteInput::posted, this, &PhotoPopups::refresh);
     connect(mLists, &NoteLists::changed, this, &PhotoPopups::refresh);
 }
 
 void PhotoPopups::showInputCommentDialog()
 {
-    mInput->showInputCommentDialog(mDetail->commentsProperty());
+    mInput->showInputCommentDialog(mDetail->photo().request(PHOTO_COMMENTS_LIST));
 }
 
 void PhotoPopups::showInputTagDialog()
 {
     if (mDetail->isSelfPhoto())
-        mInput->showInputTagDialog(mDetail->tagsProperty());
+        mInput->showInputTagDialog(mDetail->photo().request(PHOTO_TAGS_LIST));
 }
 
 void PhotoPopups::showTagList()
 {
-    mLists->showTagList(mDetail->tagsProperty(), mDetail->isSelfPhoto());
+    mLists->showTagList(mDetail->photo().request(PHOTO_TAGS_LIST), mDetail->isSelfPhoto());
 }
 
 void PhotoPopups::showMoreComment()
 {
-    mLists->showMoreComment(mDetail->commentsProperty(), mDetail->isSelfPhoto());
+    mLists->showMoreComment(mDetail->photo().request(PHOTO_COMMENTS_LIST), mDetail->isSelfPhoto());
 }
 
-// The photo screen first: the list then joins its request, and passes the answer on.
+// The photo screen first: the list then joins its request.
 void PhotoPopups::refresh()
 {
     mDetail->refreshNotes();

@@ -6,6 +6,7 @@
 #include "network/systemconfig.h"
 #include "ui/detailactions.h"
 #include "ui/detailinformation.h"
+#include "ui/detailkeys.h"
 #include "ui/detailpaging.h"
 #include "ui/detailpictures.h"
 #include "ui/detailstage.h"
@@ -34,6 +35,7 @@ bool isNote(const PackageProperty &property)
 
 PictureDetailWidget::PictureDetailWidget(QWidget *parent)
     : QWidget(parent)
+    , mWalk(new DetailWalk(downloadPackageCB, this))
     , mStage(new DetailStage(this))
     , mPictures(new DetailPictures(mStage, this))
     , mStrip(new DetailStrip(this))
@@ -43,14 +45,30 @@ PictureDetailWidget::PictureDetailWidget(QWidget *parent)
 {
     mWidgetInst = this;
     setFocusPolicy(Qt::StrongFocus);
+    connectWalk();
     connect(mStage, &DetailStage::resized, this, [this] {
-        if (mNumber > 0 && isVisible())
+        if (number() > 0 && isVisible())
             mPictures->refit();
     });
     connect(mPictures, &DetailPictures::settled, this, &PictureDetailWidget::fetchNotes);
     connect(mZoom, &ZoomView::left, this, [this] {
         mPictures->refit();
         emit viewChanged();
+    });
+}
+
+void PictureDetailWidget::connectWalk()
+{
+    connect(mWalk, &DetailWalk::moved, this, &PictureDetailWidget::display);
+    connect(mWalk, &DetailWalk::pageChanged, this, &PictureDetailWidget::handleDetailPageChange);
+    connect(mWalk, &DetailWalk::waiting, this, [this] {
+        mStage->setBusy(true);
+        mStage->setMessage(DetailTexts::text(DetailTexts::LoadingPage));
+    });
+    connect(mWalk, &DetailWalk::ended, this, [this](bool failed) {
+        mStage->setBusy(mStage->isWaiting());
+        mStage->setMessage(failed ? DetailTexts::text(DetailTexts::PageFailed) : QString());
+        mStage->setNeighbours(number() > 1, number() < total());
     });
 }
 
@@ -64,7 +82,6 @@ void PictureDetailWidget::showPhoto(int recordIndex, Package *package, bool isSe
                                     bool isEnterPress, int firstNumber)
 {
     logLine("enter PictureDetailWidget::showPhoto(), index = ", recordIndex);
-    mList.open(package, firstNumber);
     mIsSelfPhoto = isSelfPhoto;
     mActions->setActions(detailActions(isSelfPhoto));
     layOut();
@@ -72,60 +89,25 @@ void PictureDetailWidget::showPhoto(int recordIndex, Package *package, bool isSe
         mActions->moveToFirst();
         setZone(Zone::Photo);
     }
-    mNumber = 0; // whatever page it is on, the owner knows
-    const int number = mList.number(recordIndex);
-    if (const OrvalaPhoto *record = mList.photo(number))
-        display(number, DetailPhoto::of(*record));
-    else
-        fetchList(number);
+    mWalk->open(recordIndex, package, firstNumber);
 }
 
-void PictureDetailWidget::goTo(int number)
+// Another photo than before.
+void PictureDetailWidget::display()
 {
-    if (number < 1 || number > mList.total() || number == mNumber)
-        return;
-    if (const OrvalaPhoto *record = mList.photo(number))
-        display(number, DetailPhoto::of(*record));
-    else
-        fetchList(number);
-}
-
-void PictureDetailWidget::display(int number, const DetailPhoto &photo)
-{
-    const int before = mNumber;
-    mNumber = number;
-    mWanted = 0;
-    mPhoto = photo;
     mZoom->dismiss();
-    mNotes.open(photo);
-    const OrvalaPhoto *next = mList.photo(number >= before ? number + 1 : number - 1);
-    mNextUrl = next ? next->imageUrl() : QString();
+    mNotes.open(photo());
     if (isVisible())
         showPictures();
     showInformation();
-    const int page = detailpaging::pageStart(mList.type(), number);
-    mList.prepareFollowing(number);
-    if (before > 0 && page != detailpaging::pageStart(mList.type(), before))
-        emit handleDetailPageChange(page, number > before);
     emit viewChanged();
 }
 
 void PictureDetailWidget::showPictures()
 {
-    mPictures->show(mPhoto, mNextUrl);
-    mStage->setNeighbours(mNumber > 1, mNumber < mList.total());
+    mPictures->show(photo(), mWalk->nextUrl());
+    mStage->setNeighbours(number() > 1, number() < total());
     showStrip();
-}
-
-// The photo shown stays until the one wanted is there.
-void PictureDetailWidget::fetchList(int number)
-{
-    mWanted = number;
-    mRequest = mList.requestFor(number);
-    mStage->setBusy(true);
-    mStage->setMessage(DetailTexts::text(DetailTexts::LoadingPage));
-    if (!PackageManager::downloadPage(mRequest, downloadPackageCB))
-        listArrived(mRequest, NET_FAILED);
 }
 
 void PictureDetailWidget::downloadPackageCB(PackageProperty &property, ErrorCode code)
@@ -133,62 +115,38 @@ void PictureDetailWidget::downloadPackageCB(PackageProperty &property, ErrorCode
     logLine("{PictureDetailWidget::downloadPackageCB} type ", property.mType, " code ", code);
     if (!mWidgetInst)
         return;
-    if (!isNote(property))
-        mWidgetInst->listArrived(property, code);
-    else if (mWidgetInst->mNotes.take(property, code))
+    if (!isNote(property)) {
+        mWidgetInst->mWalk->listArrived(property, code);
+        return;
+    }
+    if (mWidgetInst->mNotes.take(property, code))
         mWidgetInst->showInformation();
-}
-
-void PictureDetailWidget::listArrived(const PackageProperty &property, ErrorCode code)
-{
-    if (mWanted == 0 || property != mRequest)
-        return;
-    const bool isNew = code == NET_SUCCESS && mList.take(property);
-    // A list fetched anew may have lost or gained photos before this one.
-    const int moved = mNumber > 0 && isNew ? mList.find(mPhoto) - mNumber : 0;
-    if (mNumber > 0 && mNumber + moved > 0) {
-        mNumber += moved;
-        mWanted += moved;
-    }
-    const int wanted = std::min(mWanted, mList.total());
-    if (isNew && wanted > 0 && !mList.photo(wanted)) {
-        fetchList(wanted); // another page nearer
-        return;
-    }
-    mWanted = 0;
-    mStage->setBusy(mStage->isWaiting());
-    const bool failed = code != NET_SUCCESS || (!isNew && mNumber == 0);
-    mStage->setMessage(failed ? DetailTexts::text(DetailTexts::PageFailed) : QString());
-    if (isNew)
-        goTo(wanted);
-    mStage->setNeighbours(mNumber > 1, mNumber < mList.total());
+    emit mWidgetInst->notesArrived(property, code);
 }
 
 void PictureDetailWidget::updateList(PackageProperty &property)
 {
-    if (mNumber == 0 || isNote(property) || !isVisible())
+    if (number() == 0 || isNote(property) || !isVisible())
         return;
-    if (mWanted > 0)
-        listArrived(property, NET_SUCCESS);
+    if (mWalk->isWaiting())
+        mWalk->listArrived(property, NET_SUCCESS);
     showStrip();
     showInformation();
 }
 
 void PictureDetailWidget::showStrip()
 {
-    const int places = std::min(mStrip->places(), std::max(1, mList.total()));
-    const int first = detailpaging::stripStart(mNumber, mList.total(), places);
+    const int places = std::min(mStrip->places(), std::max(1, total()));
+    const int first = detailpaging::stripStart(number(), total(), places);
     QVector<DetailStrip::Neighbour> neighbours;
-    for (int number = first; number < first + places; ++number) {
-        const OrvalaPhoto *record = mList.photo(number);
-        neighbours.append({record ? record->thumbnailUrl() : QString(), number == mNumber});
-    }
+    for (int place = first; place < first + places; ++place)
+        neighbours.append({mWalk->thumbnailUrl(place), place == number()});
     mStrip->showNeighbours(neighbours);
 }
 
 void PictureDetailWidget::showInformation()
 {
-    mInformation->showNotes(mPhoto, mNotes, QStringLiteral("%1/%2").arg(mNumber).arg(total()));
+    mInformation->showNotes(photo(), mNotes, QStringLiteral("%1/%2").arg(number()).arg(total()));
 }
 
 void PictureDetailWidget::fetchNotes()
@@ -199,7 +157,7 @@ void PictureDetailWidget::fetchNotes()
 
 void PictureDetailWidget::refreshNotes()
 {
-    if (mNumber == 0)
+    if (number() == 0)
         return;
     mNotes.forgetCached();
     fetchNotes();
@@ -219,87 +177,65 @@ QList<QPair<int, QString>> PictureDetailWidget::keyHints() const
 
 void PictureDetailWidget::keyPressEvent(QKeyEvent *event)
 {
-    event->setAccepted(handleKey(event->key()));
+    event->accept();
+    if (mZoom->isVisible() && mZoom->handleKey(event->key()))
+        return;
+    const DetailCommand command = detailCommand(mZone == Zone::Actions, event->key());
+    if (command == DetailCommand::None)
+        event->ignore();
+    else
+        perform(command);
 }
 
-// What the place with the focus does not take is the same everywhere on the screen.
-bool PictureDetailWidget::handleKey(int key)
+void PictureDetailWidget::perform(DetailCommand command)
 {
-    if (mZoom->isVisible() && mZoom->handleKey(key))
-        return true;
-    if (mZone == Zone::Photo ? handlePhotoKey(key) : handleActionKey(key))
-        return true;
-    switch (key) {
-    case DEVICE_PRE_KEY:
-        goTo(mNumber - 1);
-        return true;
-    case DEVICE_NEXT_KEY:
-        goTo(mNumber + 1);
-        return true;
-    case DEVICE_PAGEUP_KEY:
-        goTo(std::max(1, mNumber - paging::pageSize));
-        return true;
-    case DEVICE_PAGEDOWN_KEY:
-        goTo(std::min(mList.total(), mNumber + paging::pageSize));
-        return true;
-    case DEVICE_PLAY_KEY:
-    case DEVICE_PLAYPAUSE_KEY:
-        run(DetailAction::Play);
-        return true;
-    case DEVICE_RETURN_KEY:
-        emit backSignal(recordIndex());
-        return true;
-    default:
-        return false;
-    }
-}
-
-bool PictureDetailWidget::handlePhotoKey(int key)
-{
-    switch (key) {
-    case DEVICE_LEFT_KEY:
-        goTo(mNumber - 1);
-        return true;
-    case DEVICE_RIGHT_KEY:
-        goTo(mNumber + 1);
-        return true;
-    case DEVICE_DOWN_KEY:
-        setZone(Zone::Actions);
-        return true;
-    case DEVICE_SELECT_KEY:
-        if (mNumber > 0)
+    switch (command) {
+    case DetailCommand::Previous:
+        mWalk->goTo(number() - 1);
+        break;
+    case DetailCommand::Next:
+        mWalk->goTo(number() + 1);
+        break;
+    case DetailCommand::PageBack:
+        mWalk->goTo(std::max(1, number() - paging::pageSize));
+        break;
+    case DetailCommand::PageOn:
+        mWalk->goTo(std::min(total(), number() + paging::pageSize));
+        break;
+    case DetailCommand::FullScreen:
+        if (number() > 0)
             emit slideShow(recordIndex());
-        return true;
-    default:
-        return false;
-    }
-}
-
-bool PictureDetailWidget::handleActionKey(int key)
-{
-    switch (key) {
-    case DEVICE_LEFT_KEY:
-        mActions->move(-1);
-        return true;
-    case DEVICE_RIGHT_KEY:
-        mActions->move(1);
-        return true;
-    case DEVICE_UP_KEY:
+        break;
+    case DetailCommand::ToActions:
+        setZone(Zone::Actions);
+        break;
+    case DetailCommand::ToPhoto:
         setZone(Zone::Photo);
-        return true;
-    case DEVICE_DOWN_KEY:
-        return true;
-    case DEVICE_SELECT_KEY:
+        break;
+    case DetailCommand::ActionLeft:
+        mActions->move(-1);
+        break;
+    case DetailCommand::ActionRight:
+        mActions->move(1);
+        break;
+    case DetailCommand::RunAction:
         run(mActions->current());
-        return true;
-    default:
-        return false;
+        break;
+    case DetailCommand::Play:
+        run(DetailAction::Play);
+        break;
+    case DetailCommand::Back:
+        emit backSignal(recordIndex());
+        break;
+    case DetailCommand::Stay:
+    case DetailCommand::None:
+        break;
     }
 }
 
 void PictureDetailWidget::run(DetailAction action)
 {
-    if (mNumber == 0)
+    if (number() == 0)
         return;
     switch (action) {
     case DetailAction::Play:
@@ -329,13 +265,13 @@ void PictureDetailWidget::run(DetailAction action)
 // At once with the picture that is there; a sharper one follows.
 void PictureDetailWidget::openZoom()
 {
-    const QPixmap *whole = PhotoManager::getPhoto(mPhoto.imageUrl);
+    const QPixmap *whole = PhotoManager::getPhoto(photo().imageUrl);
     const QPixmap picture = whole ? *whole : mStage->picture();
     if (mStage->isWaiting() || picture.isNull() || !mStage->message().isEmpty())
         return;
-    mZoom->open(picture, mPhoto.size);
+    mZoom->open(picture, photo().size);
     const int width =
-        zoom::sourceWidth(mPhoto.size, mZoom->largestWidth(), SystemConfig::imageCacheSize() / 2);
+        zoom::sourceWidth(photo().size, mZoom->largestWidth(), SystemConfig::imageCacheSize() / 2);
     if (width > picture.width())
         mPictures->showSharper(mZoom, width);
     emit viewChanged();
@@ -367,7 +303,7 @@ void PictureDetailWidget::layOut()
     mStrip->setGeometry(0, above + kGap, std::max(1, width() - actions.width() - kGap), band);
     mActions->setGeometry(width() - actions.width(), above + kGap, actions.width(), band);
     mZoom->setGeometry(rect());
-    if (mNumber > 0 && isVisible())
+    if (number() > 0 && isVisible())
         showStrip();
 }
 
@@ -380,7 +316,7 @@ void PictureDetailWidget::resizeEvent(QResizeEvent *event)
 void PictureDetailWidget::showEvent(QShowEvent *event)
 {
     QWidget::showEvent(event);
-    if (mNumber > 0)
+    if (number() > 0)
         showPictures();
 }
 

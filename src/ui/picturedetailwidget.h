@@ -2,14 +2,15 @@
 
 #include "data/packageproperty.h"
 #include "network/errorcode.h"
-#include "ui/detaillist.h"
 #include "ui/detailnotes.h"
 #include "ui/detailphoto.h"
+#include "ui/detailwalk.h"
 
 #include <QPair>
 #include <QWidget>
 
 enum class DetailAction;
+enum class DetailCommand;
 class DetailActions;
 class DetailInformation;
 class DetailPictures;
@@ -20,7 +21,7 @@ class ZoomView;
 // The photo screen: one photo of a list as large as there is room, what is known about it, its
 // neighbours and what can be done with it.
 //
-//   showPhoto() -> DetailList -> DetailPhoto (a copy) -> thumbnail at once, then the large photo
+//   showPhoto() -> DetailWalk -> DetailPhoto (a copy) -> thumbnail at once, then the large photo
 //                                                     -> comments and tags, once the user stays
 //   left, right -> held: shown; else downloaded here, and shown when it has come
 //
@@ -42,14 +43,11 @@ public:
 
     // The photo shown: its number in the whole list from 1 (0: none), its index in the package held
     // now, and its data.
-    int number() const { return mNumber; }
-    int recordIndex() const { return mList.recordIndex(mNumber); }
-    int total() { return mList.total(); }
-    const DetailPhoto &photo() const { return mPhoto; }
+    int number() const { return mWalk->number(); }
+    int recordIndex() const { return mWalk->recordIndex(); }
+    int total() const { return mWalk->total(); } // photos of the whole list, as far as is known
+    const DetailPhoto &photo() const { return mWalk->photo(); }
     bool isSelfPhoto() const { return mIsSelfPhoto; }
-    // For the lists of comments and tags: what to ask the package manager for.
-    PackageProperty commentsProperty() const { return mPhoto.request(PHOTO_COMMENTS_LIST); }
-    PackageProperty tagsProperty() const { return mPhoto.request(PHOTO_TAGS_LIST); }
 
     // The keys that do something now, with what they do, for a bar of hints.
     QList<QPair<int, QString>> keyHints() const;
@@ -74,6 +72,8 @@ signals:
     void handleDetailPageChange(int startIndex, bool nextPage);
     void slidePlay(int recordIndex); // runs by itself
     void slideShow(int recordIndex); // stepped by hand
+    // Comments or tags have come, or did not, whoever asked for them.
+    void notesArrived(const PackageProperty &property, ErrorCode code);
     // Another photo, or another use of the keys.
     void viewChanged();
 
@@ -88,17 +88,13 @@ protected:
 private:
     enum class Zone { Photo, Actions };
 
-    void goTo(int number);
-    void display(int number, const DetailPhoto &photo);
-    void fetchList(int number);
-    void listArrived(const PackageProperty &property, ErrorCode code);
+    void connectWalk();
+    void display();
     void showPictures();
     void showStrip();
     void showInformation();
     void fetchNotes();
-    bool handleKey(int key);
-    bool handlePhotoKey(int key);
-    bool handleActionKey(int key);
+    void perform(DetailCommand command);
     void run(DetailAction action);
     void openZoom();
     void setZone(Zone zone);
@@ -107,13 +103,8 @@ private:
 
     static PictureDetailWidget *mWidgetInst;
 
-    DetailList mList;
-    DetailPhoto mPhoto;
+    DetailWalk *mWalk;
     DetailNotes mNotes;
-    QString mNextUrl; // the large photo that is likely to be wanted next
-    int mNumber = 0;
-    int mWanted = 0; // number of the photo that a download is to bring, 0: none
-    PackageProperty mRequest;
     bool mIsSelfPhoto = false;
     Zone mZone = Zone::Photo;
 

@@ -76,8 +76,8 @@ bool AlbumService::start()
     QFile::remove(ready);
     mProcess.setProcessChannelMode(QProcess::ForwardedChannels);
     mProcess.start(ORVALA_SERVICE_PROGRAM,
-                   {"serve", "--gathered", "none", "--data", mFolder.filePath("data"), "--port", QString::number(mPort),
-                    "--ready-file", ready, "--log-level", "error"});
+                   {"serve", "--gathered", "none", "--data", mFolder.filePath("data"), "--port",
+                    QString::number(mPort), "--ready-file", ready, "--log-level", "error"});
     QFile file(ready);
     const auto isReady = [&] {
         return file.exists() || mProcess.waitForFinished(0) ||

@@ -5,6 +5,7 @@
 #include "common/keyrobot.h"
 #include "common/ui/keyboardlayout.h"
 #include "common/ui/qpopupform.h"
+#include "common/ui/qtoastwidget.h"
 #include "data/packagemanager.h"
 #include "data/photomanager.h"
 #include "network/connection.h"
@@ -218,8 +219,14 @@ QString Television::position() const
 
 QString Television::failure() const
 {
-    const auto *page = mWindow->findChild<FailurePage *>();
-    return page && page->isVisible() ? page->reason() : QString();
+    const auto *page = shown<FailurePage>();
+    return page ? page->reason() : QString();
+}
+
+QString Television::toast() const
+{
+    const auto *toast = shown<QToastWidget>();
+    return toast ? toast->text().simplified() : QString();
 }
 
 QString Television::label(const QString &name) const

@@ -10,7 +10,6 @@
 #include <memory>
 
 class HomeWidget;
-class FailurePage;
 class PhotoItem;
 class QWebView;
 
@@ -42,7 +41,7 @@ public:
     QStringList accounts() const; // addresses, from above
     QWebView *page() const;       // the service's own page, when it is shown; else null
     MainWidget *window() const { return mWindow.get(); }
-    HomeWidget *home() const;     // null before the sign-in
+    HomeWidget *home() const; // null before the sign-in
     bool isLoading() const;
     QStringList captions() const; // of the cells on the screen
     // Every cell on the screen shows a picture whose middle has about the colour that the table has
@@ -51,6 +50,17 @@ public:
     QString position() const; // in the list, as "3/23"
     // The reason on the page for what did not load; empty when it is not shown.
     QString failure() const;
+    // The one of that class that is on the screen; null without.
+    template <typename Type>
+    Type *shown() const
+    {
+        for (Type *widget : mWindow->findChildren<Type *>()) {
+            if (widget->isVisible())
+                return widget;
+        }
+        return nullptr;
+    }
+    QString toast() const; // on one line; empty when none is shown
     // The text of a label of that name that is shown.
     QString label(const QString &name) const;
 

@@ -1,8 +1,13 @@
 #include "support/testservice.h"
 
+#include "base/secrets.h"
 #include "base/texts.h"
+#include "index/albumwriter.h"
 #include "index/catalogue.h"
+#include "index/photosearch.h"
 #include "index/remarks.h"
+#include "index/schema.h"
+#include "index/tokens.h"
 #include "index/users.h"
 
 #include <gtest/gtest.h>
@@ -165,6 +170,7 @@ TEST_F(Scan, unreadableFilesStayInTheirAlbumOnly)
     addPhoto("a/good.jpg");
     writeBytes(photo("a/bad.jpg"), "no picture");
     writeBytes(photo("a/empty.png"), "");
+    fs::create_directory_symlink("/", photo("b"));
     start();
     scan();
     EXPECT_EQ(featured(), Titles{"good"});
@@ -175,9 +181,12 @@ TEST_F(Scan, unreadableFilesStayInTheirAlbumOnly)
                   valueOf(entry, "title") == "good" ? 200 : 415);
     auto reader = database().read();
     const auto unreadable = unreadablePhotos(reader);
-    ASSERT_EQ(unreadable.size(), 2u);
-    EXPECT_EQ(unreadable[0].path, photo("a/bad.jpg"));
-    EXPECT_NE(unreadable[0].error, "");
+    ASSERT_EQ(unreadable.size(), 3u);
+    const char *const paths[] = {"a/bad.jpg", "a/empty.png", "b"};
+    for (std::size_t i = 0; i < unreadable.size(); ++i) {
+        EXPECT_EQ(unreadable[i].path, photo(paths[i]));
+        EXPECT_NE(unreadable[i].error, "");
+    }
 }
 
 TEST_F(Scan, oddNamesAreServed)
@@ -293,6 +302,43 @@ TEST_F(Scan, aUserComesAndGoes)
     EXPECT_EQ(titlesOf(publicFeed("/data/feed/api/all?q=two")), Titles{});
     EXPECT_FALSE(removeUser(database(), "ben@orvala.example"));
     EXPECT_TRUE(fs::exists(file("ben/two.jpg")));
+}
+
+// The oldest index that was in use: version 3.
+TEST_F(Scan, anOlderIndexIsUpgraded)
+{
+    fs::create_directories(file("old"));
+    writeBytes(file("old/index.db"), "");
+    std::string error;
+    {
+        Session session(file("old/index.db"), false);
+        ASSERT_TRUE(upgradeSchema(session, &error, 3)) << error;
+        session.database().exec(
+            "INSERT INTO users VALUES (1, 'anna@orvala.example', 'Anna', '/photos', 'hash');"
+            "INSERT INTO tokens VALUES ('" +
+            fingerprint("secret") +
+            "', 1, 1, 99999999999);"
+            "INSERT INTO albums VALUES (1, 1, 'a', 'Alps', 0, 1, '2012-03-01T10:00:00', 1);"
+            "INSERT INTO photos VALUES (1, 1, 'one.jpg', 'key', 9, 1330596000000000000, 1, '', "
+            "'image/jpeg', 4, 3, 'one', '', '2012-03-01T10:00:00', NULL, NULL, '', '');"
+            "INSERT INTO tags VALUES (1, 1, 'Z\u00FCrich', NULL);"
+            "INSERT INTO comments VALUES (1, 1, 1, 'Nice', '2012-03-02T10:00:00');"
+            "INSERT INTO featuredShown VALUES (1, '2026-05-01')");
+    }
+    const auto database = openIndex(file("old"), &error);
+    ASSERT_TRUE(database) << error;
+    auto reader = database->read();
+    EXPECT_EQ(userOfToken(reader, "secret").value_or(UserRecord()).id, 1);
+    EXPECT_EQ(commentsOf(reader, 1).size(), 1u);
+    for (const char *text : {"zurich alps", "march", "anna"})
+        EXPECT_EQ(searchPhotos(reader, text, {1, 9}).total, 1) << text;
+    const Gathering gathering{1, "2026-03-01"};
+    EXPECT_EQ(gatheredAlbums(reader, gathering).size(), 3u);
+    EXPECT_TRUE(isScanned(reader, 1));
+    FoundFile moved;
+    moved.size = 9;
+    moved.changed = 1330596000000000000;
+    EXPECT_EQ(photosLike(reader, 1, moved).size(), 1u);
 }
 
 TEST_F(Scan, aNewerIndexIsRefused)

@@ -79,8 +79,7 @@ private slots:
     void theListIsLost();
     void aPhotoIsDeleted();
     void staleLargePictures();
-    void picturesFail_data();
-    void picturesFail();
+    void aPictureIsLargerThanTheCache();
     void rushingAsksForFew();
     void commentsAndTags();
     void notesOfAnotherPhoto();
@@ -371,31 +370,13 @@ void TestPictureDetail::staleLargePictures()
     QVERIFY(stage()->picture().width() < stage()->picture().height());
 }
 
-void TestPictureDetail::picturesFail_data()
+void TestPictureDetail::aPictureIsLargerThanTheCache()
 {
-    QTest::addColumn<MisbehavingServer::Behaviour>("behaviour");
-    QTest::addColumn<int>("megabytes");
-    QTest::addColumn<int>("text");
-    QTest::newRow("deleted") << MisbehavingServer::answer("gone", 404) << 64
-                             << int(DetailTexts::PhotoGone);
-    QTest::newRow("no picture") << MisbehavingServer::html() << 64 << int(DetailTexts::PhotoFailed);
-    QTest::newRow("reset") << MisbehavingServer::reset() << 64 << int(DetailTexts::PhotoFailed);
-    QTest::newRow("larger than the cache")
-        << MisbehavingServer::answer(encoded(plain(1200, 1200), "PNG")) << 5
-        << int(DetailTexts::PhotoFailed);
-}
-
-void TestPictureDetail::picturesFail()
-{
-    QFETCH(MisbehavingServer::Behaviour, behaviour);
-    QFETCH(int, megabytes);
-    QFETCH(int, text);
-    mConfig->write("[Max]\nCacheSize=" + QByteArray::number(megabytes) +
-                   "\n[Service]\nFeedBase=" + mServer->url("").toUtf8());
+    mConfig->write("[Max]\nCacheSize=5\n[Service]\nFeedBase=" + mServer->url("").toUtf8());
     PhotoManager::init();
-    mServer->on("/p/s1180/1", behaviour);
+    mServer->on("/p/s1180/1", MisbehavingServer::answer(encoded(plain(1200, 1200), "PNG")));
     open(ALBUM_PHOTOS_LIST, 0);
-    QTRY_COMPARE(stage()->message(), DetailTexts::text(text));
+    QTRY_COMPARE(stage()->message(), DetailTexts::text(DetailTexts::PhotoFailed));
     QVERIFY(!stage()->isWaiting());
     press(DEVICE_DOWN_KEY);
     press(DEVICE_RIGHT_KEY);
@@ -442,7 +423,7 @@ void TestPictureDetail::commentsAndTags()
     const QString text = information();
     QVERIFY(text.contains("<b>older</b>"));
     QVERIFY(text.indexOf("newer < all") < text.indexOf("older"));
-    PackageProperty comments = mDetail->commentsProperty();
+    PackageProperty comments = mDetail->photo().request(PHOTO_COMMENTS_LIST);
     QVERIFY(PackageManager::getPackage(comments)); // for whoever lists them all
 
     mDetail->refreshNotes();
@@ -461,7 +442,7 @@ void TestPictureDetail::notesOfAnotherPhoto()
         held.answerFirst(MisbehavingServer::answer(sample::feed(late, 0)));
     // Comments that the service does not give.
     QTRY_VERIFY(information().contains(DetailTexts::text(DetailTexts::PhotoGone)));
-    PackageProperty first = mDetail->tagsProperty();
+    PackageProperty first = mDetail->photo().request(PHOTO_TAGS_LIST);
     first.mPhotoId = "1";
     QTRY_VERIFY(PackageManager::getPackage(first));
     QVERIFY(!information().contains("late tag"));

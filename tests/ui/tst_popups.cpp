@@ -59,8 +59,6 @@ private slots:
     void deletesATag();
     void tagsOfOthersAreOnlyShown();
     void postsAComment();
-    void keepsWhatWasRejected_data();
-    void keepsWhatWasRejected();
     void sendingCanBeGivenUp();
 
 private:
@@ -223,28 +221,6 @@ void TestPopups::postsAComment()
     QTRY_VERIFY(!keyboard);
     QTRY_COMPARE(shown<NoteList>()->count(), 1);
     QVERIFY(!shown<SendingNotice>());
-}
-
-void TestPopups::keepsWhatWasRejected_data()
-{
-    QTest::addColumn<MisbehavingServer::Behaviour>("behaviour");
-    QTest::addColumn<int>("prompt");
-    QTest::newRow("a page") << MisbehavingServer::html() << 6;
-    QTest::newRow("forbidden") << MisbehavingServer::answer("", 403) << 12;
-}
-
-void TestPopups::keepsWhatWasRejected()
-{
-    QFETCH(MisbehavingServer::Behaviour, behaviour);
-    answerNotes(behaviour);
-    open();
-    emit mDetail->addCommentSignal();
-    QVERIFY(shown<QPopUpForm>());
-    shown<QPopUpForm>()->handleInput("Nice");
-    QFETCH(int, prompt);
-    QCOMPARE(toast(), I18n::prompt(prompt));
-    QVERIFY(shown<QPopUpForm>());
-    QVERIFY(shown<QPopUpForm>()->isAncestorOf(QApplication::focusWidget()));
 }
 
 void TestPopups::sendingCanBeGivenUp()

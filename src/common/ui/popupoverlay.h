@@ -32,12 +32,12 @@ protected:
 
     // Who gets the focus when the overlay is shown; the overlay itself unless told otherwise.
     virtual QWidget *focusReceiver() { return this; }
+    bool isNested() const; // inside another overlay
 
 private:
     void cover();
     void takeFocus();
     void giveFocusBack();
-    bool isNested() const;
 
     QPointer<QWidget> mPanel;
     QPointer<QWidget> mFocusBefore;

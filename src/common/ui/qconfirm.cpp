@@ -106,7 +106,8 @@ void QConfirm::keyPressEvent(QKeyEvent *event)
         event->ignore();
         return;
     }
-    event->accept();
+    // The form that hosts the question, if one does, knows what Return means.
+    event->setAccepted(event->key() != DEVICE_RETURN_KEY || !isNested());
     if (event->key() == DEVICE_RIGHT_KEY)
         mPanel->focusButton(NoButton);
     else if (event->key() == DEVICE_LEFT_KEY)

@@ -20,7 +20,8 @@ public:
 
     explicit QConfirm(QWidget *parent = nullptr);
 
-    // Asks the question of the type; of any other there is none, and every key is passed on.
+    // Asks the question of the type; of any other there is none, and every key is passed on. The
+    // Return key does nothing, except that an overlay around this one gets it.
     void init(int type, QString text = QString());
 
 signals:

@@ -1,0 +1,355 @@
+#include "base/i18n.h"
+#include "common/ui/qkeyboardinput.h"
+#include "common/ui/qpopupform.h"
+#include "common/ui/remotekeys.h"
+#include "data/download.h"
+#include "data/packagemanager.h"
+#include "data/photomanager.h"
+#include "endtoend/relay.h"
+#include "endtoend/remotecase.h"
+#include "ui/detailaction.h"
+#include "ui/detailstage.h"
+#include "ui/detailtexts.h"
+#include "ui/homewidget.h"
+#include "ui/notelist.h"
+#include "ui/picturedetailwidget.h"
+#include "ui/screentexts.h"
+#include "ui/sendingnotice.h"
+#include "ui/upwidget.h"
+
+namespace {
+
+constexpr int photos = 12;
+
+using Behaviour = MisbehavingServer::Behaviour;
+using Request = MisbehavingServer::Request;
+
+struct Misbehaviour
+{
+    const char *name;
+    Behaviour behaviour;
+    int failure; // of a page, in ScreenTexts
+    int prompt;  // after a posting, in I18n
+};
+
+QList<Misbehaviour> misbehaviours()
+{
+    return {{"time-out", MisbehavingServer::silence(), ScreenTexts::PageTooSlow, 11},
+            {"401", MisbehavingServer::answer("{}", 401), ScreenTexts::PageRefused, 6},
+            {"404", MisbehavingServer::answer("{}", 404), ScreenTexts::PageNotFound, 12},
+            {"500", MisbehavingServer::answer("oops", 500), ScreenTexts::PageFailed, 6},
+            {"HTML", MisbehavingServer::html(), ScreenTexts::PageFailed, 6},
+            {"cut body", MisbehavingServer::cut("{\"feed\":{\"entry\":[{", 5000),
+             ScreenTexts::PageFailed, 6},
+            {"reset", MisbehavingServer::reset(), ScreenTexts::PageFailed, 6}};
+}
+
+} // namespace
+
+// Somebody in front of the whole program, behind a relay that spoils some of the service's answers.
+class TestBadService : public RemoteCase
+{
+    Q_OBJECT
+
+private slots:
+    void initTestCase();
+    void init();
+    void cleanup();
+    void cleanupTestCase() { switchOff(); }
+    void lists_data();
+    void lists();
+    void photo_data();
+    void photo();
+    void notes_data();
+    void notes();
+    void postings_data();
+    void postings();
+    void missingPictures();
+    void theServiceIsGone();
+
+private:
+    // Every request that begins with the method and has this in its address is answered like that.
+    void spoil(const Behaviour &behaviour, const QByteArray &method, const QByteArray &address);
+    void heal() { mRelay->otherwise(forwardTo(mService.port())); }
+    void forgetAll();
+    void openPhoto();
+    void run(DetailAction action);
+    void noToQuestion();
+
+    std::unique_ptr<MisbehavingServer> mRelay;
+};
+
+void TestBadService::initTestCase()
+{
+    addPhotos("anna/Sea", "Wave", photos - 2);
+    addPhotos("ben/Party", "Guest", 1);
+    addPhotos("carl/Town", "Square", 1);
+    addPeople();
+    QVERIFY(mService.start());
+    QVERIFY(mService.waitForPhotos(photos));
+}
+
+void TestBadService::init()
+{
+    if (mTv)
+        return;
+    mTv = std::make_unique<Television>();
+    mTv->set("Network/SilenceSeconds", 1);
+    mRelay = std::make_unique<MisbehavingServer>(MisbehavingServer::Tls);
+    heal();
+    signIn(mRelay->url({}));
+}
+
+// Where the next one begins.
+void TestBadService::cleanup()
+{
+    if (QTest::currentTestFailed()) {
+        mTv.reset();
+        return;
+    }
+    heal();
+    forgetAll();
+    mTv->press(DEVICE_RED_KEY);
+    QTRY_VERIFY(isListed(QStringLiteral("1/%1").arg(photos), 8));
+}
+
+void TestBadService::spoil(const Behaviour &behaviour, const QByteArray &method,
+                           const QByteArray &address)
+{
+    const Behaviour good = forwardTo(mService.port());
+    mRelay->otherwise([=](QTcpSocket *client, const Request &request) {
+        const bool isBad = request.method == method && request.path.contains(address);
+        (isBad ? behaviour : good)(client, request);
+    });
+}
+
+void TestBadService::forgetAll()
+{
+    PackageManager::clearAll();
+    PhotoManager::clearAll();
+}
+
+// After a page refused: not back to the accounts.
+void TestBadService::noToQuestion()
+{
+    if (mTv->focus() != QLatin1String("FailurePage"))
+        mTv->press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY});
+    QTRY_COMPARE(mTv->focus(), QStringLiteral("FailurePage"));
+}
+
+void TestBadService::lists_data()
+{
+    struct List
+    {
+        const char *name;
+        QList<int> entries; // of the menu; the cell with the focus is then opened
+        QByteArray address;
+        int cells;
+    };
+    const QList<List> lists{
+        {"featured", {UpWidget::HomeEntry}, "/featured", 8},
+        {"albums", {UpWidget::MyPhotosEntry}, "/user/default?", 1},
+        {"album", {UpWidget::MyPhotosEntry, DEVICE_SELECT_KEY}, "/albumid/", 8},
+        {"people", {UpWidget::FavoritesEntry}, "/contacts", 2},
+        {"person", {UpWidget::FavoritesEntry, DEVICE_SELECT_KEY}, "/api/user/2?", 1},
+        {"results", {UpWidget::SearchEntry}, "/api/all", 8}};
+    QTest::addColumn<Behaviour>("behaviour");
+    QTest::addColumn<int>("failure");
+    QTest::addColumn<QList<int>>("way");
+    QTest::addColumn<QByteArray>("address");
+    QTest::addColumn<int>("cells");
+    for (const List &list : lists) {
+        for (const Misbehaviour &bad : misbehaviours())
+            QTest::addRow("%s: %s", list.name, bad.name)
+                << bad.behaviour << bad.failure << list.entries << list.address << list.cells;
+    }
+}
+
+void TestBadService::lists()
+{
+    QFETCH(Behaviour, behaviour);
+    QFETCH(QByteArray, address);
+    QFETCH(QList<int>, way);
+    QFETCH(int, failure);
+    const auto open = [&] {
+        enter(way.first());
+        if (way.first() == UpWidget::SearchEntry) {
+            mTv->press(DEVICE_SELECT_KEY);
+            type("wave");
+            QTRY_VERIFY(!mTv->shown<QPopUpForm>());
+            mTv->press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY});
+        }
+        if (way.size() > 1) {
+            QTRY_VERIFY(!mTv->isLoading());
+            mTv->press(way.last());
+        }
+    };
+    forgetAll();
+    spoil(behaviour, "GET", address);
+    open();
+    QTRY_COMPARE(mTv->failure(), ScreenTexts::failure(failure));
+    noToQuestion();
+    mTv->press(DEVICE_SELECT_KEY); // in vain
+    QTRY_COMPARE(mTv->failure(), ScreenTexts::failure(failure));
+    noToQuestion();
+    mTv->press(DEVICE_RETURN_KEY); // to what can be had, or the menu
+    QTRY_VERIFY(!mTv->isLoading());
+    QVERIFY(!mTv->focus().isEmpty());
+
+    open();
+    QTRY_COMPARE(mTv->failure(), ScreenTexts::failure(failure));
+    noToQuestion();
+    heal();
+    mTv->press(DEVICE_SELECT_KEY);
+    QTRY_VERIFY(!mTv->isLoading());
+    QTEST(int(mTv->captions().size()), "cells");
+    QVERIFY(mTv->failure().isEmpty());
+}
+
+void TestBadService::openPhoto()
+{
+    mTv->press(DEVICE_SELECT_KEY);
+    QVERIFY(mTv->shown<DetailStage>());
+}
+
+void TestBadService::run(DetailAction action)
+{
+    mTv->press(DEVICE_DOWN_KEY);
+    const int place = detailActions(false).indexOf(action);
+    for (int i = 0; i < place; ++i)
+        mTv->press(DEVICE_RIGHT_KEY);
+    mTv->press(DEVICE_SELECT_KEY);
+}
+
+void TestBadService::photo_data()
+{
+    QTest::addColumn<Behaviour>("behaviour");
+    QTest::addColumn<int>("message");
+    for (const Misbehaviour &bad : misbehaviours())
+        QTest::newRow(bad.name) << bad.behaviour
+                                << int(bad.failure == ScreenTexts::PageNotFound
+                                           ? DetailTexts::PhotoGone
+                                           : DetailTexts::PhotoFailed);
+}
+
+void TestBadService::photo()
+{
+    QFETCH(Behaviour, behaviour);
+    QFETCH(int, message);
+    PhotoManager::clearAll();
+    spoil(behaviour, "GET", "/photos/");
+    openPhoto();
+    QTRY_COMPARE(mTv->shown<DetailStage>()->message(), DetailTexts::text(message));
+    heal();
+    mTv->press(DEVICE_RIGHT_KEY);
+    QTRY_VERIFY(!mTv->shown<DetailStage>()->picture().isNull());
+    mTv->press(DEVICE_LEFT_KEY); // it is asked for anew
+    QTRY_VERIFY(!mTv->shown<DetailStage>()->picture().isNull());
+    QVERIFY(mTv->shown<DetailStage>()->message().isEmpty());
+    mTv->press(DEVICE_RETURN_KEY);
+    QTRY_COMPARE(mTv->focus(), mTv->captions().value(0));
+}
+
+void TestBadService::notes_data()
+{
+    QTest::addColumn<Behaviour>("behaviour");
+    QTest::addColumn<int>("action");
+    for (const Misbehaviour &bad : misbehaviours()) {
+        QTest::addRow("comments: %s", bad.name) << bad.behaviour << int(DetailAction::AllComments);
+        QTest::addRow("tags: %s", bad.name) << bad.behaviour << int(DetailAction::TagList);
+    }
+}
+
+void TestBadService::notes()
+{
+    QFETCH(Behaviour, behaviour);
+    QFETCH(int, action);
+    spoil(behaviour, "GET", "/photoid/");
+    openPhoto();
+    run(DetailAction(action));
+    QVERIFY(mTv->shown<NoteList>());
+    QTRY_COMPARE(mTv->shown<NoteList>()->message(), ScreenTexts::failure(ScreenTexts::PageFailed));
+    heal();
+    mTv->press({DEVICE_RETURN_KEY, DEVICE_SELECT_KEY});
+    QTRY_COMPARE(mTv->shown<NoteList>()->message(),
+                 DetailAction(action) == DetailAction::TagList
+                     ? I18n::label(15)
+                     : ScreenTexts::question(ScreenTexts::NoComments));
+    mTv->press({DEVICE_RETURN_KEY, DEVICE_RETURN_KEY});
+    QTRY_COMPARE(mTv->focus(), mTv->captions().value(0));
+}
+
+void TestBadService::postings_data()
+{
+    QTest::addColumn<Behaviour>("behaviour");
+    QTest::addColumn<int>("prompt");
+    for (const Misbehaviour &bad : misbehaviours().mid(1)) // a time-out takes 40 s
+        QTest::newRow(bad.name) << bad.behaviour << bad.prompt;
+}
+
+// What was typed is kept until the service has taken it.
+void TestBadService::postings()
+{
+    QFETCH(Behaviour, behaviour);
+    const QString words = QString("after ") + QTest::currentDataTag();
+    spoil(behaviour, "POST", "/photoid/");
+    openPhoto();
+    run(DetailAction::AddComment);
+    type(words);
+    QFETCH(int, prompt);
+    QTRY_COMPARE(mTv->toast(), I18n::prompt(prompt));
+    QVERIFY(!mTv->shown<SendingNotice>());
+    QCOMPARE(mTv->shown<QKeyBoardInput>()->text(), words);
+    heal();
+    mTv->press(DEVICE_SELECT_KEY); // Enter has the focus still
+    QTRY_COMPARE(mTv->toast(), I18n::prompt(7));
+    QVERIFY(!mTv->shown<QKeyBoardInput>());
+    mTv->press(DEVICE_RETURN_KEY);
+    QTRY_COMPARE(mTv->focus(), mTv->captions().value(0));
+}
+
+void TestBadService::missingPictures()
+{
+    int broken = photos - 8; // all of the second page
+    mRelay->otherwise([&](QTcpSocket *client, const Request &request) {
+        const Behaviour bad = broken % 2 ? MisbehavingServer::answer("oops", 500)
+                                         : MisbehavingServer::answer("\xff\xd8\xff no photo");
+        const bool isBad = request.path.startsWith("/photos/") && broken > 0;
+        broken -= isBad;
+        (isBad ? bad : forwardTo(mService.port()))(client, request);
+    });
+    PhotoManager::clearAll();
+    mTv->press(DEVICE_PAGEDOWN_KEY);
+    QTRY_COMPARE(mTv->captions().size(), photos - 8);
+    QTRY_VERIFY(Download::mHomeLabelUrlHash.isEmpty());
+    QVERIFY(!mTv->showsColours(mColours));
+    // The keys go on working, and the pictures can be had again.
+    mTv->press({DEVICE_RIGHT_KEY, DEVICE_RIGHT_KEY});
+    QTRY_COMPARE(mTv->position(), QStringLiteral("11/%1").arg(photos));
+    for (int key : {DEVICE_PAGEUP_KEY, DEVICE_PAGEDOWN_KEY}) {
+        mTv->press(key);
+        QTRY_VERIFY(mTv->showsColours(mColours));
+    }
+}
+
+void TestBadService::theServiceIsGone()
+{
+    mTv.reset();
+    mTv = std::make_unique<Television>();
+    signIn(mService.url());
+    mService.kill();
+    enter(UpWidget::MyPhotosEntry);
+    QTRY_COMPARE(mTv->failure(), ScreenTexts::failure(ScreenTexts::NoConnection));
+    mTv->press(DEVICE_SELECT_KEY); // in vain
+    QTRY_COMPARE(mTv->failure(), ScreenTexts::failure(ScreenTexts::NoConnection));
+    QVERIFY(mService.start());
+    mTv->press(DEVICE_SELECT_KEY);
+    QTRY_COMPARE(mTv->captions().size(), 1);
+}
+
+int main(int argc, char *argv[])
+{
+    TestBadService test;
+    return RemoteCase::run(test, argc, argv);
+}
+#include "tst_badservice.moc"
