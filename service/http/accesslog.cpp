@@ -44,7 +44,9 @@ std::string withoutSecrets(const std::string &target)
         start = std::min(target.find_first_of("/?", picturePath.size()), target.size());
     }
     while (start < target.size()) {
-        const std::size_t end = std::min(target.find_first_of("?&", start), target.size());
+        // Behind the first "?" only "&" parts: a later "?" belongs to a value.
+        const char separator = start == 0 ? '?' : '&';
+        const std::size_t end = std::min(target.find(separator, start), target.size());
         const std::string_view part(target.data() + start, end - start);
         const std::size_t equals = part.find('=');
         if (equals != std::string_view::npos && isSecret(percentDecoded(part.substr(0, equals))))

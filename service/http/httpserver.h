@@ -22,7 +22,7 @@ public:
     {
         std::string address;
         int port = 0;               // 0: a free one
-        int threads = 64;          // requests at the same time; a quarter of them for one address
+        int threads = 64;           // requests at the same time; a quarter of them for one address
         SSL_CTX *context = nullptr; // no TLS without one
         // Whether something failed because there is no room on the disk.
         std::function<bool(const std::exception &)> isStorageFull;

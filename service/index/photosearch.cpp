@@ -41,20 +41,21 @@ std::string matchOf(const std::string &word, const char *ending, const Namesakes
 // MATCH expressions for photos that hold all words.
 struct Expressions
 {
-    std::string whole;
-    std::string begun; // those that hold one of them only as a beginning
+    std::string all;
+    std::string whole; // those that hold them whole
+    std::string rest;  // the others
 };
 
 Expressions expressionsOf(Session &session, const std::vector<std::string> &words)
 {
     const Namesakes users = usersByName(session);
-    std::string whole, begun;
+    std::string whole, all;
     for (const std::string &word : words) {
         const char *const joint = whole.empty() ? "" : " AND ";
         whole += joint + matchOf(word, "", users);
-        begun += joint + matchOf(word, " *", users);
+        all += joint + matchOf(word, " *", users);
     }
-    return {whole, "(" + begun + ") NOT (" + whole + ")"};
+    return {all, whole, "(" + all + ") NOT (" + whole + ")"};
 }
 
 std::int64_t countOf(Session &session, const std::string &expression)
@@ -110,11 +111,11 @@ FoundPhotos searchPhotos(Session &session, const std::string &text, const Page &
     words.resize(std::min(words.size(), mostWords));
     const Expressions expressions = expressionsOf(session, words);
     const std::int64_t whole = countOf(session, expressions.whole);
-    found.total = whole + countOf(session, expressions.begun);
+    found.total = countOf(session, expressions.all);
     if (page.start <= whole)
         addMatches(found, session, expressions.whole, page, 0);
     if (page.start - 1 + page.count > whole && found.total > whole)
-        addMatches(found, session, expressions.begun, page, whole);
+        addMatches(found, session, expressions.rest, page, whole);
     return found;
 }
 

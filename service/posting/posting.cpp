@@ -109,12 +109,36 @@ struct Upload
             entry.append(bytes);
     }
 
+    // False when the body has been cut or lacks a part.
+    bool readFrom(const Router::Body &body, const std::string &boundary)
+    {
+        MultipartReader reader(
+            boundary, [this](const std::string &type) { beginPart(type); },
+            [this](std::string_view bytes) { take(bytes); });
+        const bool isRead = body([&reader](std::string_view bytes) { reader.feed(bytes); });
+        return isRead && reader.isWhole() && !entry.empty() && hasPicture;
+    }
+
     enum class Part { Other, Entry, Picture };
     Part part = Part::Other;
     std::string entry;
     bool hasPicture = false;
     NewPhotoFile file;
 };
+
+// Nothing after a refusal.
+std::optional<AtomEntry> photoEntryIn(Asked &asked, const std::string &text)
+{
+    std::string error = "the entry is not that of a photo";
+    auto entry = text.size() <= longestEntry ? parseAtomEntry(text, &error) : std::nullopt;
+    if (entry && entry->kind == AtomEntry::Kind::Photo)
+        return entry;
+    if (text.size() > longestEntry)
+        asked.refuse(tooLarge, "the entry is too large");
+    else
+        asked.refuse(badRequest, error);
+    return std::nullopt;
+}
 
 void refuseFile(Asked &asked, NewPhotoFile::Problem problem)
 {
@@ -253,19 +277,11 @@ void Posting::postPhoto(Asked &asked)
     if (!liesWithin(asked.owner.photos, path))
         return asked.refuse(forbidden, "the album's folder is elsewhere");
     Upload upload(path);
-    MultipartReader reader(
-        boundary, [&upload](const std::string &type) { upload.beginPart(type); },
-        [&upload](std::string_view bytes) { upload.take(bytes); });
-    const bool isRead = asked.call.body([&reader](std::string_view bytes) { reader.feed(bytes); });
-    if (!isRead || !reader.isWhole() || upload.entry.empty() || !upload.hasPicture)
+    if (!upload.readFrom(asked.call.body, boundary))
         return asked.refuse(badRequest, "the body has been cut or lacks a part");
-    if (upload.entry.size() > longestEntry)
-        return asked.refuse(tooLarge, "the entry is too large");
-    std::string error;
-    const auto entry = parseAtomEntry(upload.entry, &error);
-    if (!entry || entry->kind != AtomEntry::Kind::Photo)
-        return asked.refuse(badRequest, entry ? "the entry is not that of a photo" : error);
-    storePhoto(asked, {album->userId, folder, album->title, album->isPrivate}, *entry, upload.file);
+    if (const auto entry = photoEntryIn(asked, upload.entry))
+        storePhoto(asked, {album->userId, folder, album->title, album->isPrivate}, *entry,
+                   upload.file);
 }
 
 void Posting::storePhoto(Asked &asked, const FolderState &album, const AtomEntry &entry,

@@ -2,8 +2,8 @@
 
 #include "base/i18n.h"
 #include "common/ui/picture.h"
-#include "ui/detailtexts.h"
 #include "common/ui/stretchedpicture.h"
+#include "ui/detailtexts.h"
 
 #include <QPainter>
 

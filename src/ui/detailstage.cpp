@@ -2,8 +2,8 @@
 
 #include "common/ui/picture.h"
 #include "common/ui/qprogressindicator.h"
-#include "common/ui/textfit.h"
 #include "common/ui/stretchedpicture.h"
+#include "common/ui/textfit.h"
 
 #include <QPainter>
 

@@ -115,7 +115,8 @@ private:
 
 QListWidgetItem *makeRow(Kind kind, const NoteList::Note &note)
 {
-    const int room = kWidth - kScrollBar - 2 * kPadding - (note.canDelete ? kDeleteWidth + kPadding : 0);
+    const int room =
+        kWidth - kScrollBar - 2 * kPadding - (note.canDelete ? kDeleteWidth + kPadding : 0);
     const QFontMetrics metrics(textFont());
     auto *row = new QListWidgetItem;
     row->setData(TextRole,

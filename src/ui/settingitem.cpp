@@ -152,9 +152,9 @@ void SettingItem::paintEvent(QPaintEvent *)
     if (!hasFocus())
         return;
     QPainter painter(this);
-    painter.drawPixmap(0, 0,
-                       stretchedPicture(QStringLiteral(":/res/Button_Normal.png"), size(),
-                                        kPictureBorder, this));
+    painter.drawPixmap(
+        0, 0,
+        stretchedPicture(QStringLiteral(":/res/Button_Normal.png"), size(), kPictureBorder, this));
     painter.setRenderHint(QPainter::Antialiasing);
     painter.setPen(QPen(QColor(0xf2, 0xf6, 0xf9), kFrame));
     const qreal inset = kFrame / 2;

@@ -24,8 +24,8 @@ struct SlideOptions
     bool loop = false;           // "Loop": after the last photo the first one follows
     bool wholeList = false;      // "WholeList": the feed's last pages are loaded as well
     bool skipUnreadable = false; // "SkipUnreadable": a photo that has failed takes no turn
-    bool returnToPhoto = false;    // "ReturnToPhoto": who leaves finds the photo shown last selected,
-                                   // in whatever order it came
+    bool returnToPhoto = false;  // "ReturnToPhoto": who leaves finds the photo shown last selected,
+                                 // in whatever order it came
     bool keysWhileLoading = false; // "KeysWhileLoading": keys answer while a page is on its way
 
     // As the configuration has it; values outside their range are moved into it.

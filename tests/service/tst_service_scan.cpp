@@ -107,7 +107,8 @@ TEST_F(Scan, movedFilesKeepWhatBelongsToThem)
     EXPECT_EQ(commentOf, expected);
     EXPECT_EQ(list["entry"].size(), 7u); // with the copy, which is a photo of its own
     EXPECT_EQ(albums(), (Titles{"a", "m", "new", "z"}));
-    for (const json &album : feed("/data/feed/api/user/default")["entry"])
+    const json own = feed("/data/feed/api/user/default");
+    for (const json &album : own["entry"])
         EXPECT_EQ(valueOf(album, "gphoto$numphotos"),
                   std::to_string(feed(pathOf(valueOf(album, "id")))["entry"].size()));
     EXPECT_EQ(titlesOf(publicFeed("/data/feed/api/all?q=new+one")), Titles{"one"});
