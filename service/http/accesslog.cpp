@@ -37,6 +37,7 @@ std::string printable(std::string text)
 
 std::string withoutSecrets(const std::string &target)
 {
+    const std::size_t query = target.find('?');
     std::string result;
     std::size_t start = 0;
     if (target.rfind(picturePath, 0) == 0) { // who knows the key sees the photo
@@ -45,7 +46,7 @@ std::string withoutSecrets(const std::string &target)
     }
     while (start < target.size()) {
         // Behind the first "?" only "&" parts: a later "?" belongs to a value.
-        const char separator = start == 0 ? '?' : '&';
+        const char separator = start <= query ? '?' : '&';
         const std::size_t end = std::min(target.find(separator, start), target.size());
         const std::string_view part(target.data() + start, end - start);
         const std::size_t equals = part.find('=');
