@@ -205,6 +205,47 @@ private slots:
         QCOMPARE(run("document.body.textContent").toString(), QString("Next"));
     }
 
+    // A page that would keep the browser busy fails, or goes on without the part that does so.
+    void busyPages_data()
+    {
+        QTest::addColumn<MisbehavingServer::Behaviour>("answer");
+        QTest::addColumn<bool>("loads");
+        const auto row = [](const char *name, const MisbehavingServer::Behaviour &answer,
+                            bool loads = false) { QTest::newRow(name) << answer << loads; };
+        const auto page = [](const QByteArray &html) {
+            return MisbehavingServer::answer(html, 200, {{"Content-Type", "text/html"}});
+        };
+        row("compressed zeros", MisbehavingServer::gzipBomb(2));
+        row("zeros", MisbehavingServer::answer(QByteArray(400000, '\0')));
+        row("endless", page(QByteArray(3000000, 'a')));
+        row("deeply nested", page(QByteArray("<div>").repeated(40000)));
+        row("slowly nested", MisbehavingServer::drip(QByteArray("<b>").repeated(6000), 900, 1));
+        row("thousands of fields", page(QByteArray("<input type=text>").repeated(4900)), true);
+        row("endless script", page("<script>for(;;);</script>"), true);
+        row("ordinary", page(kForm.toUtf8() + QByteArray("<p>word").repeated(4000)), true);
+    }
+
+    void busyPages()
+    {
+        QFETCH(MisbehavingServer::Behaviour, answer);
+        QFETCH(bool, loads);
+        MisbehavingServer server;
+        server.otherwise(answer);
+        OAuthView::LoginUrl = server.url("/ServiceLogin");
+        QSignalSpy finished(mView.get(), &QWebView::loadFinished);
+        QElapsedTimer time;
+        time.start();
+        mView->load(QUrl(server.url("/ServiceLogin")));
+        QTRY_VERIFY_WITH_TIMEOUT(!finished.isEmpty(), 20000);
+        QCOMPARE(finished.value(0).value(0).toBool(), loads);
+        QVERIFY2(time.elapsed() < 5000, qPrintable(QString::number(time.elapsed())));
+        // Nothing of it stays to be counted with the next page.
+        server.otherwise(MisbehavingServer::html());
+        mView->load(QUrl(server.url("/next")));
+        QTRY_COMPARE(finished.size(), 2);
+        QVERIFY(finished.value(1).value(0).toBool());
+    }
+
     void nothingLocal()
     {
         QTemporaryFile file;

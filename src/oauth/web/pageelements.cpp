@@ -23,6 +23,10 @@ const Selector kButtons[] = {{"*[type=submit]", "button[type=submit]"},
 const char *const kUseless[] = {"*[id=link-signup]", "*[id=link-forgot-passwd]",
                                 "*[class=remember]", "select[id=lang-chooser]"};
 
+// More than anybody steps through; the browser needs a millisecond for each, and again at every
+// key.
+constexpr int kMostElements = 300;
+
 const QString kOutlined =
     QStringLiteral("outline-style: solid;outline-width: 2px;outline-color: red;");
 
@@ -43,6 +47,8 @@ bool collect(const QWebElement &document, const Selector (&selectors)[count],
             logMissing(selector.name);
         for (const QWebElement &element : matches) {
             found = true;
+            if (elements->size() >= kMostElements)
+                break;
             // One that two selectors match would be two steps for the arrow keys.
             if (!elements->contains(element))
                 elements->append(element);

@@ -9,8 +9,8 @@ namespace pageelements {
 
 using List = QList<QWebElement>;
 
-// Append what is not in the list yet and tell whether there was any. Fields are made read-only:
-// text comes into them from the keyboard form alone.
+// Append what is not in the list yet, a few hundred at most, and tell whether there was any. Fields
+// are made read-only: text comes into them from the keyboard form alone.
 bool collectInputs(const QWebElement &document, List *elements);
 bool collectButtons(const QWebElement &document, List *elements);
 

@@ -1,5 +1,7 @@
 #include "oauth/web/trustedpage.h"
 
+#include "oauth/web/pagelimits.h"
+
 #include <QNetworkAccessManager>
 #include <QNetworkReply>
 #include <QNetworkRequest>
@@ -12,30 +14,58 @@ bool isWebAddress(const QUrl &url)
     return url.scheme() == QLatin1String("http") || url.scheme() == QLatin1String("https");
 }
 
-// Loads nothing from the device itself, wherever a page or a redirect points to.
+// Loads nothing from the device itself, wherever a page or a redirect points to, and nothing beyond
+// the limits.
 class WebOnlyManager : public QNetworkAccessManager
 {
 public:
-    using QNetworkAccessManager::QNetworkAccessManager;
+    WebOnlyManager(PageLimits *limits, QObject *parent)
+        : QNetworkAccessManager(parent)
+        , mLimits(limits)
+    {
+    }
 
 protected:
     QNetworkReply *createRequest(Operation operation, const QNetworkRequest &request,
                                  QIODevice *data) override
     {
         const QUrl url = request.url();
-        if (isWebAddress(url) || url.scheme() == QLatin1String("data"))
-            return QNetworkAccessManager::createRequest(operation, request, data);
+        if (url.scheme() == QLatin1String("data"))
+            return limited(QNetworkAccessManager::createRequest(operation, request, data));
         // One without an address fails in the ordinary way.
-        return QNetworkAccessManager::createRequest(GetOperation, QNetworkRequest(), nullptr);
+        if (!isWebAddress(url))
+            return QNetworkAccessManager::createRequest(GetOperation, QNetworkRequest(), nullptr);
+        QNetworkRequest plain(request);
+        plain.setRawHeader("Accept-Encoding", "identity"); // the toolkit inflates without a bound
+        return limited(QNetworkAccessManager::createRequest(operation, plain, data));
     }
+
+private:
+    QNetworkReply *limited(QNetworkReply *reply)
+    {
+        mLimits->watch(reply);
+        return reply;
+    }
+
+    PageLimits *mLimits;
 };
+
+// The engine asks nobody whether a script runs too long, whatever QWebPage says, and ends one only
+// when its environment told it so before it began: after this processor time, in milliseconds.
+QObject *withScriptsLimited(QObject *parent)
+{
+    qputenv("JSC_watchdog", "1000");
+    return parent;
+}
 
 } // namespace
 
 TrustedPage::TrustedPage(QObject *parent)
-    : QWebPage(parent)
+    : QWebPage(withScriptsLimited(parent))
 {
-    setNetworkAccessManager(new WebOnlyManager(this));
+    auto *limits = new PageLimits(this);
+    setNetworkAccessManager(new WebOnlyManager(limits, this));
+    connect(this, &QWebPage::loadStarted, limits, &PageLimits::startPage);
     restrict();
 }
 
