@@ -6,7 +6,6 @@
 #include "accountmanager/accounttexts.h"
 #include "accountmanager/loginpage.h"
 #include "accountmanager/managerwidget.h"
-#include "accountmanager/waitwidget.h"
 #include "common/ui/remotekeys.h"
 #include "oauth/signinplugin.h"
 #include "res/resources.h"
@@ -147,27 +146,6 @@ private slots:
         QVERIFY(wholeRowIsSeen());
     }
 
-    void signIn()
-    {
-        show(2);
-        QSignalSpy shown(mScreen.get(), &AccountManager::showNewWidget);
-        QSignalSpy finished(mScreen.get(), &AccountManager::loginFinished);
-        press({DEVICE_DOWN_KEY, DEVICE_SELECT_KEY});
-        QCOMPARE(finished.size(), 1);
-        QCOMPARE(AccountManagerHelper::getAccessToken(), QString("token"));
-        QCOMPARE(AccountManagerHelper::getUserName(), QString("Name"));
-        const OtherConnection other(mFile->path());
-        QCOMPARE(other.rows("SELECT usermail FROM orvala1 WHERE login='true'"), QStringList("1"));
-
-        // The main widget makes it one of its pages; it still ends with the account screen.
-        QCOMPARE(shown.size(), 1);
-        const QPointer<QWidget> wait = shown.first().first().value<QWidget *>();
-        QVERIFY(qobject_cast<WaitWidget *>(wait));
-        wait->setParent(nullptr);
-        mScreen.reset();
-        QTRY_VERIFY(!wait);
-    }
-
     void failedSignIn_data()
     {
         using Text = AccountTexts::Text;
@@ -272,17 +250,12 @@ private slots:
         }
     }
 
-    void newAndExit()
+    void noSignInPages()
     {
-        LogCapture log;
         show(0);
         SignInPlugin::setFile(mFile->path());
         press({DEVICE_SELECT_KEY});
         QCOMPARE(label("message"), AccountTexts::text(AccountTexts::SignInUnavailable));
-        press({DEVICE_RETURN_KEY});
-        QCOMPARE(log.lines().count("Return key has been Pressed"), 1);
-        press({DEVICE_DOWN_KEY, DEVICE_SELECT_KEY});
-        QCOMPARE(log.lines().count("Return key has been Pressed"), 2);
     }
 
     void unreadableAccounts()
