@@ -198,17 +198,6 @@ TEST_F(Http, slowClientsCostNobodyElse)
     EXPECT_LT(Clock::now() - start, std::chrono::seconds(1));
 }
 
-TEST_F(Http, aClientThatStopsHalfWayDoesNotHoldTheEnd)
-{
-    start();
-    RawClient client(service().port());
-    client.send("POST /o/oauth2/token HTTP/1.1\r\nHost: x\r\nContent-Length: 100\r\n\r\nhalf");
-    EXPECT_EQ(statusOf("/data/feed/api/featured"), 200);
-    const auto start = Clock::now();
-    stop();
-    EXPECT_LT(Clock::now() - start, std::chrono::seconds(1));
-}
-
 TEST_F(Http, manyClientsAtOnce)
 {
     addPhoto("one.jpg");

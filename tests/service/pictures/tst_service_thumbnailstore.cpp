@@ -49,19 +49,6 @@ TEST_F(ThumbnailStoreTest, MakesTheWidthAskedForAndNeverEnlarges)
     EXPECT_EQ(store.picture(photo, "a", 0).bytes, readWholeFile(photo));
 }
 
-TEST_F(ThumbnailStoreTest, MakesJpegOfEveryFormat)
-{
-    ThumbnailStore store(cache, plenty);
-    for (const char *format : {"png", "gif", "webp", "heic"}) {
-        const std::string path = folder.file(std::string("picture.") + format);
-        writePicture(path, 120, 80);
-        const auto result = store.picture(path, format, 60);
-        EXPECT_EQ(result.error, "") << format;
-        EXPECT_EQ(result.mimeType, "image/jpeg");
-        EXPECT_EQ(decode(result.bytes).width, 60) << format;
-    }
-}
-
 TEST_F(ThumbnailStoreTest, KeepsWhatItMadeAndMakesAgainWhatWasDamaged)
 {
     writePicture(photo, 120, 80);
