@@ -100,10 +100,10 @@ protected:
         SystemConfig::setConfigFile(config.fileName());
     }
 
-    void start(SignInCase *service, const QByteArray &seconds = "20")
+    void start(const SignInCase &service = {}, const QByteArray &seconds = "20")
     {
         mServer = std::make_unique<Server>();
-        service->playOn(mServer.get());
+        service.playOn(mServer.get());
         configure(seconds);
         mScreen = std::make_unique<Screen>();
         mScreen->chooseNew();
