@@ -2,7 +2,6 @@
 #include "data/htmlentities.h"
 #include "data/publishedtime.h"
 #include "platform/devicestate.h"
-#include "support/logcapture.h"
 #include "testconfig.h"
 
 #include <QtTest>

@@ -130,94 +130,74 @@ class TestLinks : public QObject
     Q_OBJECT
 
 private slots:
-    void initTestCase();
-    void init();
-    void cleanup();
-    void tellsOfBothEndsOfACable();
-    void tellsOfEveryFlap();
-    void tellsOfInterfacesThatComeAndGo();
-    void recoversFromLostNotices();
-};
-
-void TestLinks::initTestCase()
-{
-    QVERIFY2(hasOwnNetwork, "this test needs the right to make a network namespace");
-    addCable("first", "firstEnd");
-    addCable("second", "secondEnd");
-}
-
-void TestLinks::init()
-{
-    QCOMPARE(i4_reg_network_notify_cb(nullptr), 0);
-    const std::lock_guard<std::mutex> lock(callsMutex);
-    allCalls.clear();
-    QCOMPARE(i4_reg_network_notify_cb(note), 0);
-}
-
-void TestLinks::cleanup()
-{
-    QElapsedTimer timer;
-    timer.start();
-    QCOMPARE(i4_reg_network_notify_cb(nullptr), 0);
-    QVERIFY(timer.elapsed() < 500);
-}
-
-void TestLinks::tellsOfBothEndsOfACable()
-{
-    const QList<bool> out = {false};
-    const QList<bool> outAndIn = {false, true};
-    setUp("firstEnd", false);
-    QTRY_COMPARE(carriersOf("first"), out);
-    QCOMPARE(carriersOf("firstEnd"), out);
-    setUp("firstEnd", true);
-    QTRY_COMPARE(carriersOf("first"), outAndIn);
-    QTRY_COMPARE(carriersOf("firstEnd"), outAndIn);
-    QCOMPARE(calls().size(), 4);
-}
-
-void TestLinks::tellsOfEveryFlap()
-{
-    for (int i = 0; i < 50; ++i) {
-        setUp("first", false);
-        setUp("first", true);
-        setUp("lo", i % 2 == 0);
+    void initTestCase()
+    {
+        QVERIFY2(hasOwnNetwork, "this test needs the right to make a network namespace");
+        addCable("first", "firstEnd");
+        addCable("second", "secondEnd");
     }
-    QTRY_COMPARE(carriersOf("first").size(), 100);
-    QVERIFY(carriersOf("lo").isEmpty());
-    QCOMPARE(carriersOf("first").first(), false);
-    QVERIFY(alternates(carriersOf("first")));
-    // The kernel may merge what the other end sees, but it ends where it began.
-    QTRY_VERIFY(carriersOf("firstEnd").isEmpty() || carriersOf("firstEnd").last());
-    QVERIFY(alternates(carriersOf("firstEnd")));
-}
 
-void TestLinks::tellsOfInterfacesThatComeAndGo()
-{
-    addCable("visitor", "visitorEnd");
-    QTRY_COMPARE(carriersOf("visitor"), QList<bool>({true}));
-    QTRY_COMPARE(carriersOf("visitorEnd"), QList<bool>({true}));
-    QVERIFY(ip(QStringLiteral("link del visitor")));
-    QTRY_COMPARE(carriersOf("visitor"), QList<bool>({true, false}));
-    QTRY_COMPARE(carriersOf("visitorEnd"), QList<bool>({true, false}));
-}
+    void init()
+    {
+        QCOMPARE(i4_reg_network_notify_cb(nullptr), 0);
+        const std::lock_guard<std::mutex> lock(callsMutex);
+        allCalls.clear();
+        QCOMPARE(i4_reg_network_notify_cb(note), 0);
+    }
 
-void TestLinks::recoversFromLostNotices()
-{
-    gateClosed = true;
-    setUp("second", false);
-    QTRY_VERIFY(!calls().isEmpty());
-    // The thread stands still: more notices than its socket can hold, the last ones of interest.
-    for (int i = 0; i < 3000; ++i)
-        setMtu("first", 1400 + i % 2);
-    setUp("first", false);
-    setUp("second", true);
-    gateClosed = false;
-    gate.release();
-    QTRY_COMPARE(carriersOf("first"), QList<bool>({false}));
-    QTRY_COMPARE(carriersOf("second"), QList<bool>({false, true}));
-    setUp("first", true);
-    QTRY_COMPARE(carriersOf("first"), QList<bool>({false, true}));
-}
+    void cleanup()
+    {
+        QElapsedTimer timer;
+        timer.start();
+        QCOMPARE(i4_reg_network_notify_cb(nullptr), 0);
+        QVERIFY(timer.elapsed() < 500);
+    }
+
+    void tellsOfEveryFlap()
+    {
+        for (int i = 0; i < 50; ++i) {
+            setUp("first", false);
+            setUp("first", true);
+            setUp("lo", i % 2 == 0);
+        }
+        QTRY_COMPARE(carriersOf("first").size(), 100);
+        QVERIFY(carriersOf("lo").isEmpty());
+        QCOMPARE(carriersOf("first").first(), false);
+        QVERIFY(alternates(carriersOf("first")));
+        // The kernel may merge what the other end sees, but it ends where it began.
+        QTRY_VERIFY(carriersOf("firstEnd").isEmpty() || carriersOf("firstEnd").last());
+        QVERIFY(alternates(carriersOf("firstEnd")));
+    }
+
+    void tellsOfInterfacesThatComeAndGo()
+    {
+        addCable("visitor", "visitorEnd");
+        QTRY_COMPARE(carriersOf("visitor"), QList<bool>({true}));
+        QTRY_COMPARE(carriersOf("visitorEnd"), QList<bool>({true}));
+        QVERIFY(ip(QStringLiteral("link del visitor")));
+        QTRY_COMPARE(carriersOf("visitor"), QList<bool>({true, false}));
+        QTRY_COMPARE(carriersOf("visitorEnd"), QList<bool>({true, false}));
+    }
+
+    void recoversFromLostNotices()
+    {
+        gateClosed = true;
+        setUp("second", false);
+        QTRY_VERIFY(!calls().isEmpty());
+        // The thread stands still: more notices than its socket can hold, the last ones of
+        // interest.
+        for (int i = 0; i < 3000; ++i)
+            setMtu("first", 1400 + i % 2);
+        setUp("first", false);
+        setUp("second", true);
+        gateClosed = false;
+        gate.release();
+        QTRY_COMPARE(carriersOf("first"), QList<bool>({false}));
+        QTRY_COMPARE(carriersOf("second"), QList<bool>({false, true}));
+        setUp("first", true);
+        QTRY_COMPARE(carriersOf("first"), QList<bool>({false, true}));
+    }
+};
 
 int main(int argc, char *argv[])
 {
