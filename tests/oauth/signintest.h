@@ -122,14 +122,6 @@ protected:
         QTRY_VERIFY(LogCapture::contains("documentStringList.at(0)=Anna & Ole"));
         mScreen->press(DEVICE_SELECT_KEY);
     }
-    QByteArray bodyOf(const QByteArray &path) const
-    {
-        for (const Server::Request &request : mServer->requests()) {
-            if (request.path == path && request.method == "POST")
-                return request.body;
-        }
-        return QByteArray();
-    }
     QStringList rows() const
     {
         return OtherConnection(mFile->path())

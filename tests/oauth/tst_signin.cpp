@@ -6,21 +6,6 @@ class TestSignIn : public SignInTest
     Q_OBJECT
 
 private slots:
-    void allowed()
-    {
-        start();
-        QSignalSpy finished(&mScreen->accounts, &AccountManager::loginFinished);
-        signIn();
-        allow();
-        QTRY_COMPARE(finished.size(), 1);
-        QCOMPARE(bodyOf("/ServiceLogin"),
-                 QByteArray("mail=anna%40home.example&pw=s3%27%5C%22%3C%2Fscript%3E"));
-        QVERIFY(bodyOf("/o/oauth2/token").startsWith("code=4/ab&client_id="));
-        QCOMPARE(rows(), QStringList(kMail + " 7305 Anna & Ole at rt true"));
-        QCOMPARE(Helper::getAccessToken(), QString("at"));
-        QCOMPARE(Helper::getExpires(), 3600);
-    }
-
     // An account with a code of its own gets the new tokens and is asked for the code, or, where
     // codes are not offered, stays signed out without a word.
     void anotherCode_data()

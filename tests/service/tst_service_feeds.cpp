@@ -108,32 +108,6 @@ TEST_F(Feeds, pagesKeepToTheirLimits)
     }
 }
 
-TEST_F(Feeds, commentsAndTagsOfAPhoto)
-{
-    const std::string text = "a < b & \"c\" <br /> \xF0\x9F\x98\x80";
-    const json document = {
-        {"comments",
-         {{{"photo", "Summer/one.jpg"},
-           {"author", "ben@orvala.example"},
-           {"text", text},
-           {"published", "2012-03-01T10:00:00.000Z"}}}},
-        {"tags",
-         {{{"photo", "Summer/one.jpg"}, {"author", "ben@orvala.example"}, {"tag", "good boy"}}}}};
-    ASSERT_TRUE(import(document));
-    ASSERT_TRUE(import(document)); // changes nothing
-    const json comments = feed(photoPath(0) + "?kind=comment");
-    ASSERT_EQ(comments["entry"].size(), 1u);
-    const json comment = comments["entry"][0];
-    EXPECT_EQ(valueOf(comment, "content"), text);
-    EXPECT_EQ(valueOf(comment, "published"), "2012-03-01T10:00:00.000Z");
-    EXPECT_EQ(valueOf(comment["author"][0], "gphoto$nickname"), "Ben");
-    EXPECT_EQ(photoPath(0), "/data/feed/api/user/1/albumid/" + valueOf(comment, "gphoto$albumid") +
-                                "/photoid/" + valueOf(comment, "gphoto$photoid"));
-    EXPECT_EQ(titlesOf(feed(photoPath(0) + "?kind=tag")), (Titles{"Dogs", "good boy"}));
-    EXPECT_EQ(valueOf(album()["entry"][0], "gphoto$commentCount"), "1");
-    EXPECT_EQ(titlesOf(publicFeed(std::string(base) + "/all?q=boy")), (Titles{"one"}));
-}
-
 TEST_F(Feeds, addressesFollowTheHostThatWasAsked)
 {
     const std::string local = "http://127.0.0.1:" + std::to_string(service().port());

@@ -259,14 +259,6 @@ TEST_F(Program, commandsWorkBesideTheService)
 
 TEST_F(Program, mistakesAreExplained)
 {
-    for (const char *arguments :
-         {"user remove nobody@orvala.example", "user token nobody@orvala.example",
-          "user add nomail --name X", "user add a@b --name X --photos nowhere-at-all",
-          "import nowhere.json"}) {
-        const Output output = run(std::string(arguments) + " --data " + data());
-        EXPECT_EQ(output.status, 1) << arguments;
-        EXPECT_EQ(output.text.rfind("orvala-service: ", 0), 0u) << output.text;
-    }
     writeBytes(mFolder.file("file"), "no folder, no index");
     fs::create_directories(mFolder.file("broken/index.db"));
     for (const std::string &arguments :
@@ -276,7 +268,6 @@ TEST_F(Program, mistakesAreExplained)
         EXPECT_EQ(output.status, 1) << arguments;
         EXPECT_NE(output.text.find(": "), std::string::npos) << output.text;
     }
-    EXPECT_NE(run("serve --port 70000").status, 0);
     writeBytes(mFolder.file("settings"), "[serve]\nport = 70000\n");
     EXPECT_NE(run("--config " + mFolder.file("settings") + " serve").status, 0);
 }

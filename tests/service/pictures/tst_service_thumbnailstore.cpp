@@ -1,4 +1,5 @@
 #include "picturefiles.h"
+#include "pictures/photometadata.h"
 #include "pictures/thumbnailstore.h"
 #include "pictures/wholefile.h"
 
@@ -35,6 +36,11 @@ TEST_F(ThumbnailStoreTest, TurnsEveryOrientationUpright)
             EXPECT_EQ(shown.height, width ? 40 : 80) << orientation;
             EXPECT_EQ(shown.quarters, upright[orientation - 1]) << orientation << " at " << width;
             EXPECT_FALSE(shown.hasMetadata && width) << orientation;
+            const auto metadata = readPhotoMetadata(photo, nullptr);
+            ASSERT_TRUE(metadata) << orientation;
+            EXPECT_EQ(metadata->orientation, orientation);
+            EXPECT_EQ(metadata->width, 120) << orientation;
+            EXPECT_EQ(metadata->height, 80) << orientation;
         }
 }
 
