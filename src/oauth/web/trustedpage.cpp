@@ -50,18 +50,10 @@ private:
     PageLimits *mLimits;
 };
 
-// The engine asks nobody whether a script runs too long, whatever QWebPage says, and ends one only
-// when its environment told it so before it began: after this processor time, in milliseconds.
-QObject *withScriptsLimited(QObject *parent)
-{
-    qputenv("JSC_watchdog", "1000");
-    return parent;
-}
-
 } // namespace
 
 TrustedPage::TrustedPage(QObject *parent)
-    : QWebPage(withScriptsLimited(parent))
+    : QWebPage(parent)
 {
     auto *limits = new PageLimits(this);
     setNetworkAccessManager(new WebOnlyManager(limits, this));

@@ -3,9 +3,9 @@
 #include <QWebPage>
 
 // A web page that shows nothing but the service's pages: http and https only, no local files, no
-// plug-ins, no Java, no windows or dialogs of its own, nothing kept when it is gone. What would
-// hold up the program is broken off: replies beyond PageLimits, and scripts that run for a second.
-// The engine has no security support any more: load only addresses that are trusted.
+// plug-ins, no Java, no windows or dialogs of its own, nothing beyond PageLimits, nothing kept when
+// it is gone. The engine has no security support any more, and a script that never ends holds up
+// the program: load only addresses that are trusted.
 class TrustedPage : public QWebPage
 {
     Q_OBJECT
@@ -13,7 +13,7 @@ class TrustedPage : public QWebPage
 public:
     explicit TrustedPage(QObject *parent = nullptr);
 
-    // Else it would be a question to the user.
+    // Else it would be a question to the user. The engine of today never asks it.
     bool shouldInterruptJavaScript() override { return true; }
 
 protected:
