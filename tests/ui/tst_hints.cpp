@@ -121,8 +121,8 @@ void TestHints::theMenusMarkIsNotColourAlone()
 void TestHints::longNamesAreCut()
 {
     UpWidget menu;
-    menu.setUserName("<b>Al</b>");
-    QCOMPARE(menu.shownUserName(), QString("<b>Al</b>"));
+    menu.setUserName("<b>Al</b>\nB");
+    QCOMPARE(menu.shownUserName(), QString("<b>Al</b> B"));
     menu.setUserName(QString(100000, 'W'));
     QVERIFY(menu.shownUserName().size() < 40);
 }
