@@ -5,8 +5,6 @@
 #include "accountmanager/accountswidget.h"
 #include "accountmanager/accounttexts.h"
 #include "accountmanager/loginpage.h"
-#include "accountmanager/managerwidget.h"
-#include "accountmanager/waitwidget.h"
 #include "common/ui/remotekeys.h"
 #include "oauth/signinplugin.h"
 #include "res/resources.h"
@@ -53,14 +51,6 @@ class TestAccountScreens : public QObject
     std::unique_ptr<AccountFile> mFile;
     std::unique_ptr<AccountManager> mScreen;
 
-    // Whether the accounts may have codes of their own.
-    void offerCodes(bool offers)
-    {
-        QSettings config(mFile->folder() + "/config.ini", QSettings::IniFormat);
-        config.setValue("Accounts/ProtectionCodes", offers);
-        config.sync();
-        SystemConfig::setConfigFile(config.fileName());
-    }
     // Stores accounts "0", "1", ..., the one with that number used last, and shows the screen.
     void show(int accounts, int last = 0)
     {
@@ -147,27 +137,6 @@ private slots:
         QVERIFY(wholeRowIsSeen());
     }
 
-    void signIn()
-    {
-        show(2);
-        QSignalSpy shown(mScreen.get(), &AccountManager::showNewWidget);
-        QSignalSpy finished(mScreen.get(), &AccountManager::loginFinished);
-        press({DEVICE_DOWN_KEY, DEVICE_SELECT_KEY});
-        QCOMPARE(finished.size(), 1);
-        QCOMPARE(AccountManagerHelper::getAccessToken(), QString("token"));
-        QCOMPARE(AccountManagerHelper::getUserName(), QString("Name"));
-        const OtherConnection other(mFile->path());
-        QCOMPARE(other.rows("SELECT usermail FROM orvala1 WHERE login='true'"), QStringList("1"));
-
-        // The main widget makes it one of its pages; it still ends with the account screen.
-        QCOMPARE(shown.size(), 1);
-        const QPointer<QWidget> wait = shown.first().first().value<QWidget *>();
-        QVERIFY(qobject_cast<WaitWidget *>(wait));
-        wait->setParent(nullptr);
-        mScreen.reset();
-        QTRY_VERIFY(!wait);
-    }
-
     void failedSignIn_data()
     {
         using Text = AccountTexts::Text;
@@ -207,7 +176,6 @@ private slots:
         QTest::addColumn<QStringList>("left");
         QTest::addColumn<QString>("focused");
         const QStringList all{"0", "1", "2"};
-        QTest::newRow("asked") << 3 << Keys{right, select} << all << "";
         QTest::newRow("yes") << 3 << Keys{right, select, select} << QStringList{"1", "2"} << "1";
         QTest::newRow("no") << 3 << Keys{right, select, right, select} << all << "0-";
         QTest::newRow("Return") << 3 << Keys{right, select, DEVICE_RETURN_KEY} << all << "0-";
@@ -240,49 +208,24 @@ private slots:
         QCOMPARE(focus(), QString("0"));
     }
 
-    // An account with a code of its own is asked for it where codes are offered, and only there.
-    void protectionCodes_data()
+    // Where codes are not offered, an account with a code of its own is not asked for it.
+    void codesAreNotOffered()
     {
-        QTest::addColumn<bool>("offered");
-        QTest::addColumn<QString>("pin");
-        QTest::addColumn<bool>("asked");
-        QTest::newRow("not offered") << false << "1234" << false;
-        QTest::newRow("its own") << true << "1234" << true;
-        QTest::newRow("none") << true << "7305" << false;
-    }
-
-    void protectionCodes()
-    {
-        QFETCH(bool, offered);
-        QFETCH(bool, asked);
-        QFETCH(QString, pin);
-        offerCodes(offered);
         show(1);
-        OtherConnection(mFile->path()).rows("UPDATE orvala1 SET password='" + pin + '\'');
+        OtherConnection(mFile->path()).rows("UPDATE orvala1 SET password='1234'");
         QSignalSpy finished(mScreen.get(), &AccountManager::loginFinished);
         press({DEVICE_RIGHT_KEY, DEVICE_RIGHT_KEY, DEVICE_DOWN_KEY});
-        QCOMPARE(focus(), QString(offered ? "Login ID" : "Exit"));
+        QCOMPARE(focus(), QString("Exit"));
         press({DEVICE_LEFT_KEY, DEVICE_LEFT_KEY, DEVICE_SELECT_KEY});
-        QCOMPARE(finished.size(), asked ? 0 : 1);
-        const auto *form = mScreen->findChild<ManagerWidget *>();
-        QCOMPARE(form && form->isVisible() && form->isOldUser(), asked);
-        if (asked) {
-            press({DEVICE_RETURN_KEY});
-            QCOMPARE(focus(), QString("0"));
-        }
+        QCOMPARE(finished.size(), 1);
     }
 
-    void newAndExit()
+    void noSignInPages()
     {
-        LogCapture log;
         show(0);
         SignInPlugin::setFile(mFile->path());
         press({DEVICE_SELECT_KEY});
         QCOMPARE(label("message"), AccountTexts::text(AccountTexts::SignInUnavailable));
-        press({DEVICE_RETURN_KEY});
-        QCOMPARE(log.lines().count("Return key has been Pressed"), 1);
-        press({DEVICE_DOWN_KEY, DEVICE_SELECT_KEY});
-        QCOMPARE(log.lines().count("Return key has been Pressed"), 2);
     }
 
     void unreadableAccounts()

@@ -85,24 +85,6 @@ private slots:
     }
     void cleanup() { mForm.reset(); }
 
-    void newAccount()
-    {
-        QSignalSpy started(mForm.get(), &ManagerWidget::oauthStarted);
-        enterLoginId("neworvalauser");
-        QCOMPARE(mForm->findChild<UserNameLineEdit *>()->text(), QString("neworval"));
-        QCOMPARE(tip(), I18n::login(7));
-        enterPin("4711");
-        QCOMPARE(tip(), I18n::login(9));
-        checkStartedOver();
-        enterPin("4712");
-        QCOMPARE(tip(), I18n::login(10));
-        checkStartedOver();
-        enterPin("4711");
-        QCOMPARE(started.size(), 1);
-        QCOMPARE(mForm->name(), QString("neworval"));
-        QCOMPARE(mForm->password(), QString("4711"));
-    }
-
     // A stored account proves its PIN first, also when the form was about to sign one in.
     void existingAccount()
     {
@@ -159,18 +141,6 @@ private slots:
         QVERIFY(robot.type("7"));
         robot.press(EnterKey);
         QCOMPARE(box->digit(), QString("7"));
-    }
-
-    void wayOut()
-    {
-        QSignalSpy canceled(mForm.get(), &ManagerWidget::canceled);
-        press(DEVICE_RETURN_KEY);
-        press(DEVICE_DOWN_KEY);
-        press(DEVICE_RETURN_KEY);
-        press(DEVICE_DOWN_KEY); // Next is not to be had yet
-        QCOMPARE(QApplication::focusWidget(), button("Cancel"));
-        press(DEVICE_SELECT_KEY);
-        QCOMPARE(canceled.size(), 3);
     }
 
     void unreadable()

@@ -12,12 +12,10 @@
 #include <QLabel>
 #include <QSettings>
 #include <QSignalSpy>
-#include <QStackedWidget>
 #include <QTemporaryDir>
 #include <QTest>
 #include <QTimer>
 
-#include <atomic>
 #include <memory>
 #include <thread>
 
@@ -40,8 +38,6 @@ bool press(QObject *receiver, int key)
     return QCoreApplication::sendEvent(receiver, &event);
 }
 
-int requests = 0; // exits that the platform granted
-
 } // namespace
 
 class TestApp : public QObject
@@ -52,10 +48,7 @@ private slots:
     void initTestCase();
     void init();
     void cleanup();
-    void takesTheExitKeyOut();
     void routesKeysToTheDialog();
-    void seesAKeyOfAWindowOnce();
-    void addsAPageOnce();
     void leavesOnlyForTheShell();
     void tellsOfTheCable();
     void replacesTheStatusDialog();
@@ -76,37 +69,18 @@ void TestApp::initTestCase()
     SystemConfig::mScreen_Width = 1280;
     SystemConfig::mScreen_Height = 720;
     netcommon::Ipc::setSocketPath(mFolder.filePath("no-shell").toStdString());
-    connect(netcommon::IpcThread::getInstance(), &netcommon::IpcThread::signalExit, this,
-            [] { ++requests; });
-    netcommon::IpcThread::getInstance()->start();
 }
 
 void TestApp::init()
 {
     mMain = std::make_unique<MainWidget>();
-    // Not told to leave by itself here: a test says when.
-    disconnect(netcommon::IpcThread::getInstance(), nullptr, mMain.get(), nullptr);
     mMain->resize(1280, 720);
     mMain->show();
-    requests = 0;
 }
 
 void TestApp::cleanup()
 {
     mMain.reset();
-}
-
-void TestApp::takesTheExitKeyOut()
-{
-    KeyWidget receiver, dialog;
-    QVERIFY(press(&receiver, DEVICE_EXIT_KEY));
-    QTRY_COMPARE(requests, 1);
-    MainApplication::setDialog(&dialog, true);
-    QVERIFY(press(&receiver, DEVICE_EXIT_KEY));
-    MainApplication::setDialog(nullptr, false);
-    QTRY_COMPARE(requests, 2);
-    QVERIFY(receiver.keys.isEmpty());
-    QVERIFY(dialog.keys.isEmpty());
 }
 
 void TestApp::routesKeysToTheDialog()
@@ -121,31 +95,6 @@ void TestApp::routesKeysToTheDialog()
     press(&receiver, DEVICE_RIGHT_KEY);
     QCOMPARE(dialog->keys, QList<int>({DEVICE_DOWN_KEY, DEVICE_LEFT_KEY}));
     QCOMPARE(receiver.keys, QList<int>({DEVICE_UP_KEY, DEVICE_RIGHT_KEY}));
-}
-
-void TestApp::seesAKeyOfAWindowOnce()
-{
-    KeyWidget window;
-    window.show();
-    QVERIFY(QTest::qWaitForWindowActive(&window));
-    const LogCapture log;
-    QTest::keyPress(window.windowHandle(), Qt::Key(DEVICE_UP_KEY));
-    QTRY_COMPARE(window.keys, QList<int>({DEVICE_UP_KEY}));
-    QCOMPARE(log.lines().count("MainApplication: keyEvent->key()=1000013"), 1);
-    QCOMPARE(log.lines().count("MainApplication: DEVICE_EXIT_KEY=1020001"), 1);
-}
-
-void TestApp::addsAPageOnce()
-{
-    auto *stack = mMain->findChild<QStackedWidget *>();
-    QCOMPARE(stack->count(), 1);
-    auto *page = new QWidget;
-    mMain->switchWidget(page);
-    QCOMPARE(stack->currentWidget(), page);
-    mMain->switchWidget(stack->widget(0));
-    mMain->switchWidget(page);
-    QCOMPARE(stack->currentWidget(), page);
-    QCOMPARE(stack->count(), 2);
 }
 
 void TestApp::leavesOnlyForTheShell()

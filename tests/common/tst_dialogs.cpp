@@ -4,11 +4,9 @@
 #include "common/ui/qconfirm.h"
 #include "common/ui/qpopupdialog.h"
 #include "common/ui/qpopupform.h"
-#include "common/ui/qpopuplist.h"
 #include "common/ui/qtoastwidget.h"
 #include "network/systemconfig.h"
 #include "res/resources.h"
-#include "support/logcapture.h"
 
 #include <QLabel>
 #include <QPushButton>
@@ -71,53 +69,6 @@ private slots:
         QCOMPARE(no.size(), 1);
     }
 
-    void messageButtons_data()
-    {
-        QTest::addColumn<QStringList>("buttons");
-        QTest::addColumn<int>("accepts");
-        QTest::addColumn<int>("rejects");
-        QTest::newRow("none") << QStringList() << 0 << 0;
-        QTest::newRow("one") << QStringList{"Close"} << 3 << 0;
-        QTest::newRow("two") << QStringList{"Yes", "No"} << 1 << 2;
-        QTest::newRow("three") << QStringList{"1", "2", "3"} << 0 << 0;
-    }
-
-    void messageButtons()
-    {
-        QFETCH(QStringList, buttons);
-        QPopupDialog dialog;
-        QSignalSpy accepted(&dialog, &QPopupDialog::accepted);
-        QSignalSpy rejected(&dialog, &QPopupDialog::rejected);
-        dialog.initDialog("Title", "Message", buttons);
-        for (int key : {DEVICE_LEFT_KEY, DEVICE_SELECT_KEY, DEVICE_RIGHT_KEY, DEVICE_RIGHT_KEY,
-                        DEVICE_SELECT_KEY, DEVICE_RETURN_KEY})
-            pressKey(&dialog, key);
-        QTEST(accepted.size(), "accepts");
-        QTEST(rejected.size(), "rejects");
-    }
-
-    void noSuchQuestion()
-    {
-        QConfirm question;
-        QSignalSpy yes(&question, &QConfirm::clickConfirm);
-        question.init(4, QStringLiteral("x"));
-        QKeyEvent select(QEvent::KeyPress, DEVICE_SELECT_KEY, Qt::NoModifier);
-        QApplication::sendEvent(&question, &select);
-        QVERIFY(!select.isAccepted());
-        QVERIFY(yes.isEmpty());
-    }
-
-    void longTagIsCut()
-    {
-        QConfirm question;
-        question.init(QConfirm::DeleteTag, longText(QStringLiteral("seaside ")));
-        const QLabel *message = question.findChildren<QLabel *>().at(1);
-        QVERIFY(message->text().endsWith(QChar(0x2026)));
-        const QString line = message->text().replace(QLatin1Char('\n'), QString());
-        const int width = message->fontMetrics().horizontalAdvance(line);
-        QVERIFY2(width <= 998 && width > 900, qPrintable(QString::number(width)));
-    }
-
     void textsStayInside_data()
     {
         QTest::addColumn<QString>("text");
@@ -141,10 +92,12 @@ private slots:
         dialog.show();
         QCOMPARE(dialog.size(), screen.size());
         QVERIFY(isInside(&dialog));
-        QConfirm question(&screen);
-        question.init(QConfirm::SignOut);
-        question.show();
-        QVERIFY(isInside(&question));
+        for (int asked : {QConfirm::SignOut, QConfirm::DeleteTag}) {
+            QConfirm question(&screen);
+            question.init(asked, text);
+            question.show();
+            QVERIFY(isInside(&question));
+        }
         QToastWidget toast(&screen);
         toast.showText(text);
         QCOMPARE(toast.height(), 240);
@@ -199,17 +152,6 @@ private slots:
                 robot.remote(key);
             QVERIFY(!form);
         }
-    }
-
-    void wrongForms()
-    {
-        LogCapture log;
-        QPopUpForm form;
-        form.initForm(99);
-        form.initForm(QPopUpForm::POPUP_FORM_TAG_LIST);
-        form.initForm(QPopUpForm::POPUP_FORM_CONFIRM, new QPopUpList);
-        QCOMPARE(LogCapture::lines().count(QStringLiteral("Wrong QPopUpForm::initForm()")), 3);
-        QVERIFY(form.findChildren<QWidget *>().isEmpty());
     }
 };
 

@@ -4,6 +4,7 @@
 #include "res/resources.h"
 
 #include <QPushButton>
+#include <QSet>
 #include <QSignalSpy>
 #include <QTest>
 
@@ -54,6 +55,36 @@ private slots:
         QCOMPARE(finished.first().first().toString(), text);
         QTRY_COMPARE(robot.box()->toPlainText().count(QLatin1Char('*')),
                      isPassword ? text.size() : 0);
+    }
+
+    void everyCharacterCanBeTyped()
+    {
+        QSet<QString> texts;
+        for (int key = 0; key < kKeyCount; ++key) {
+            for (int page = 0; page < kPageCount; ++page)
+                texts << keyText(KeyboardPage(page), key);
+        }
+        QString wanted = QStringLiteral("0123456789+ ,._@*:;?!#$%&`()-/<=>[]\\^'{}|~\"");
+        for (char letter = 'a'; letter <= 'z'; ++letter)
+            wanted += QLatin1Char(letter) + QString(QLatin1Char(letter)).toUpper();
+        wanted += QStringLiteral(u"äöüßéèàçñøåÄÖÜÉ");
+        for (QChar character : wanted)
+            QVERIFY2(texts.contains(character), qPrintable(QString(character)));
+        for (const char *text : {":)", ":(", ":D", "www.", ".com"})
+            QVERIFY2(texts.contains(QString::fromLatin1(text)), text);
+    }
+
+    // Sideways around the row, up and down to the nearest key there is.
+    void arrowsStayOnTheKeyboard()
+    {
+        for (int key = 0; key < kKeyCount; ++key) {
+            QCOMPARE(movedKeyFocus(movedKeyFocus(key, Qt::Key_Left), Qt::Key_Right), key);
+            const int up = movedKeyFocus(key, Qt::Key_Up);
+            const int down = movedKeyFocus(key, Qt::Key_Down);
+            QVERIFY(up >= 0 && up <= key && down >= key && down < kKeyCount);
+            QVERIFY(qAbs(movedKeyFocus(up, Qt::Key_Down) - key) <= 1 || up == key);
+            QVERIFY(qAbs(movedKeyFocus(down, Qt::Key_Up) - key) <= 1 || down == key);
+        }
     }
 
     void functionKeys()

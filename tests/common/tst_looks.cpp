@@ -10,35 +10,12 @@
 #include <QTemporaryFile>
 #include <QTest>
 
-#include <cmath>
-
 // The pictures and the scale at which they are shown.
 class tst_Looks : public QObject
 {
     Q_OBJECT
 
     static QString path(const QString &name) { return QStringLiteral(":/res/%1.png").arg(name); }
-
-    static qreal luminance(const QColor &colour)
-    {
-        const auto linear = [](qreal part) { return std::pow((part + 0.055) / 1.055, 2.4); };
-        return 0.2126 * linear(colour.redF()) + 0.7152 * linear(colour.greenF()) +
-               0.0722 * linear(colour.blueF());
-    }
-    // The least contrast of a colour with what is within the frame of a picture.
-    static qreal contrast(const QImage &image, const QColor &colour)
-    {
-        qreal worst = 21;
-        int top = 6;
-        while (image.pixelColor(image.width() / 2, top - 6).alpha() < 255)
-            ++top;
-        for (int y = top; y < image.height() - top; ++y) {
-            const qreal one = luminance(image.pixelColor(image.width() / 2, y)) + 0.05;
-            const qreal other = luminance(colour) + 0.05;
-            worst = qMin(worst, qMax(one, other) / qMin(one, other));
-        }
-        return worst;
-    }
 
 private slots:
     void initTestCase() { initResources(); }
@@ -55,29 +32,6 @@ private slots:
             while (found.hasNext())
                 QVERIFY2(!QImage(found.next().captured()).isNull(), qPrintable(file.fileName()));
         }
-    }
-
-    // The style sheets fix these text colours; the frame of a focused one is told by brightness.
-    void textAndFocusStandOut_data()
-    {
-        QTest::addColumn<QColor>("colour");
-        for (const char *name : {"PopUpMenu_Title_Bg", "PopUpMenu_Content_Bg", "Button_Normal",
-                                 "Button_Focus", "InputBox_Normal", "InputBox_Focus", "FocusBar",
-                                 "KeyBoard_Bg_Normal", "KeyBoard_Bg_Focus", "orvala_background"})
-            QTest::newRow(name) << QColor(Qt::white);
-        for (const char *name : {"ToastWin_Bg", "TopBarBg_Selected"})
-            QTest::newRow(name) << QColor(Qt::black);
-        QTest::newRow("TopBarBg_Focus") << QColor("green");
-        QTest::newRow("SignOut_Bg") << QColor(7, 99, 170);
-    }
-    void textAndFocusStandOut()
-    {
-        QFETCH(QColor, colour);
-        const QString name = QString::fromLatin1(QTest::currentDataTag());
-        const QImage image(path(name));
-        QVERIFY(contrast(image, colour) >= 4.5);
-        if (name.contains(QLatin1String("Focus")) && !name.startsWith(QLatin1String("TopBar")))
-            QVERIFY(contrast(image, image.pixelColor(1, image.height() / 2)) >= 3);
     }
 
     void scaleFactors()

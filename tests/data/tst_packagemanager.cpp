@@ -136,20 +136,6 @@ private slots:
         QVERIFY(!PackageManager::getPackage(third));
     }
 
-    void replacesFurtherSearchPages()
-    {
-        mServer->on("/data/feed/api/all", MisbehavingServer::answer(feedOf(5)));
-        for (int start : {101, 201, 201}) {
-            PackageProperty property = ofType(SEARCH_MORE_PHOTOS_LIST, start);
-            QVERIFY(PackageManager::downloadPage(property, &store));
-            const int before = answers.size();
-            QTRY_COMPARE(answers.size(), before + 1);
-            QCOMPARE(answers.last().property.mTotalCount, 100);
-            QVERIFY(PackageManager::getPackage(property));
-            QCOMPARE(PackageManager::getPackage(property)->count(), 5);
-        }
-    }
-
     void dropsStaleFirstPagesOnly()
     {
         PackageProperty property = albumsOf("u"), later = property;

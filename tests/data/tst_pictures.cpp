@@ -54,20 +54,6 @@ class TestPictures : public QObject
     Q_OBJECT
 
 private slots:
-    void decodesEveryFormat()
-    {
-        for (const char *format : {"png", "jpg", "bmp"}) {
-            const auto picture = decode(encoded(plain(40, 30), format));
-            QVERIFY2(picture && picture->size() == QSize(40, 30), format);
-            QVERIFY(picture->toImage().pixelColor(20, 15).red() > 250);
-        }
-        const QByteArray gif = QByteArray::fromHex( // 1 x 1, two frames
-            "47494638396101000100800000ff0000ffffff2c00000000010001000002024401002c0000000001000100"
-            "000202440100"
-            "3b");
-        QCOMPARE(decode(gif)->toImage().pixelColor(0, 0), QColor(Qt::red));
-    }
-
     void refusesWhatIsNoPicture_data()
     {
         QTest::addColumn<QByteArray>("data");

@@ -1,5 +1,6 @@
 #include "base/i18n.h"
 #include "common/ui/qkeyboardinput.h"
+#include "common/ui/qpopupdialog.h"
 #include "common/ui/qpopupform.h"
 #include "common/ui/remotekeys.h"
 #include "data/download.h"
@@ -16,6 +17,8 @@
 #include "ui/screentexts.h"
 #include "ui/sendingnotice.h"
 #include "ui/upwidget.h"
+
+#include <QTimer>
 
 namespace {
 
@@ -64,6 +67,8 @@ private slots:
     void notes();
     void postings_data();
     void postings();
+    void sendingIsGivenUp();
+    void deletionIsRefused();
     void missingPictures();
     void theServiceIsGone();
 
@@ -275,6 +280,9 @@ void TestBadService::notes()
                  DetailAction(action) == DetailAction::TagList
                      ? I18n::label(15)
                      : ScreenTexts::question(ScreenTexts::NoComments));
+    if (DetailAction(action) == DetailAction::TagList)
+        mTv->press({DEVICE_DOWN_KEY, DEVICE_SELECT_KEY}); // the photo's owner alone adds one
+    QVERIFY(!mTv->shown<QKeyBoardInput>());
     mTv->press({DEVICE_RETURN_KEY, DEVICE_RETURN_KEY});
     QTRY_COMPARE(mTv->focus(), mTv->captions().value(0));
 }
@@ -305,6 +313,47 @@ void TestBadService::postings()
     QTRY_COMPARE(mTv->toast(), I18n::prompt(7));
     QVERIFY(!mTv->shown<QKeyBoardInput>());
     mTv->press(DEVICE_RETURN_KEY);
+    QTRY_COMPARE(mTv->focus(), mTv->captions().value(0));
+}
+
+void TestBadService::sendingIsGivenUp()
+{
+    spoil(MisbehavingServer::silence(), "POST", "/photoid/");
+    openPhoto();
+    run(DetailAction::AddComment);
+    QTimer poll;
+    connect(&poll, &QTimer::timeout, this, [this] {
+        if (mTv->shown<SendingNotice>())
+            mTv->press({DEVICE_SELECT_KEY, DEVICE_RETURN_KEY});
+    });
+    poll.start(1);
+    type("never");
+    poll.stop();
+    QVERIFY(!mTv->shown<SendingNotice>());
+    QCOMPARE(mTv->shown<QKeyBoardInput>()->text(), QStringLiteral("never"));
+    mTv->press({DEVICE_RETURN_KEY, DEVICE_RETURN_KEY});
+    QTRY_COMPARE(mTv->focus(), mTv->captions().value(0));
+}
+
+// Of a comment that the service says to have deleted, and goes on listing.
+void TestBadService::deletionIsRefused()
+{
+    openPhoto();
+    run(DetailAction::AddComment);
+    type("here to stay");
+    QTRY_VERIFY(!mTv->shown<QKeyBoardInput>());
+    mTv->press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY});
+    QVERIFY(mTv->shown<NoteList>());
+    QTRY_VERIFY(mTv->shown<NoteList>()->count() > 0);
+    const int count = mTv->shown<NoteList>()->count();
+    spoil(MisbehavingServer::answer({}), "DELETE", "/photoid/");
+    mTv->press({DEVICE_DOWN_KEY, DEVICE_SELECT_KEY, DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY}); // no
+    QVERIFY(!mTv->shown<QPopupDialog>());
+    QVERIFY(mRelay->requests().last().method != "DELETE");
+    mTv->press({DEVICE_SELECT_KEY, DEVICE_SELECT_KEY});
+    QTRY_COMPARE(mTv->toast(), ScreenTexts::question(ScreenTexts::CommentNotDeleted));
+    QCOMPARE(mTv->shown<NoteList>()->count(), count);
+    mTv->press({DEVICE_RETURN_KEY, DEVICE_RETURN_KEY});
     QTRY_COMPARE(mTv->focus(), mTv->captions().value(0));
 }
 

@@ -188,6 +188,9 @@ void TestSignInPages::aCodeGuardsAnAccount()
     QVERIFY(mTv->type("anna"));
     enterCode("4711");
     QCOMPARE(mTv->label("tip"), I18n::login(9));
+    enterCode("4712");
+    QCOMPARE(mTv->label("tip"), I18n::login(10));
+    QVERIFY(!mTv->page());
     enterCode("4711");
     SignInVisit visit(mTv.get());
     QVERIFY(visit.isOpen());

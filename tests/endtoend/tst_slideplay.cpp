@@ -80,8 +80,7 @@ void TestSlidePlay::cleanup()
 
 void TestSlidePlay::signIn()
 {
-    mTv->set("Service/FeedBase", mService.url());
-    mTv->set("Service/OAuthBase", mService.url() + "/o/oauth2/");
+    mTv->useService(mService.url());
     QVERIFY(mTv->addAccount(anna, "Anna", mService.tokens(anna)));
     QVERIFY(mTv->switchOn());
     QTRY_COMPARE(mTv->focus(), anna);
@@ -89,27 +88,17 @@ void TestSlidePlay::signIn()
     QTRY_COMPARE(mTv->captions().size(), 8);
 }
 
-void TestSlidePlay::enter(int entry)
-{
-    for (int row = 0; row < 3 && mTv->menuEntry() < 0; ++row)
-        mTv->press(DEVICE_UP_KEY);
-    for (int i = mTv->menuEntry(); i < entry; ++i)
-        mTv->press(DEVICE_RIGHT_KEY);
-    QCOMPARE(mTv->menuEntry(), entry);
-    mTv->press(DEVICE_SELECT_KEY);
-}
-
 void TestSlidePlay::open(From origin, const QString &words)
 {
     if (origin == From::Album) {
-        enter(UpWidget::MyPhotosEntry);
+        QVERIFY(mTv->enter(UpWidget::MyPhotosEntry));
         QTRY_COMPARE(mTv->captions().size(), 2);
         mTv->press(DEVICE_DOWN_KEY);
         if (!mTv->focus().startsWith(words))
             mTv->press(DEVICE_RIGHT_KEY);
         mTv->press(DEVICE_SELECT_KEY);
     } else if (origin == From::Search) {
-        enter(UpWidget::SearchEntry);
+        QVERIFY(mTv->enter(UpWidget::SearchEntry));
         mTv->press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY});
         mTv->window()->findChild<QPopUpForm *>()->handleInput(words);
         QTRY_VERIFY(!mTv->window()->findChild<QPopUpForm *>());

@@ -62,7 +62,6 @@ private:
     QByteArray commentsOnService() const;
 
     QString mAlbum;
-    QString mCommentsUrl;
 };
 
 void TestTour::initTestCase()

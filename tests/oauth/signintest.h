@@ -100,10 +100,10 @@ protected:
         SystemConfig::setConfigFile(config.fileName());
     }
 
-    void start(SignInCase *service, const QByteArray &seconds = "20")
+    void start(const SignInCase &service = {}, const QByteArray &seconds = "20")
     {
         mServer = std::make_unique<Server>();
-        service->playOn(mServer.get());
+        service.playOn(mServer.get());
         configure(seconds);
         mScreen = std::make_unique<Screen>();
         mScreen->chooseNew();
@@ -121,14 +121,6 @@ protected:
     {
         QTRY_VERIFY(LogCapture::contains("documentStringList.at(0)=Anna & Ole"));
         mScreen->press(DEVICE_SELECT_KEY);
-    }
-    QByteArray bodyOf(const QByteArray &path) const
-    {
-        for (const Server::Request &request : mServer->requests()) {
-            if (request.path == path && request.method == "POST")
-                return request.body;
-        }
-        return QByteArray();
     }
     QStringList rows() const
     {

@@ -6,22 +6,6 @@ class TestSignIn : public SignInTest
     Q_OBJECT
 
 private slots:
-    void allowed()
-    {
-        SignInCase service;
-        start(&service);
-        QSignalSpy finished(&mScreen->accounts, &AccountManager::loginFinished);
-        signIn();
-        allow();
-        QTRY_COMPARE(finished.size(), 1);
-        QCOMPARE(bodyOf("/ServiceLogin"),
-                 QByteArray("mail=anna%40home.example&pw=s3%27%5C%22%3C%2Fscript%3E"));
-        QVERIFY(bodyOf("/o/oauth2/token").startsWith("code=4/ab&client_id="));
-        QCOMPARE(rows(), QStringList(kMail + " 7305 Anna & Ole at rt true"));
-        QCOMPARE(Helper::getAccessToken(), QString("at"));
-        QCOMPARE(Helper::getExpires(), 3600);
-    }
-
     // An account with a code of its own gets the new tokens and is asked for the code, or, where
     // codes are not offered, stays signed out without a word.
     void anotherCode_data()
@@ -40,8 +24,7 @@ private slots:
         }
         QSettings(mFile->folder() + "/config.ini", QSettings::IniFormat)
             .setValue("Accounts/ProtectionCodes", offered);
-        SignInCase service;
-        start(&service);
+        start();
         QSignalSpy finished(&mScreen->accounts, &AccountManager::loginFinished);
         signIn();
         allow();
@@ -58,51 +41,30 @@ private slots:
     // Return leads back from every step, to a list on which New works again.
     void canceled_data()
     {
-        struct NeverLoads : SignInCase
-        {
-            Server::Behaviour authorisation() override { return Server::silence(); }
-        };
-        struct Empty : SignInCase
-        {
-            Server::Behaviour signInPage() override { return page(""); }
-        };
-        struct Foreign : SignInCase
-        {
-            Server::Behaviour authorisation() override { return page("<p>Out of order", 500); }
-        };
-        struct Huge : SignInCase
-        {
-            Server::Behaviour signInPage() override
-            {
-                return page("<form>" + QByteArray("<input type=text>").repeated(200));
-            }
-        };
-        struct Dialogs : SignInCase
-        {
-            Server::Behaviour signInPage() override
-            {
-                return page("<script>alert(1);confirm(2);prompt(3);print();open('/x');"
-                            "location='file:///etc/passwd'</script><input type=text>");
-            }
-        };
-        QTest::addColumn<std::shared_ptr<SignInCase>>("service");
+        QTest::addColumn<SignInStep>("step");
+        QTest::addColumn<Server::Behaviour>("answer");
         QTest::addColumn<bool>("shows");
-        const auto row = [](const char *name, SignInCase *service, bool shows) {
-            QTest::newRow(name) << std::shared_ptr<SignInCase>(service) << shows;
+        const auto row = [](const char *name, const Server::Behaviour &answer) {
+            QTest::newRow(name) << &SignInCase::signInPage << answer << true;
         };
-        row("never loads", new NeverLoads, false);
-        row("empty page", new Empty, true);
-        row("another page", new Foreign, true);
-        row("200 fields", new Huge, true);
-        row("dialogs and files", new Dialogs, true);
-        row("expected page", new SignInCase, true);
+        QTest::newRow("never loads") << &SignInCase::authorisation << Server::silence() << false;
+        row("empty page", SignInCase::page(""));
+        row("200 fields",
+            SignInCase::page("<form>" + QByteArray("<input type=text>").repeated(200)));
+        row("dialogs and files",
+            SignInCase::page("<script>alert(1);confirm(2);prompt(3);print();open('/x');"
+                             "location='file:///etc/passwd'</script><input type=text>"));
+        row("expected page", SignInCase().signInPage);
     }
 
     void canceled()
     {
-        QFETCH(std::shared_ptr<SignInCase>, service);
+        QFETCH(SignInStep, step);
+        QFETCH(Server::Behaviour, answer);
         QFETCH(bool, shows);
-        start(service.get());
+        SignInCase service;
+        service.*step = answer;
+        start(service);
         if (shows)
             QTRY_VERIFY(mScreen->isPageShown());
         else // the ring turns and the program waits
@@ -113,8 +75,7 @@ private slots:
         QVERIFY(LogCapture::contains("handleAthorizeCancel invoked!"));
         const auto *button = qobject_cast<QAbstractButton *>(QApplication::focusWidget());
         QCOMPARE(button ? button->text() : QString(), QString("New"));
-        SignInCase good;
-        good.playOn(mServer.get());
+        SignInCase().playOn(mServer.get());
         mScreen->chooseNew();
         QTRY_VERIFY(mScreen->isPageShown());
         mScreen->press(DEVICE_SELECT_KEY);

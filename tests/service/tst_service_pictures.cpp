@@ -68,16 +68,6 @@ TEST_F(Pictures, areNotSentAgainWhileTheyAreTheSame)
     EXPECT_EQ(decode(get(mAddress)->body).width, 64);
 }
 
-TEST_F(Pictures, headTellsWhatGetWouldSend)
-{
-    httplib::Client client("127.0.0.1", service().port());
-    const auto head = client.Head(sized("s24"));
-    ASSERT_EQ(head->status, 200);
-    EXPECT_EQ(head->body, "");
-    EXPECT_EQ(head->get_header_value("Content-Length"),
-              std::to_string(get(sized("s24"))->body.size()));
-}
-
 TEST_F(Pictures, aFileThatVanishedIsNotFound)
 {
     std::filesystem::remove(photo("one.jpg"));

@@ -16,14 +16,6 @@ const char base[] = "/data/feed/api/user/";
 const char uploadType[] =
     "multipart/related; boundary=END_OF_PART Content-Length:4711 MIME-version:1.0";
 
-std::string entryOf(const std::string &content, const std::string &kind)
-{
-    return "<entry xmlns='http://www.w3.org/2005/Atom'>  " + content +
-           "  <category scheme=\"https://schemas.orvala.example/2005#kind\"\n"
-           "    term=\"https://schemas.orvala.example/photos/2007#" +
-           kind + "\"/></entry>";
-}
-
 std::string commentOf(const std::string &text)
 {
     return entryOf("<content>" + text + "</content>", "comment");

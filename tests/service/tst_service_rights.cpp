@@ -10,14 +10,6 @@ namespace {
 
 const std::string user = "/data/feed/api/user/";
 
-std::string entryOf(const std::string &content, const std::string &kind)
-{
-    return "<entry>" + content +
-           "<category scheme=\"https://schemas.orvala.example/2005#kind\" "
-           "term=\"https://schemas.orvala.example/photos/2007#" +
-           kind + "\"/></entry>";
-}
-
 // Every address that takes a token, with everybody who may come: Ben owns an open and a private
 // album, Anna is another user.
 class Rights : public testing::Test, protected TestService

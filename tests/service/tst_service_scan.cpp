@@ -290,21 +290,6 @@ TEST_F(Scan, importsWaitForTheirPhotos)
         EXPECT_FALSE(import(bad)) << bad;
 }
 
-TEST_F(Scan, aUserComesAndGoes)
-{
-    addPhoto("one.jpg");
-    start();
-    addUser("ben@orvala.example", "Ben", "ben");
-    writePicture(file("ben/two.jpg"), 16, 16);
-    scan();
-    EXPECT_EQ(featured(), (Titles{"one", "two"}));
-    EXPECT_TRUE(removeUser(database(), "ben@orvala.example"));
-    EXPECT_EQ(featured(), Titles{"one"});
-    EXPECT_EQ(titlesOf(publicFeed("/data/feed/api/all?q=two")), Titles{});
-    EXPECT_FALSE(removeUser(database(), "ben@orvala.example"));
-    EXPECT_TRUE(fs::exists(file("ben/two.jpg")));
-}
-
 // The oldest index that was in use: version 3.
 TEST_F(Scan, anOlderIndexIsUpgraded)
 {

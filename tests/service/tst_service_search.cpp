@@ -84,6 +84,10 @@ TEST_F(Search, findsWhatIsWrittenAboutAPhotoByTheBeginningsOfWords)
     saveUser(database(), anna);
     EXPECT_EQ(titles("anna"), Titles{});
     EXPECT_EQ(titles("lind bea thr"), Titles{"three"});
+    EXPECT_TRUE(removeUser(database(), anna.mail));
+    EXPECT_EQ(titles("dog"), Titles{});
+    EXPECT_EQ(titlesOf(publicFeed("/data/feed/api/featured")), Titles{});
+    EXPECT_TRUE(std::filesystem::exists(photo("Summer/one.jpg")));
 }
 
 TEST_F(Search, readsAnyScript)

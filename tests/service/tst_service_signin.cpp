@@ -4,12 +4,9 @@
 #include "index/passwords.h"
 #include "index/users.h"
 #include "signin/attempts.h"
-#include "signin/digitpicture.h"
 #include "signin/pages.h"
 
 #include <gtest/gtest.h>
-
-#include <set>
 
 namespace {
 
@@ -121,31 +118,6 @@ protected:
 
 } // namespace
 
-TEST_F(SignIn, fromThePasswordToTheTokens)
-{
-    const auto visitor = this->visitor();
-    EXPECT_EQ(visitor->path.rfind("/ServiceLogin?continue=", 0), 0u);
-    visitor->signIn("Anna@orvala.example", "mountains");
-    EXPECT_EQ(visitor->path.rfind("/o/oauth2/auth?", 0), 0u);
-    const std::string body = between(visitor->page, "<body>", "</body>");
-    EXPECT_EQ(body.rfind("<p class=\"name\">Anna</p>", 0), 0u);
-    for (const char *id : {"submit_approve_access", "submit_deny_access"})
-        EXPECT_NE(body.find("<button id=\"" + std::string(id)), std::string::npos);
-    visitor->submit("/o/oauth2/approve", "answer=allow");
-    ASSERT_EQ(visitor->title().rfind("Success code=", 0), 0u);
-    const std::string code = visitor->title().substr(13);
-    const auto answer = exchange(code);
-    ASSERT_EQ(answer->status, 200);
-    const json tokens = json::parse(answer->body);
-    EXPECT_EQ(tokens["expires_in"], 90 * 24 * 3600);
-    EXPECT_EQ(tokens["token_type"], "Bearer");
-    EXPECT_NE(tokens["refresh_token"], tokens["access_token"]);
-    EXPECT_EQ(
-        statusOf("/data/feed/api/user/1?access_token=" + tokens["access_token"].get<std::string>()),
-        200);
-    EXPECT_EQ(json::parse(exchange(code)->body)["error"], "invalid_grant"); // once only
-}
-
 TEST_F(SignIn, theNextPersonSignsInAnew)
 {
     const auto visitor = this->visitor();
@@ -165,19 +137,29 @@ TEST_F(SignIn, theNextPersonSignsInAnew)
 TEST_F(SignIn, codesAreBoundToWhatWasAllowed)
 {
     const auto visitor = this->visitor();
-    visitor->signIn("anna@orvala.example", "mountains");
-    visitor->submit("/o/oauth2/approve", "answer=allow");
-    const std::string code = visitor->title().substr(13);
+    const auto code = [&] {
+        visitor->start();
+        visitor->signIn("Anna@orvala.example", "mountains");
+        visitor->submit("/o/oauth2/approve", "answer=allow");
+        return visitor->title().substr(std::string("Success code=").size());
+    };
+    const std::string used = code();
+    const auto answer = exchange(used);
+    ASSERT_EQ(answer->status, 200);
+    const json tokens = json::parse(answer->body);
+    EXPECT_EQ(tokens["expires_in"], 90 * 24 * 3600);
+    EXPECT_EQ(tokens["token_type"], "Bearer");
+    EXPECT_NE(tokens["refresh_token"], tokens["access_token"]);
+    EXPECT_EQ(json::parse(exchange(used)->body)["error"], "invalid_grant"); // once only
     std::string elsewhere = client;
     elsewhere.replace(elsewhere.find("urn:"), std::string::npos, "https://x.example/");
-    EXPECT_EQ(exchange(code, elsewhere)->status, 400);
-    EXPECT_EQ(exchange(code)->status, 400); // whoever tried has spent it
+    const std::string tried = code();
+    EXPECT_EQ(exchange(tried, elsewhere)->status, 400);
+    EXPECT_EQ(exchange(tried)->status, 400); // whoever tried has spent it
     EXPECT_EQ(exchange("")->status, 400);
-    visitor->start();
-    visitor->signIn("anna@orvala.example", "mountains");
-    visitor->submit("/o/oauth2/approve", "answer=allow");
+    const std::string last = code();
     removeUser(database(), "anna@orvala.example");
-    EXPECT_EQ(exchange(visitor->title().substr(13))->status, 400);
+    EXPECT_EQ(exchange(last)->status, 400);
 }
 
 TEST_F(SignIn, wrongTriesBringThePanelAndThenAPause)
@@ -277,16 +259,4 @@ TEST(ShortLived, endsAndKeepsWithinItsBound)
     for (int i = 0; i < 1000; ++i)
         values.add(i);
     EXPECT_EQ(values.find(third), std::nullopt);
-}
-
-TEST(DigitPicture, isNotReadAsText)
-{
-    EXPECT_EQ(digitPicture("01234").find("<text"), std::string::npos);
-    std::set<std::string> seen;
-    for (int i = 0; i < 50; ++i)
-        seen.insert(digitPicture("7"));
-    EXPECT_GT(seen.size(), 40u);
-    const std::string digits = randomDigits(5);
-    EXPECT_EQ(digits.find_first_not_of("0123456789"), std::string::npos);
-    EXPECT_EQ(digits.size(), 5u);
 }

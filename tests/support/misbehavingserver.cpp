@@ -185,18 +185,6 @@ MisbehavingServer::Behaviour MisbehavingServer::gzip(const QByteArray &body)
     return answer(compressed(body, Z_FINISH), 200, gzipHeaders);
 }
 
-MisbehavingServer::Behaviour MisbehavingServer::echo()
-{
-    return [](QTcpSocket *socket, const Request &request) {
-        QByteArray text = request.method + ' ' + request.path + '\n';
-        QList<QByteArray> names = request.headers.keys();
-        std::sort(names.begin(), names.end());
-        for (const QByteArray &name : qAsConst(names))
-            text += name + ": " + request.headers.value(name) + '\n';
-        answer(text + '\n' + request.body)(socket, request);
-    };
-}
-
 MisbehavingServer::Behaviour MisbehavingServer::silence()
 {
     return [](QTcpSocket *, const Request &) {};

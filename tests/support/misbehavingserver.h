@@ -55,8 +55,6 @@ public:
     static Behaviour redirect(const QByteArray &target, int status = 302);
     static Behaviour chunked(const QByteArray &body);
     static Behaviour gzip(const QByteArray &body);
-    // The request as text: method and path, headers by name, an empty line, the body.
-    static Behaviour echo();
 
     // Slow.
     static Behaviour silence(); // takes the request and never answers

@@ -23,7 +23,7 @@ protected:
     // The service is the test's server, with these lines in the configuration besides.
     void configure(const QByteArray &lines = QByteArray())
     {
-        mConfig.write("[Max]\nCacheSize=16\n[Service]\nFeedBase=" + mServer->url("").toUtf8() +
+        mConfig.write("[Max]\nCacheSize=64\n[Service]\nFeedBase=" + mServer->url("").toUtf8() +
                       '\n' + lines);
         PhotoManager::init();
     }

@@ -5,6 +5,7 @@
 #include "ui/homewidget.h"
 #include "ui/qimageslide.h"
 #include "ui/screencase.h"
+#include "ui/settingitem.h"
 #include "ui/slidemarks.h"
 #include "ui/slidephotos.h"
 #include "ui/slidesetting.h"
@@ -42,12 +43,12 @@ private slots:
     void failingPhotosDoNotStopThePlay();
     void aTurnWaitsForItsPhoto();
     void roundsFollowEachOther();
-    void returnSelectsTheRecord_data();
     void returnSelectsTheRecord();
     void keysWaitForTheList();
     void anythingCanBeLeft_data();
     void anythingCanBeLeft();
     void settingsAreKept();
+    void settingsStopAtTheirEnds();
     void thePlatformHearsTheEnd();
 
 public:
@@ -252,22 +253,11 @@ void TestImageSlide::roundsFollowEachOther()
     QCOMPARE(positions, QVector<int>({2, 0, 2, 0, 2}));
 }
 
-void TestImageSlide::returnSelectsTheRecord_data()
-{
-    QTest::addColumn<QByteArray>("options");
-    QTest::addColumn<bool>("isPhotoShown"); // or the number of photos shown
-
-    QTest::newRow("plain") << QByteArray() << false;
-    QTest::newRow("to the photo") << QByteArray("ReturnToPhoto=true\n") << true;
-}
-
 void TestImageSlide::returnSelectsTheRecord()
 {
-    QFETCH(bool, isPhotoShown);
-    QFETCH(QByteArray, options);
     serve(40);
     SlideSetting::SlideMode = 2;
-    open(options);
+    open("ReturnToPhoto=true\n");
     QTRY_COMPARE(HomeWidget::mCurrentPackageData->count(), 16);
     show(0);
     const auto isInOrder = [this] {
@@ -275,8 +265,7 @@ void TestImageSlide::returnSelectsTheRecord()
     };
     while (player()->position() < 7 || isInOrder())
         press({DEVICE_RIGHT_KEY});
-    const int position = player()->position();
-    const int record = isPhotoShown ? player()->playArray().at(position) : position;
+    const int record = player()->playArray().at(player()->position());
     QSignalSpy left(player(), &QImageSlide::returnImageSlideUpdate);
     press({DEVICE_RETURN_KEY});
     QCOMPARE(left.value(0), QVariantList({record + 1}));
@@ -446,6 +435,23 @@ void TestImageSlide::settingsAreKept()
     for (int turn = 0; turn < 3; ++turn)
         player()->update();
     QVERIFY(!QImageSlide::mIsShowing && mPage->homeScreen()->isVisible());
+}
+
+void TestImageSlide::settingsStopAtTheirEnds()
+{
+    SlideSetting::SlideSpeed = 6;
+    SlideSetting panel;
+    ScreenCase::show(&panel);
+    panel.load();
+    press({DEVICE_UP_KEY, DEVICE_SELECT_KEY, DEVICE_UP_KEY, DEVICE_UP_KEY});
+    QCOMPARE(panel.speed(), 5);
+    panel.findChildren<SettingItem *>().at(1)->setValue(SettingItem::Number, INT_MAX);
+    press({DEVICE_SELECT_KEY, DEVICE_DOWN_KEY});
+    QCOMPARE(panel.speed(), INT_MAX);
+    press({DEVICE_SELECT_KEY, DEVICE_UP_KEY, DEVICE_SELECT_KEY, DEVICE_UP_KEY});
+    QCOMPARE(panel.mode(), 0);
+    press({DEVICE_DOWN_KEY, DEVICE_DOWN_KEY, DEVICE_DOWN_KEY});
+    QCOMPARE(panel.mode(), 2);
 }
 
 void TestImageSlide::thePlatformHearsTheEnd()

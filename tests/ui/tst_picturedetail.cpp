@@ -1,30 +1,22 @@
-#include "common/ui/remotekeys.h"
+#include "accountmanager/accountmanagerhelper.h"
+#include "common/ui/qpopupdialog.h"
 #include "data/download.h"
-#include "data/heldanswers.h"
-#include "data/packagemanager.h"
-#include "data/photomanager.h"
-#include "data/testconfig.h"
-#include "data/testpictures.h"
-#include "support/logcapture.h"
-#include "support/misbehavingserver.h"
-#include "ui/detailactions.h"
 #include "ui/detailinformation.h"
 #include "ui/detailpictures.h"
 #include "ui/detailstage.h"
 #include "ui/detailstrip.h"
 #include "ui/detailtexts.h"
+#include "ui/notelist.h"
+#include "ui/photopopups.h"
 #include "ui/picturedetailwidget.h"
-#include "ui/samplefeeds.h"
+#include "ui/screencase.h"
 #include "ui/zoomview.h"
 
-#include <QSignalSpy>
 #include <QUrlQuery>
-#include <QtTest>
 
 namespace {
 
 constexpr const char *kFeatured = "/data/feed/api/featured";
-constexpr const char *kSearch = "/data/feed/api/all";
 constexpr const char *kAlbum = "/data/feed/api/user/anna/albumid/a1";
 
 QJsonObject record(const MisbehavingServer &server, int number)
@@ -62,7 +54,7 @@ MisbehavingServer::Behaviour pages(const MisbehavingServer &server, int total, i
 
 } // namespace
 
-class TestPictureDetail : public QObject
+class TestPictureDetail : public ScreenCase
 {
     Q_OBJECT
 
@@ -70,18 +62,15 @@ private slots:
     void init();
     void cleanup();
     void thumbnailComesFirst();
-    void actionsByArrowsAndSelect();
     void keys();
-    void crossesPages();
     void theFeedEndsEarly();
     void aPageFails();
-    void crossesSearchBlocks();
     void theListIsLost();
     void aPhotoIsDeleted();
     void staleLargePictures();
     void aPictureIsLargerThanTheCache();
     void rushingAsksForFew();
-    void commentsAndTags();
+    void commentsOfOthers();
     void notesOfAnotherPhoto();
     void oddTexts();
     void zoomByKeys();
@@ -100,9 +89,6 @@ private:
     }
     QString shownTitle() { return mDetail->findChild<DetailInformation *>()->texts().first(); }
 
-    std::unique_ptr<TestConfig> mConfig;
-    std::unique_ptr<LogCapture> mLog;
-    std::unique_ptr<MisbehavingServer> mServer;
     std::unique_ptr<PictureDetailWidget> mDetail;
     std::unique_ptr<QSignalSpy> mSettled;
     PackageProperty mList;
@@ -115,11 +101,8 @@ int TestPictureDetail::mArrived = 0;
 
 void TestPictureDetail::init()
 {
-    mServer = std::make_unique<MisbehavingServer>();
-    mConfig = std::make_unique<TestConfig>("[Max]\nCacheSize=64\n[Service]\nFeedBase=" +
-                                           mServer->url("").toUtf8());
-    mLog = std::make_unique<LogCapture>();
-    PhotoManager::init();
+    startServer();
+    configure();
     for (int i = 1; i <= 20; ++i) {
         const QByteArray number = QByteArray::number(i);
         mServer->on("/small" + number, MisbehavingServer::answer(mSmallPicture));
@@ -139,12 +122,9 @@ void TestPictureDetail::cleanup()
 {
     mSettled.reset();
     mDetail.reset();
-    PackageManager::clearAll();
-    PhotoManager::clearAll();
+    forgetAll();
     QVERIFY(Download::mDetailLabelUrlHash.isEmpty());
     QVERIFY(Download::mDetailSmallLabelUrlHash.isEmpty());
-    mLog.reset();
-    mServer.reset();
 }
 
 void TestPictureDetail::open(int type, int index, bool isSelf)
@@ -194,34 +174,6 @@ void TestPictureDetail::thumbnailComesFirst()
     QVERIFY(information().contains("2/12"));
 }
 
-void TestPictureDetail::actionsByArrowsAndSelect()
-{
-    for (bool isSelf : {false, true}) {
-        open(ALBUM_PHOTOS_LIST, 4, isSelf);
-        QTRY_VERIFY(!stage()->isWaiting());
-        QStringList asked;
-        const QObject context;
-        const auto note = [&](auto signal, const QString &name) {
-            connect(mDetail.get(), signal, &context, [&asked, name] { asked << name; });
-        };
-        note(&PictureDetailWidget::slidePlay, "play");
-        note(&PictureDetailWidget::addCommentSignal, "comment");
-        note(&PictureDetailWidget::showMoreCommentSignal, "comments");
-        note(&PictureDetailWidget::showTagSignal, "tags");
-        note(&PictureDetailWidget::addTagSignal, "add tag");
-        press(DEVICE_DOWN_KEY);
-        for (int button = 0; button < 6 + isSelf; ++button) {
-            press(DEVICE_SELECT_KEY);
-            if (auto *zoom = mDetail->findChild<ZoomView *>(); zoom->isVisible())
-                press(DEVICE_RETURN_KEY);
-            press(DEVICE_RIGHT_KEY);
-        }
-        QStringList expected{"play", "comment", "comments", "tags"};
-        QCOMPARE(asked, isSelf ? expected << "add tag" : expected);
-        QCOMPARE(mDetail->findChild<DetailInformation *>()->isHidden(), !isSelf);
-    }
-}
-
 void TestPictureDetail::keys()
 {
     open(ALBUM_PHOTOS_LIST, 9);
@@ -249,24 +201,6 @@ void TestPictureDetail::keys()
         QCoreApplication::sendEvent(mDetail.get(), &event);
         QVERIFY(!event.isAccepted()); // the owner's
     }
-}
-
-void TestPictureDetail::crossesPages()
-{
-    mServer->on(kFeatured, pages(*mServer, 20, 20));
-    open(FEATURED_PHOTOS_LIST, 6);
-    QSignalSpy page(mDetail.get(), &PictureDetailWidget::handleDetailPageChange);
-    for (int number = 8; number <= 20; ++number) {
-        press(DEVICE_RIGHT_KEY);
-        QTRY_COMPARE(mDetail->number(), number);
-        QCOMPARE(mDetail->photo().title, QString("Photo %1").arg(number));
-    }
-    QCOMPARE(page, (QList<QVariantList>{{9, true}, {17, true}}));
-    press(DEVICE_RIGHT_KEY);
-    QCOMPARE(mDetail->number(), 20);
-    press(DEVICE_PAGEUP_KEY);
-    QCOMPARE(page.value(2), (QVariantList{9, false}));
-    QCOMPARE(requestsFor(kFeatured), 3);
 }
 
 void TestPictureDetail::theFeedEndsEarly()
@@ -300,28 +234,6 @@ void TestPictureDetail::aPageFails()
     press(DEVICE_RIGHT_KEY);
     QTRY_COMPARE(mDetail->photo().title, QString("Photo 9"));
     QVERIFY(stage()->message().isEmpty());
-}
-
-void TestPictureDetail::crossesSearchBlocks()
-{
-    mServer->on(kSearch, pages(*mServer, 150, 150));
-    open(SEARCH_PHOTOS_LIST, 98);
-    QSignalSpy page(mDetail.get(), &PictureDetailWidget::handleDetailPageChange);
-    press(DEVICE_RIGHT_KEY);
-    press(DEVICE_RIGHT_KEY);
-    QTRY_COMPARE(mDetail->photo().title, QString("Photo 101"));
-    QCOMPARE(mDetail->recordIndex(), 0);
-    QCOMPARE(mDetail->number(), 101);
-    QCOMPARE(mDetail->total(), 150);
-    press(DEVICE_LEFT_KEY);
-    QTRY_COMPARE(mDetail->photo().title, QString("Photo 100"));
-    QCOMPARE(mDetail->recordIndex(), 99);
-    QCOMPARE(page, (QList<QVariantList>{{101, true}, {97, false}}));
-    // A block that the home screen has opened.
-    PackageProperty more = mList;
-    more.mType = SEARCH_MORE_PHOTOS_LIST;
-    mDetail->showPhoto(20, PackageManager::getPackage(more), false, false, 101);
-    QCOMPARE(mDetail->number(), 121);
 }
 
 void TestPictureDetail::theListIsLost()
@@ -372,7 +284,7 @@ void TestPictureDetail::staleLargePictures()
 
 void TestPictureDetail::aPictureIsLargerThanTheCache()
 {
-    mConfig->write("[Max]\nCacheSize=5\n[Service]\nFeedBase=" + mServer->url("").toUtf8());
+    mConfig.write("[Max]\nCacheSize=5\n[Service]\nFeedBase=" + mServer->url("").toUtf8());
     PhotoManager::init();
     mServer->on("/p/s1180/1", MisbehavingServer::answer(encoded(plain(1200, 1200), "PNG")));
     open(ALBUM_PHOTOS_LIST, 0);
@@ -399,35 +311,42 @@ void TestPictureDetail::rushingAsksForFew()
     QCOMPARE(requestsFor(QByteArray(kAlbum) + "/photoid"), 2);
 }
 
-void TestPictureDetail::commentsAndTags()
+// In the list, newest first, whoever wrote them; only the reader's own can be deleted.
+void TestPictureDetail::commentsOfOthers()
 {
     const auto comment = [](const QString &name, const QString &text, const QString &time) {
         return QJsonObject{
-            {"author", QJsonArray{QJsonObject{{"gphoto$nickname", sample::text(name)}}}},
+            {"gphoto$id", sample::text(time)},
+            {"author", QJsonArray{QJsonObject{{"gphoto$user", sample::text(name)},
+                                              {"gphoto$nickname", sample::text(name)}}}},
             {"content", sample::text(text)},
             {"published", sample::text(time)}};
     };
-    int round = 0;
-    mServer->on(QByteArray(kAlbum) + "/photoid/1", [&](QTcpSocket *socket,
-                                                       const MisbehavingServer::Request &request) {
-        const bool isTags = request.path.contains("kind=tag");
-        const QJsonArray tags{sample::photo(round < 2 ? "sea, sun" : "sea, wind")};
-        const QJsonArray comments{comment("Ben", "<b>older</b>", "2025-06-16T07:45:00Z"),
-                                  comment("Eve", "newer &amp;lt; all", "2025-06-17T07:45:00Z")};
-        ++round;
-        MisbehavingServer::answer(sample::feed(isTags ? tags : comments, 0))(socket, request);
-    });
-    open(ALBUM_PHOTOS_LIST, 0);
-    QTRY_VERIFY(information().contains("Comments: 2"));
-    QTRY_VERIFY(information().contains("sea, sun"));
+    const QJsonArray comments{comment("Ben", "<b>older</b>", "2025-06-16T07:45:00Z"),
+                              comment("Eve", "newer &amp;lt; all", "2025-06-17T07:45:00Z"),
+                              comment("Eve", QString("<table>").repeated(3000), "1990")};
+    mServer->on(QByteArray(kAlbum) + "/photoid/1",
+                MisbehavingServer::answer(sample::feed(comments, 0)));
+    AccountManagerHelper::setUserName("Ben");
+    new PhotoPopups(mDetail.get(), mDetail.get());
+    open(ALBUM_PHOTOS_LIST, 0, true);
+    QTRY_VERIFY(information().contains("Comments: 3"));
     const QString text = information();
     QVERIFY(text.contains("<b>older</b>"));
     QVERIFY(text.indexOf("newer < all") < text.indexOf("older"));
-    PackageProperty comments = mDetail->photo().request(PHOTO_COMMENTS_LIST);
-    QVERIFY(PackageManager::getPackage(comments)); // for whoever lists them all
 
-    mDetail->refreshNotes();
-    QTRY_VERIFY(information().contains("sea, wind"));
+    emit mDetail->showMoreCommentSignal();
+    auto *list = mDetail->findChild<NoteList *>();
+    QTRY_COMPARE(list->count(), 3);
+    const auto select = [list](int steps) {
+        for (int i = 0; i < steps; ++i)
+            QTest::sendKeyEvent(QTest::Press, list, Qt::Key(DEVICE_DOWN_KEY), "", {});
+        QTest::sendKeyEvent(QTest::Press, list, Qt::Key(DEVICE_SELECT_KEY), "", {});
+    };
+    select(1);
+    QVERIFY(!mDetail->findChild<QPopupDialog *>());
+    select(1);
+    QVERIFY(mDetail->findChild<QPopupDialog *>());
 }
 
 void TestPictureDetail::notesOfAnotherPhoto()

@@ -48,27 +48,12 @@ class TestPlayOrder : public QObject
     Q_OBJECT
 
 private slots:
-    void drawsAreTakenModulo();
     void randomNeverRepeatsItsNeighbour();
     void shuffleIsFair();
     void appendedPagesKeepTheRules();
     void anotherModeStartsAfresh();
     void roundsDoNotMeetInTheSamePhoto();
 };
-
-void TestPlayOrder::drawsAreTakenModulo()
-{
-    QVector<quint32> draws{7, 7, 4, 6, 1}; // the second is drawn again
-    const auto source = [&draws] { return draws.takeFirst(); };
-    QVector<int> array{0, 1, 2, 3};
-    playorder::order(array, 0, playorder::Random, source);
-    QCOMPARE(array, QVector<int>({3, 0, 2, 1}));
-
-    draws = {2, 4, 1, 5}; // positions 0 + 2, 1 + 4 % 3, 2 + 1, 3
-    array = {0, 1, 2, 3};
-    playorder::order(array, 0, playorder::Shuffle, source);
-    QCOMPARE(array, QVector<int>({2, 0, 3, 1}));
-}
 
 void TestPlayOrder::randomNeverRepeatsItsNeighbour()
 {

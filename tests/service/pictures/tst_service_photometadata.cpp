@@ -13,20 +13,6 @@ std::string errorOf(const std::string &path)
     return readPhotoMetadata(path, &error) ? "" : error;
 }
 
-TEST(PhotoMetadata, TellsTheUprightSizeOfEveryOrientation)
-{
-    const TemporaryFolder folder;
-    for (int orientation = 1; orientation <= 8; ++orientation) {
-        const std::string path = folder.file("photo.jpg");
-        writePicture(path, 60, 40, orientation);
-        const auto metadata = readPhotoMetadata(path, nullptr);
-        ASSERT_TRUE(metadata) << orientation;
-        EXPECT_EQ(metadata->orientation, orientation);
-        EXPECT_EQ(metadata->width, orientation < 5 ? 60 : 40) << orientation;
-        EXPECT_EQ(metadata->height, orientation < 5 ? 40 : 60) << orientation;
-    }
-}
-
 TEST(PhotoMetadata, RecognisesFormatsByContent)
 {
     const TemporaryFolder folder;

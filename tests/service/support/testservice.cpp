@@ -114,6 +114,14 @@ std::vector<std::string> titlesOf(const json &feed)
     return titles;
 }
 
+std::string entryOf(const std::string &content, const std::string &kind)
+{
+    return "<entry xmlns='http://www.w3.org/2005/Atom'>  " + content +
+           "  <category scheme=\"https://schemas.orvala.example/2005#kind\"\n"
+           "    term=\"https://schemas.orvala.example/photos/2007#" +
+           kind + "\"/></entry>";
+}
+
 std::string pathOf(const std::string &address)
 {
     return address.substr(address.find('/', std::string("https://").size()));

@@ -56,6 +56,8 @@ private:
 
 // Titles of a feed's entries.
 std::vector<std::string> titlesOf(const json &feed);
+// An entry as a client posts it.
+std::string entryOf(const std::string &content, const std::string &kind);
 // The path of an address that the service has given.
 std::string pathOf(const std::string &address);
 // "feed" > name > "$t".
