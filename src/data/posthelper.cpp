@@ -224,6 +224,7 @@ ErrorCode PostHelper::postNewPhoto(const QString &userId, const QString &albumId
                                    QByteArray image, qint64 imageSize)
 {
     const QString url = urlOf(POST_NEW_PHOTO_URL.arg(encoded(userId), encoded(albumId), token()));
+    // Escaped like the notes: the title may be a file's name, and "&" alone is no XML.
     const QString metadata = POST_NEW_PHOTO_METADATA.arg(escapeXml(title), escapeXml(summary));
     const QString body = QStringLiteral("\nMedia multipart posting\n") +
                          QStringLiteral("--END_OF_PART\n") +

@@ -46,7 +46,7 @@ private:
 
 HomePages::HomePages(QWidget *parent)
     : QFrame(parent)
-    , mGrid(new FormScrollArea(this))
+    , mCommentArea(new FormScrollArea(this))
     , mLoadingPage(new LoadingPage(this))
     , mNoPhotoPage(new NoPhotoAvailableWidget(this))
     , mFailurePage(new FailurePage(this))
@@ -54,13 +54,13 @@ HomePages::HomePages(QWidget *parent)
     , mDetail(new PictureDetailWidget(this))
     , mPages(new QStackedLayout(this))
 {
-    auto *content = new FormScrollWidget(mGrid);
-    mGrid->setWidget(content);
+    auto *content = new FormScrollWidget(mCommentArea);
+    mCommentArea->setWidget(content);
     content->setColumn(SystemConfig::scrollAreaMaxColumn());
     mPages->setSizeConstraint(QLayout::SetNoConstraint); // the screen's size is given
     // As Page numbers them.
     for (QWidget *page :
-         std::initializer_list<QWidget *>{mGrid, mLoadingPage, mNoPhotoPage, mFailurePage,
+         std::initializer_list<QWidget *>{mCommentArea, mLoadingPage, mNoPhotoPage, mFailurePage,
                                           new SearchPage(mSearchBar, this), mDetail})
         mPages->addWidget(page);
 
@@ -110,7 +110,7 @@ void HomePages::takeFocus()
 void HomePages::focusPage()
 {
     if (isShown(Grid))
-        mGrid->initFocus();
+        mCommentArea->initFocus();
     else if (!isShown(NoPhoto))
         mPages->currentWidget()->setFocus();
 }

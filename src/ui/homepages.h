@@ -34,7 +34,7 @@ public:
     // Gives the focus to what the page shown has for it; a page without anything leaves it alone.
     void focusPage();
 
-    FormScrollArea *grid() const { return mGrid; }
+    FormScrollArea *grid() const { return mCommentArea; }
     SearchWidget *searchBar() const { return mSearchBar; }
     PictureDetailWidget *detail() const { return mDetail; }
 
@@ -47,7 +47,7 @@ signals:
 private:
     void takeFocus();
 
-    FormScrollArea *mGrid;
+    FormScrollArea *mCommentArea; // the focus grid
     LoadingPage *mLoadingPage;
     NoPhotoAvailableWidget *mNoPhotoPage;
     FailurePage *mFailurePage;

@@ -47,7 +47,7 @@ QString asPosition(int number, int total)
 HomeView::HomeView(QWidget *screen, HomeState *state)
     : mScreen(screen)
     , mState(state)
-    , mMenu(new UpWidget(screen))
+    , mTitleWidget(new UpWidget(screen))
     , mPages(new HomePages(screen))
     , mBars(new HomeBars(screen))
     , mCells(std::make_unique<CellFiller>(grid()->content(), screen))
@@ -57,7 +57,7 @@ HomeView::HomeView(QWidget *screen, HomeState *state)
                                SystemConfig::borderRight(), SystemConfig::borderBottom());
     column->setSpacing(4);
     column->setSizeConstraint(QLayout::SetNoConstraint); // the screen's size is given
-    column->addWidget(mMenu);
+    column->addWidget(mTitleWidget);
     column->addWidget(mPages, 1);
     column->addWidget(mBars);
 }
@@ -69,7 +69,7 @@ HomeView::~HomeView()
 
 void HomeView::showList(const Package &package)
 {
-    const bool toContent = !mMenu->hasFocus();
+    const bool toContent = !mTitleWidget->hasFocus();
     const int shown = mCells->fill(package, mState->recordIndex(0));
     mState->mCanPlay = true;
     if (isShown(HomePages::Detail))
@@ -77,7 +77,7 @@ void HomeView::showList(const Package &package)
     if (shown == 0) {
         mPages->show(HomePages::NoPhoto);
         if (mayFocus())
-            mMenu->setFocus();
+            mTitleWidget->setFocus();
         return;
     }
     if (mState->mInitIndex >= 0)
@@ -121,7 +121,7 @@ void HomeView::focusContent()
     if (!mayFocus())
         return;
     mPages->focusPage();
-    mMenu->updateFocusMark();
+    mTitleWidget->updateFocusMark();
 }
 
 void HomeView::moveTo(int cell, const Package *package)

@@ -23,7 +23,7 @@ public:
     HomeView(QWidget *screen, HomeState *state);
     ~HomeView();
 
-    UpWidget *menu() const { return mMenu; }
+    UpWidget *menu() const { return mTitleWidget; }
     HomePages *pages() const { return mPages; }
     FormScrollArea *grid() const { return mPages->grid(); }
     PictureDetailWidget *detail() const { return mPages->detail(); }
@@ -52,7 +52,7 @@ public:
 private:
     QWidget *mScreen;
     HomeState *mState;
-    UpWidget *mMenu;
+    UpWidget *mTitleWidget;
     HomePages *mPages;
     HomeBars *mBars;
     std::unique_ptr<CellFiller> mCells;

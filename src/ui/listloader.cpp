@@ -24,10 +24,10 @@ void ListLoader::request()
     CellFiller::cancelThumbnails();
     emit started();
     mPages->showLoading();
-    fetch(mState->mCurrentProperty);
+    tryToDownload(mState->mCurrentProperty);
 }
 
-void ListLoader::fetch(PackageProperty property)
+void ListLoader::tryToDownload(PackageProperty property)
 {
     if (PackageManager::getPackage(property)) {
         logLine("enter NULL != package");
@@ -69,7 +69,7 @@ bool ListLoader::complete(const Package *held, const PackageProperty &arrivedPag
     }
     // Another page of the list may have come, without the one wanted.
     if (held || isOtherPage)
-        fetch(wanted);
+        tryToDownload(wanted);
     else
         fetchAnew();
     return false;
@@ -83,7 +83,7 @@ void ListLoader::fetchAnew()
         PackageManager::removeCache(mState->mCurrentProperty);
         mState->restart();
         if (isBelow)
-            fetch(mState->mCurrentProperty);
+            tryToDownload(mState->mCurrentProperty);
         else
             request();
     } else if (!isBelow) {

@@ -41,7 +41,7 @@ signals:
     void started();
 
 private:
-    void fetch(PackageProperty property);
+    void tryToDownload(PackageProperty property);
     void fetchAnew();
     void showFailure(ErrorCode code);
 

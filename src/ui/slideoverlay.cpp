@@ -17,11 +17,18 @@ constexpr int kDrift = 4;  // pixels, each way
 constexpr int kShadow = 2; // pixels around the letters
 constexpr qreal kRimOpacity = 110.0 / 255;
 constexpr int kLongestText = 500; // characters; a line holds fewer
-constexpr int kWidthShare = 2;    // a text is at most this part of the screen wide
+constexpr int kMarkRoom = 48;     // beside the middle, where play and pause are marked
 
 QString oneLine(const QString &text)
 {
     return unescapeHtml(text.left(kLongestText)).simplified();
+}
+
+// A text is cut before the middle of the screen.
+int widestText(int screen)
+{
+    const int border = std::max(SystemConfig::borderLeft(), SystemConfig::borderRight());
+    return std::max(screen / 4, screen / 2 - border - kMarkRoom);
 }
 
 bool isAtTop(SlideCorner corner)
@@ -102,7 +109,7 @@ SlideOverlay::Block SlideOverlay::makeBlock(SlideCorner corner) const
     font.setPointSize(SystemConfig::appNormalFont());
     font.setWeight(QFont::DemiBold);
     const QFontMetrics metrics(font);
-    const int widest = mTarget->width() / kWidthShare;
+    const int widest = widestText(mTarget->width());
     QStringList lines;
     int width = 0;
     const auto add = [&](SlideCorner wanted, const QString &text) {

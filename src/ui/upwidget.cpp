@@ -94,7 +94,7 @@ void UpWidget::setUserName(const QString &name)
 {
     if (!mUserName)
         return;
-    const QString whole = name.left(kLongestName);
+    const QString whole = name.left(kLongestName).simplified();
     const int usable =
         SystemConfig::mScreen_Width - SystemConfig::borderLeft() - SystemConfig::borderRight();
     const QFontMetrics metrics = mUserName->fontMetrics();

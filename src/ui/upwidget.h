@@ -22,7 +22,8 @@ public:
 
     explicit UpWidget(QWidget *parent = nullptr);
 
-    // Shows the signed-in user's name, cut when it is wider than a fifth of the usable width.
+    // Shows the signed-in user's name on one line, cut when it is wider than a fifth of the usable
+    // width.
     void setUserName(const QString &name);
     QString shownUserName() const;
 

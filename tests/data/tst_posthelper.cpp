@@ -113,14 +113,14 @@ private slots:
         const QString path = file("p.png", bytes);
 
         mServer->enqueue(MisbehavingServer::answer(kEntry));
-        QCOMPARE(MediaUploader::startToUpload(path, "Sea", "me", "a1", "By day", false),
+        QCOMPARE(MediaUploader::startToUpload(path, "Sea & sand", "me", "a1", "<By day", false),
                  NET_SUCCESS);
         QCOMPARE(last().path,
                  QByteArray("/data/feed/api/user/me/albumid/a1?access_token=to%2Fk%26n&alt=json"));
         const QByteArray body =
             "\nMedia multipart posting\n--END_OF_PART\nContent-Type:application/atom+xml\n\n"
-            "<entry xmlns='http://www.w3.org/2005/Atom'>   <title>Sea</title>   "
-            "<summary>By day</summary>   " +
+            "<entry xmlns='http://www.w3.org/2005/Atom'>   <title>Sea &amp; sand</title>   "
+            "<summary>&lt;By day</summary>   " +
             QByteArray(kCategory) +
             "photo\"/> </entry>\n--END_OF_PART\nContent-Type:image/png\n\n" + bytes +
             "\n--END_OF_PART--";

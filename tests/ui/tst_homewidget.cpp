@@ -202,8 +202,8 @@ void TestHomeWidget::hostileTextsStayPlain()
     press({DEVICE_SELECT_KEY});
     QTRY_VERIFY(isReady());
     QVERIFY(bars()->information().contains("<b>&lt;img src='/etc/passwd'&gt;</b>"));
-    menu()->setUserName("<b>Al</b>");
-    QCOMPARE(menu()->shownUserName(), QString("<b>Al</b>"));
+    menu()->setUserName("<b>Al</b>\nB");
+    QCOMPARE(menu()->shownUserName(), QString("<b>Al</b> B"));
     menu()->setUserName(QString(100000, 'W'));
     QVERIFY(menu()->shownUserName().size() < 40);
 }
