@@ -2,6 +2,7 @@
 
 #include <arpa/inet.h>
 #include <netinet/tcp.h>
+#include <openssl/err.h>
 #include <poll.h>
 #include <unistd.h>
 
@@ -67,6 +68,7 @@ ClientStream::~ClientStream()
 bool ClientStream::handshake()
 {
     while (!mHandshakeDone) {
+        ERR_clear_error();
         const int result = SSL_accept(mSsl);
         if (result == 1)
             mHandshakeDone = true;
@@ -199,6 +201,8 @@ bool ClientStream::wait(short events)
     return ready > 0 && descriptors[0].revents != 0;
 }
 
+// The reason is told right only when no error of another connection is left on this thread: each
+// step clears them away before it begins.
 bool ClientStream::waitForTls(int result)
 {
     switch (SSL_get_error(mSsl, result)) {
@@ -215,6 +219,7 @@ ssize_t ClientStream::receive(char *bytes, std::size_t size)
 {
     for (;;) {
         if (mSsl) {
+            ERR_clear_error();
             const int result = SSL_read(mSsl, bytes, static_cast<int>(size));
             if (result > 0 || !waitForTls(result))
                 return result;
@@ -232,6 +237,7 @@ ssize_t ClientStream::send(const char *bytes, std::size_t size)
 {
     for (;;) {
         if (mSsl) {
+            ERR_clear_error();
             const int result = SSL_write(mSsl, bytes, static_cast<int>(size));
             if (result > 0 || !waitForTls(result))
                 return result;

@@ -258,8 +258,13 @@ void HttpServer::serve(Client client)
     if (mStopping || !mTurns.take(client))
         return;
     const std::string address = client->address();
-    for (; client; client = mTurns.pass(address))
-        serveRequests(client);
+    for (; client; client = mTurns.pass(address)) {
+        try {
+            serveRequests(client);
+        } catch (const std::exception &exception) { // of this client, nobody else's
+            spdlog::error("a connection failed: {}", exception.what());
+        }
+    }
 }
 
 void HttpServer::serveRequests(const Client &client)
@@ -280,6 +285,18 @@ void HttpServer::serveRequests(const Client &client)
     mParking->park(client);
 }
 
+// Nothing when that cannot be told now. Here the library catches nothing; takeBody() asks again and
+// has it answered.
+std::optional<std::size_t> HttpServer::limitOf(const httplib::Request &request) const
+{
+    httplib::Response refusal;
+    try {
+        return mRouter.bodyLimit(request, refusal);
+    } catch (const std::exception &) {
+        return std::nullopt;
+    }
+}
+
 // False when the connection has to be closed.
 bool HttpServer::serveRequest(ClientStream &client)
 {
@@ -289,13 +306,12 @@ bool HttpServer::serveRequest(ClientStream &client)
         false; // after lines that are no request, nothing can be told from what follows
     const auto headArrived = [this, &client, &isUnderstood](httplib::Request &request) {
         isUnderstood = true;
-        httplib::Response refusal;
-        const std::size_t limit = mRouter.bodyLimit(request, refusal);
-        client.headArrived(limit + chunkBytes);
+        const auto limit = limitOf(request);
+        client.headArrived(limit.value_or(0) + chunkBytes);
         simplify(request);
         noteRequestStart();
         // Bytes that nobody reads would be taken for the next request.
-        if (isTooLarge(request, limit) || isUnfit(request) || isAmbiguous(request) ||
+        if (!limit || isTooLarge(request, *limit) || isUnfit(request) || isAmbiguous(request) ||
             (takesBody(request) && !hasLength(request)) ||
             (hasBody(request) && (!takesBody(request) || request.path.size() > longestPath)))
             client.closeAfterAnswer();

@@ -8,6 +8,7 @@
 #include <httplib.h>
 
 #include <atomic>
+#include <optional>
 
 // The HTTP library's server on connections of our own: a client that keeps its connection open
 // costs no thread while it is silent, none can take all threads, and stopping waits for nobody.
@@ -44,6 +45,7 @@ private:
     void serve(Client client);
     void serveRequests(const Client &client);
     bool serveRequest(ClientStream &client);
+    std::optional<std::size_t> limitOf(const httplib::Request &request) const;
     HandlerResponse takeBody(const httplib::Request &request, httplib::Response &response);
     void post(const httplib::Request &request, httplib::Response &response,
               const httplib::ContentReader &reader);
