@@ -1,5 +1,6 @@
 #include "base/texts.h"
 
+#include <algorithm>
 #include <array>
 #include <cctype>
 #include <charconv>
@@ -165,6 +166,29 @@ std::int64_t currentSeconds()
 std::string localDay()
 {
     return localTime(currentSeconds()).substr(0, std::string("2026-05-01").size());
+}
+
+std::string monthName(std::int64_t month)
+{
+    static const std::array<const char *, 12> names = {
+        "January", "February", "March",     "April",   "May",      "June",
+        "July",    "August",   "September", "October", "November", "December"};
+    return month >= 1 && month <= 12 ? names[static_cast<std::size_t>(month - 1)] : "";
+}
+
+std::vector<std::string> tagsIn(std::string text)
+{
+    std::replace_if(
+        text.begin(), text.end(), [](char c) { return c == '\n' || c == '\t'; }, ' ');
+    std::vector<std::string> tags;
+    for (std::size_t start = 0; start < text.size();) {
+        const std::size_t end = std::min(text.find(", ", start), text.size());
+        const std::size_t first = text.find_first_not_of(" ,", start);
+        if (first < end)
+            tags.push_back(text.substr(first, text.find_last_not_of(" ,", end - 1) + 1 - first));
+        start = end + 2;
+    }
+    return tags;
 }
 
 std::string withoutExtension(const std::string &name)

@@ -4,6 +4,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <vector>
 
 // Small helpers for texts: encodings, numbers and times as the feeds write them.
 
@@ -24,9 +25,15 @@ std::string localTime(std::int64_t seconds);
 std::int64_t currentSeconds();
 // Today in the server's zone, as 2026-05-01.
 std::string localDay();
+// "January" for 1; empty for what is no month.
+std::string monthName(std::int64_t month);
 // Seconds since 1970 of an ISO time with or without fraction and zone, UTC if it has none; nothing
 // if it is no such time.
 std::optional<std::int64_t> parseTime(const std::string &text);
+
+// The tags of a list, whatever somebody or a file calls one tag: readers of feeds split lists of
+// tags at ", ", so that none can hold it, nor a line end or a tab.
+std::vector<std::string> tagsIn(std::string text);
 
 // A file name without its extension; a name that is only an extension stays whole.
 std::string withoutExtension(const std::string &name);

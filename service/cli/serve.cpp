@@ -96,9 +96,7 @@ void waitForEnd(const sigset_t &signals, Service &service)
     }
 }
 
-} // namespace
-
-int runServe(const ServeOptions &options)
+int serve(const ServeOptions &options)
 {
     const sigset_t signals = blockSignals();
     raiseFileLimit();
@@ -118,4 +116,15 @@ int runServe(const ServeOptions &options)
     spdlog::info("stopping");
     endSoon();
     return 0;
+}
+
+} // namespace
+
+int runServe(const ServeOptions &options)
+{
+    try {
+        return serve(options);
+    } catch (const std::exception &exception) { // as when the disk is full
+        return fail(exception.what());
+    }
 }

@@ -91,12 +91,14 @@ std::int64_t writePhoto(Session &session, const AlbumPlace &place, const FoundFi
 void writeKeywords(Session &session, std::int64_t photoId, const std::vector<std::string> &keywords)
 {
     Query(session, "DELETE FROM tags WHERE photo = ? AND author IS NULL", photoId).run();
-    for (const std::string &keyword : keywords)
-        Query(session,
-              "INSERT OR IGNORE INTO tags (photo, tag) SELECT ?1, ?2 WHERE NOT EXISTS "
-              "(SELECT 1 FROM droppedKeywords WHERE photo = ?1 AND tag = ?2)",
-              photoId, keyword)
-            .run();
+    for (const std::string &keyword : keywords) {
+        for (const std::string &tag : tagsIn(keyword))
+            Query(session,
+                  "INSERT OR IGNORE INTO tags (photo, tag) SELECT ?1, ?2 WHERE NOT EXISTS "
+                  "(SELECT 1 FROM droppedKeywords WHERE photo = ?1 AND tag = ?2)",
+                  photoId, tag)
+                .run();
+    }
 }
 
 void setPresent(Session &session, std::int64_t photoId, bool present)
@@ -126,7 +128,12 @@ bool isPrivacyChanged(Session &session, const FolderState &state)
     return query.next() && (query.number(0) != 0) != state.isPrivate;
 }
 
-// The addresses of an album's pictures, which take no token, end when the album becomes private.
+void renewKey(Session &session, std::int64_t photoId)
+{
+    Query(session, "UPDATE photos SET key = ? WHERE id = ?", randomText(keyBytes), photoId).run();
+}
+
+// The addresses of pictures, which take no token, end when what they show becomes private.
 void renewKeys(Session &session, std::int64_t albumId)
 {
     std::vector<std::int64_t> photoIds;
@@ -136,20 +143,30 @@ void renewKeys(Session &session, std::int64_t albumId)
             photoIds.push_back(query.number(0));
     }
     for (const std::int64_t id : photoIds)
-        Query(session, "UPDATE photos SET key = ? WHERE id = ?", randomText(keyBytes), id).run();
+        renewKey(session, id);
+}
+
+// The photo lay elsewhere before, maybe in another album.
+void takeMovedPhoto(Session &session, const AlbumPlace &place, const FoundFile &file,
+                    bool isPrivate)
+{
+    const std::int64_t oldAlbum = movePhoto(session, place.album, file);
+    if (oldAlbum == place.album)
+        return;
+    refreshAlbum(session, oldAlbum);
+    if (isPrivate)
+        renewKey(session, file.movedFrom);
 }
 
 void writeFolder(Session &session, const FolderChanges &changes)
 {
     const bool privacyChanged = isPrivacyChanged(session, changes.state);
     const std::int64_t albumId = writeAlbum(session, changes.state);
+    const AlbumPlace place{changes.state.userId, albumId};
     for (const FoundFile &file : changes.found) {
-        if (file.movedFrom != 0) {
-            const std::int64_t oldAlbum = movePhoto(session, albumId, file);
-            if (oldAlbum != albumId)
-                refreshAlbum(session, oldAlbum);
-        }
-        const std::int64_t photoId = writePhoto(session, {changes.state.userId, albumId}, file);
+        if (file.movedFrom != 0)
+            takeMovedPhoto(session, place, file, changes.state.isPrivate);
+        const std::int64_t photoId = writePhoto(session, place, file);
         writeKeywords(session, photoId, file.metadata.keywords);
         refreshPhotoSearch(session, photoId);
     }

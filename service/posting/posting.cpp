@@ -12,8 +12,6 @@
 #include "scan/contentmark.h"
 #include "scan/folderlist.h"
 
-#include <sys/stat.h>
-
 #include <algorithm>
 
 namespace {
@@ -26,7 +24,6 @@ constexpr int unfitMedia = 415;
 constexpr std::size_t longestEntry = 64 * 1024;
 constexpr std::size_t longestTag = 200;
 constexpr std::size_t uploadBytes = 65 * 1024 * 1024;
-constexpr std::int64_t nanoseconds = 1'000'000'000;
 
 void sendEntry(Asked &asked, int status, FeedJson entry)
 {
@@ -37,22 +34,6 @@ void sendEntry(Asked &asked, int status, FeedJson entry)
 void sendNothing(Asked &asked)
 {
     asked.response.set_content("{}", "application/json; charset=UTF-8");
-}
-
-// Readers split a list of tags at these two characters, so no tag can hold them.
-std::vector<std::string> tagsIn(std::string text)
-{
-    std::replace_if(
-        text.begin(), text.end(), [](char c) { return c == '\n' || c == '\t'; }, ' ');
-    std::vector<std::string> tags;
-    for (std::size_t start = 0; start < text.size();) {
-        const std::size_t end = std::min(text.find(", ", start), text.size());
-        const std::size_t first = text.find_first_not_of(" ,", start);
-        if (first < end)
-            tags.push_back(text.substr(first, text.find_last_not_of(" ,", end - 1) + 1 - first));
-        start = end + 2;
-    }
-    return tags;
 }
 
 std::string joined(const std::vector<std::string> &tags)
@@ -74,13 +55,8 @@ FoundFile describe(const NewPhotoFile &file, PhotoMetadata metadata)
     {
     };
     ::stat(file.path().c_str(), &status);
-    return {file.name(),
-            status.st_size,
-            status.st_mtim.tv_sec * nanoseconds + status.st_mtim.tv_nsec,
-            std::move(metadata),
-            "",
-            0,
-            contentMark(file.path())};
+    return {file.name(), status.st_size,          timeOfChange(status), std::move(metadata), "",
+            0,           contentMark(file.path())};
 }
 
 // What an upload brings: its entry, and its picture on the way into the album's folder. Further

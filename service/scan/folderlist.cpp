@@ -3,7 +3,6 @@
 #include <dirent.h>
 #include <fcntl.h>
 #include <strings.h>
-#include <sys/stat.h>
 
 #include <algorithm>
 #include <memory>
@@ -20,6 +19,7 @@ const char *const photoExtensions[] = {".jpg",  ".jpeg", ".jpe",  ".png",
                                        ".webp", ".heic", ".heif", ".gif"};
 const char privateMark[] = ".private";
 constexpr std::int64_t nanoseconds = 1'000'000'000;
+constexpr std::int64_t latestSecond = 9'000'000'000; // in the year 2255
 
 // Most entries are told apart without asking the file system about each.
 bool mayMatter(const dirent &entry)
@@ -45,9 +45,7 @@ void addEntry(FolderListing &listing, const char *name, const struct stat &statu
     if (S_ISDIR(status.st_mode))
         listing.folders.push_back({name, status.st_dev, status.st_ino, isLink});
     else if (S_ISREG(status.st_mode) && hasPhotoName(name))
-        listing.files.push_back({name, status.st_size,
-                                 status.st_mtim.tv_sec * nanoseconds + status.st_mtim.tv_nsec,
-                                 isLink});
+        listing.files.push_back({name, status.st_size, timeOfChange(status), isLink});
 }
 
 template <typename Entries>
@@ -79,6 +77,14 @@ std::optional<FolderListing> listFolder(const std::string &path)
     sortByName(listing.files);
     sortByName(listing.folders);
     return listing;
+}
+
+// File systems keep times that 64 bits of nanoseconds cannot hold.
+std::int64_t timeOfChange(const struct stat &status)
+{
+    const std::int64_t seconds =
+        std::clamp<std::int64_t>(status.st_mtim.tv_sec, -latestSecond, latestSecond);
+    return seconds * nanoseconds + status.st_mtim.tv_nsec;
 }
 
 bool hasPhotoName(const std::string &name)

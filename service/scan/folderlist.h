@@ -1,5 +1,7 @@
 #pragma once
 
+#include <sys/stat.h>
+
 #include <cstdint>
 #include <optional>
 #include <string>
@@ -35,3 +37,6 @@ struct FolderListing
 std::optional<FolderListing> listFolder(const std::string &path);
 
 bool hasPhotoName(const std::string &name);
+
+// As in ListedFile::changed.
+std::int64_t timeOfChange(const struct stat &status);

@@ -105,7 +105,7 @@ void Scanner::scanAll()
         applyImports(mDatabase);
         if (isNewlyWatched)
             requestScan(); // for what has changed between the look and the watch
-    } catch (const SQLite::Exception &exception) {
+    } catch (const std::exception &exception) {
         spdlog::error("the scan was cut short: {}", exception.what());
     }
 }

@@ -105,8 +105,9 @@ void UserScan::enter(const Place &parent, const ListedFolder &folder)
         walk({path, parent.isPrivate || listing->isMarkedPrivate}, *listing);
         return;
     }
-    spdlog::warn("the folder {} cannot be read", validUtf8(pathOf(path)));
-    mLeftOut[path] = std::string("the folder cannot be read: ") + std::strerror(errno);
+    const std::string reason = std::string("the folder cannot be read: ") + std::strerror(errno);
+    spdlog::warn("{}: {}", validUtf8(pathOf(path)), reason);
+    mLeftOut[path] = reason;
     mUnreadableFolders.insert(path);
 }
 
@@ -134,10 +135,7 @@ void UserScan::compare(const Place &place, const FolderListing &listing)
         if (changes.found.size() >= filesPerBatch)
             add(std::exchange(changes, {stateOf(place), {}, {}, {}}), true);
     }
-    for (const auto &[name, file] : known) {
-        if (file.isPresent && mMoved.count(file.id) == 0)
-            changes.gone.push_back(file.id);
-    }
+    addGone(changes, known);
     add(std::move(changes), isKnown && album->second.isPrivate != place.isPrivate);
 }
 
@@ -152,6 +150,14 @@ void UserScan::compareFile(FolderChanges &changes, const std::string &folder,
         changes.found.push_back(std::move(found));
     } else if (!known->isPresent) {
         changes.back.push_back(known->id);
+    }
+}
+
+void UserScan::addGone(FolderChanges &changes, const std::map<std::string, KnownFile> &left) const
+{
+    for (const auto &[name, file] : left) {
+        if (file.isPresent && mMoved.count(file.id) == 0)
+            changes.gone.push_back(file.id);
     }
 }
 
@@ -205,10 +211,7 @@ void UserScan::dropUnseenAlbums()
             continue;
         FolderChanges changes{stateOf({folder, album.isPrivate}), {}, {}, {}};
         auto reader = mDatabase.read();
-        for (const auto &[name, file] : knownFiles(reader, album.id)) {
-            if (file.isPresent && mMoved.count(file.id) == 0)
-                changes.gone.push_back(file.id);
-        }
+        addGone(changes, knownFiles(reader, album.id));
         add(std::move(changes), false);
     }
 }

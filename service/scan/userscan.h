@@ -48,6 +48,7 @@ private:
     void compare(const Place &place, const FolderListing &listing);
     void compareFile(FolderChanges &changes, const std::string &folder, const ListedFile &file,
                      const KnownFile *known);
+    void addGone(FolderChanges &changes, const std::map<std::string, KnownFile> &left) const;
     FoundFile readFile(const std::string &folder, const ListedFile &file);
     std::int64_t formerPhoto(const FoundFile &file);
     bool hasLeft(const LikePhoto &photo, const std::string &newName) const;
