@@ -4,6 +4,7 @@
 #include "base/texts.h"
 #include "feeds/feedwriter.h"
 #include "feeds/shownphotos.h"
+#include "http/filebody.h"
 #include "index/catalogue.h"
 #include "index/database.h"
 #include "pictures/thumbnailstore.h"
@@ -39,6 +40,17 @@ void setCaching(httplib::Response &response, const std::string &tag)
 {
     response.set_header("ETag", tag);
     response.set_header("Cache-Control", "private, max-age=86400");
+}
+
+// False when it is the file at the path itself and cannot be read.
+bool answerWith(httplib::Response &response, const std::string &path,
+                ThumbnailStore::Result &picture)
+{
+    if (picture.isOriginal)
+        return answerWithFile(response, path, picture.mimeType);
+    response.set_header("Content-Type", picture.mimeType);
+    response.body = std::move(picture.bytes);
+    return true;
 }
 
 } // namespace
@@ -84,11 +96,9 @@ void PhotoPictures::answer(const std::string &key, int width, const httplib::Req
         return;
     }
     ThumbnailStore::Result picture = mStore.picture(file->path, file->identity, width);
-    if (!picture.ok()) {
-        const bool isThere = ::access(file->path.c_str(), R_OK) == 0;
-        return answerError(response, isThere ? 415 : notFound, picture.error);
-    }
-    setCaching(response, tag);
-    response.set_header("Content-Type", picture.mimeType);
-    response.body = std::move(picture.bytes);
+    if (picture.ok() && answerWith(response, file->path, picture))
+        return setCaching(response, tag);
+    const bool isThere = ::access(file->path.c_str(), R_OK) == 0;
+    answerError(response, isThere ? 415 : notFound,
+                picture.ok() ? "the file cannot be read" : picture.error);
 }

@@ -69,6 +69,6 @@ void logRequest(const httplib::Request &request, const httplib::Response &respon
 {
     const std::chrono::duration<double, std::milli> took = Clock::now() - requestStart;
     spdlog::info("{} {} {} {} {} B {:.1f} ms", request.remote_addr, printable(request.method),
-                 printable(withoutSecrets(request.target)), response.status, response.body.size(),
-                 took.count());
+                 printable(withoutSecrets(request.target)), response.status,
+                 response.get_header_value("Content-Length"), took.count());
 }

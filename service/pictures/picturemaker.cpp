@@ -1,7 +1,6 @@
 #include "pictures/picturemaker.h"
 
 #include "pictures/photofile.h"
-#include "pictures/wholefile.h"
 
 namespace {
 
@@ -9,11 +8,11 @@ constexpr int jpegQuality = 88;
 // Behind transparent parts: the dark of the television's screens.
 constexpr double backgroundLevel = 24;
 
-MadePicture failure(std::string error)
+using Result = ThumbnailStore::Result;
+
+Result failure(std::string error)
 {
-    MadePicture made;
-    made.result.error = std::move(error);
-    return made;
+    return {{}, {}, std::move(error), false};
 }
 
 // Whether the file's own bytes are what a full-size picture has to be.
@@ -62,7 +61,7 @@ GObjectPtr<VipsImage> flattened(VipsImage *image)
     return GObjectPtr<VipsImage>(vips_cast_uchar(opaque, &bytes, nullptr) == 0 ? bytes : nullptr);
 }
 
-MadePicture encoded(VipsImage *image)
+Result encoded(VipsImage *image)
 {
     void *buffer = nullptr;
     std::size_t size = 0;
@@ -70,27 +69,23 @@ MadePicture encoded(VipsImage *image)
                              "optimize_coding", TRUE, "interlace", FALSE, "subsample_mode",
                              VIPS_FOREIGN_SUBSAMPLE_ON, nullptr) != 0)
         return failure(takeVipsError());
-    MadePicture made;
-    made.result.bytes.assign(static_cast<const char *>(buffer), size);
-    made.result.mimeType = "image/jpeg";
+    Result made;
+    made.bytes.assign(static_cast<const char *>(buffer), size);
+    made.mimeType = "image/jpeg";
     g_free(buffer);
     return made;
 }
 
 } // namespace
 
-MadePicture makePicture(const std::string &sourcePath, int width)
+ThumbnailStore::Result makePicture(const std::string &sourcePath, int width)
 {
     PhotoFile file(sourcePath);
     const GObjectPtr<VipsImage> header = file.readHeader();
     if (!header)
         return failure(file.error());
-    if (width == 0 && isUprightSrgbJpeg(file, header.get())) {
-        MadePicture original;
-        original.isOriginal = true;
-        original.result = {readWholeFile(sourcePath), "image/jpeg", {}};
-        return original.result.bytes.empty() ? failure("the file cannot be read") : original;
-    }
+    if (width == 0 && isUprightSrgbJpeg(file, header.get()))
+        return {{}, "image/jpeg", {}, true};
     const GObjectPtr<VipsImage> shrunk = shrunkUpright(file.source(), header.get(), width);
     const GObjectPtr<VipsImage> opaque = shrunk ? flattened(shrunk.get()) : nullptr;
     return opaque ? encoded(opaque.get()) : failure(takeVipsError());

@@ -36,8 +36,20 @@ private:
 
     Answer findOrMake(const std::string &sourcePath, const std::string &key, int width);
     Result make(const std::string &sourcePath, const std::string &key, int width);
-    void takeTurn();
-    void endTurn();
+
+    // Decoding takes memory for the whole photo, so only as many are decoded at once as there are
+    // cores.
+    class Turn
+    {
+    public:
+        explicit Turn(Private &store);
+        ~Turn();
+        Turn(const Turn &) = delete;
+        Turn &operator=(const Turn &) = delete;
+
+    private:
+        Private &mStore;
+    };
 
     PictureFolder mFolder;
     std::mutex mMutex;
@@ -79,36 +91,37 @@ ThumbnailStore::Private::Answer ThumbnailStore::Private::findOrMake(const std::s
         if (result->bytes.empty())
             *result = make(sourcePath, key, width);
     } catch (const std::exception &problem) { // memory or the file system gave out
-        *result = {{}, {}, problem.what()};
+        *result = {{}, {}, problem.what(), false};
     }
     return result;
 }
 
-// Decoding takes memory for the whole photo, so only as many are decoded at once as there are
-// cores.
 ThumbnailStore::Result ThumbnailStore::Private::make(const std::string &sourcePath,
                                                      const std::string &key, int width)
 {
-    takeTurn();
-    MadePicture made = makePicture(sourcePath, width);
-    endTurn();
-    if (made.result.ok() && !made.isOriginal)
-        mFolder.keep(key, made.result.bytes);
-    return std::move(made.result);
+    Result made;
+    {
+        const Turn turn(*this);
+        made = makePicture(sourcePath, width);
+    }
+    if (made.ok() && !made.isOriginal)
+        mFolder.keep(key, made.bytes);
+    return made;
 }
 
-void ThumbnailStore::Private::takeTurn()
+ThumbnailStore::Private::Turn::Turn(Private &store)
+    : mStore(store)
 {
-    std::unique_lock<std::mutex> lock(mMutex);
-    mTurnEnded.wait(lock, [this] { return mFreeTurns > 0; });
-    --mFreeTurns;
+    std::unique_lock<std::mutex> lock(mStore.mMutex);
+    mStore.mTurnEnded.wait(lock, [this] { return mStore.mFreeTurns > 0; });
+    --mStore.mFreeTurns;
 }
 
-void ThumbnailStore::Private::endTurn()
+ThumbnailStore::Private::Turn::~Turn()
 {
-    const std::lock_guard<std::mutex> lock(mMutex);
-    ++mFreeTurns;
-    mTurnEnded.notify_one();
+    const std::lock_guard<std::mutex> lock(mStore.mMutex);
+    ++mStore.mFreeTurns;
+    mStore.mTurnEnded.notify_one();
 }
 
 ThumbnailStore::ThumbnailStore(std::string folder, std::int64_t maximumBytes)

@@ -16,6 +16,8 @@ public:
         std::string bytes;
         std::string mimeType;
         std::string error; // why there is no picture; empty when there is one
+        // The photo's own file is the picture: it is for the caller to read, `bytes` is empty.
+        bool isOriginal = false;
 
         bool ok() const { return error.empty(); }
     };

@@ -30,17 +30,15 @@ TEST_F(ThumbnailStoreTest, TurnsEveryOrientationUpright)
             const bool swaps = orientation > 4;
             writePicture(photo, swaps ? 80 : 120, swaps ? 120 : 80, orientation);
             const auto result = store.picture(photo, std::to_string(orientation), width);
-            ASSERT_TRUE(result.ok()) << result.error;
-            const Decoded shown = decode(result.bytes);
+            EXPECT_EQ(result.isOriginal, orientation == 1 && width == 0);
+            const Decoded shown = decode(result.isOriginal ? readWholeFile(photo) : result.bytes);
             EXPECT_EQ(shown.width, width ? 60 : 120) << orientation;
             EXPECT_EQ(shown.height, width ? 40 : 80) << orientation;
             EXPECT_EQ(shown.quarters, upright[orientation - 1]) << orientation << " at " << width;
             EXPECT_FALSE(shown.hasMetadata && width) << orientation;
-            const auto metadata = readPhotoMetadata(photo, nullptr);
-            ASSERT_TRUE(metadata) << orientation;
-            EXPECT_EQ(metadata->orientation, orientation);
-            EXPECT_EQ(metadata->width, 120) << orientation;
-            EXPECT_EQ(metadata->height, 80) << orientation;
+            const auto metadata = readPhotoMetadata(photo, nullptr).value_or(PhotoMetadata());
+            EXPECT_EQ(metadata.width, 120) << orientation;
+            EXPECT_EQ(metadata.height, 80) << orientation;
         }
 }
 
@@ -52,7 +50,6 @@ TEST_F(ThumbnailStoreTest, MakesTheWidthAskedForAndNeverEnlarges)
                                                     {300, 300}, {2000, 300}, {100000, 300}};
     for (const auto &[asked, width] : cases)
         EXPECT_EQ(decode(store.picture(photo, "a", asked).bytes).width, width) << asked;
-    EXPECT_EQ(store.picture(photo, "a", 0).bytes, readWholeFile(photo));
 }
 
 TEST_F(ThumbnailStoreTest, KeepsWhatItMadeAndMakesAgainWhatWasDamaged)
@@ -88,30 +85,23 @@ TEST_F(ThumbnailStoreTest, AnswersManyThreadsAtOnce)
     EXPECT_EQ(contentsOf(cache).files, 2);
 }
 
-TEST_F(ThumbnailStoreTest, AnswersBadPhotosWithAnError)
+TEST_F(ThumbnailStoreTest, AnswersBadPhotosWithAnErrorAndDoesWithoutAFolder)
 {
     writePicture(photo, 1200, 800);
     const std::string whole = readWholeFile(photo);
+    writeBytes(cache, "a file where the folder should be");
     ThumbnailStore store(cache, plenty);
+    for (int i = 0; i < 2; ++i)
+        EXPECT_EQ(decode(store.picture(photo, "a", 60).bytes).width, 60);
     writeBytes(photo, whole.substr(0, whole.size() / 2));
     EXPECT_EQ(store.picture(photo, "cut", 320).error, "VipsJpeg: Premature end of input file");
     writeBytes(photo, std::string(5000, '\xff'));
     EXPECT_FALSE(store.picture(photo, "garbage", 320).ok());
     EXPECT_FALSE(store.picture(folder.file(""), "folder", 320).ok());
-    EXPECT_EQ(contentsOf(cache).files, 0);
-}
-
-TEST_F(ThumbnailStoreTest, AnswersWithoutAFolder)
-{
-    writePicture(photo, 120, 80);
-    writeBytes(cache, "a file where the folder should be");
-    ThumbnailStore store(cache, plenty);
-    for (int i = 0; i < 2; ++i)
-        EXPECT_EQ(decode(store.picture(photo, "a", 60).bytes).width, 60);
     EXPECT_EQ(readWholeFile(cache), "a file where the folder should be");
 }
 
-TEST_F(ThumbnailStoreTest, DropsTheLongestUnused)
+TEST_F(ThumbnailStoreTest, DropsTheLongestUnusedAndNothingElse)
 {
     writePicture(photo, 1200, 800);
     std::int64_t size = 0;
@@ -126,16 +116,14 @@ TEST_F(ThumbnailStoreTest, DropsTheLongestUnused)
     }
     EXPECT_LE(contentsOf(cache).bytes, size / 2);
     EXPECT_GT(contentsOf(cache).bytes, size / 4);
-    fs::remove(photo);
-    ThumbnailStore store(cache, size / 2);
-    EXPECT_TRUE(store.picture(photo, "a", 400).ok());
-    EXPECT_TRUE(store.picture(photo, "a", 419).ok());
-    EXPECT_FALSE(store.picture(photo, "a", 401).ok());
-}
-
-TEST_F(ThumbnailStoreTest, StaysBelowItsBoundAndDropsNothingElse)
-{
-    writePicture(photo, 1200, 800);
+    fs::rename(photo, photo + ".away");
+    {
+        ThumbnailStore store(cache, size / 2);
+        EXPECT_TRUE(store.picture(photo, "a", 400).ok());
+        EXPECT_TRUE(store.picture(photo, "a", 419).ok());
+        EXPECT_FALSE(store.picture(photo, "a", 401).ok());
+    }
+    fs::rename(photo + ".away", photo);
     fs::create_directories(cache + "/ab/cd");
     writeBytes(cache + "/ab/cd/holiday.jpg", std::string(30'000, 'x'));
     {
