@@ -163,8 +163,11 @@ CREATE TABLE leftOut (
 ) WITHOUT ROWID;
 )sql";
 
+// The next scan reads all files again, for the people whom they name.
+const char peopleInFiles[] = "UPDATE photos SET changed = 0 WHERE error = ''";
+
 const char *const steps[] = {firstVersion,      givenTexts, featuredMemory, gatheredAlbums,
-                             searchInAnyScript, movedFiles, leftOut};
+                             searchInAnyScript, movedFiles, leftOut,        peopleInFiles};
 static_assert(sizeof steps / sizeof steps[0] == newestSchema);
 
 } // namespace

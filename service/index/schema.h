@@ -4,7 +4,7 @@
 
 class Session;
 
-constexpr int newestSchema = 7;
+constexpr int newestSchema = 8;
 
 // Brings the index from whatever version it has to the newest (tests stop at an older one), one
 // step per version, inside the caller's transaction. False for a file that a newer version of the

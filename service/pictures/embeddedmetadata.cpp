@@ -131,29 +131,66 @@ std::string firstOf(std::string first, Texts... others)
     return first;
 }
 
+constexpr std::size_t mostKeywords = 1000;
+
 void addKeyword(const std::string &raw, std::vector<std::string> *keywords)
 {
     const std::string keyword = cleanMetadataText(raw);
-    if (!keyword.empty() &&
+    if (!keyword.empty() && keywords->size() < mostKeywords &&
         std::find(keywords->begin(), keywords->end(), keyword) == keywords->end())
         keywords->push_back(keyword);
+}
+
+void addSubjects(const Exiv2::XmpData &xmp, std::vector<std::string> *keywords)
+{
+    const auto subjects = xmp.findKey(Exiv2::XmpKey("Xmp.dc.subject"));
+    for (long i = 0; subjects != xmp.end() && i < subjects->count(); ++i)
+        addKeyword(subjects->toString(i), keywords);
+}
+
+void addIptcKeywords(const Exiv2::IptcData &iptc, std::vector<std::string> *keywords)
+{
+    for (const Exiv2::Iptcdatum &datum : iptc)
+        if (datum.key() == "Iptc.Application2.Keywords")
+            addKeyword(datum.toString(), keywords);
+}
+
+bool isWithin(const std::string &key, const std::string &start, const std::string &end)
+{
+    return key.rfind(start, 0) == 0 && key.size() >= start.size() + end.size() &&
+           key.compare(key.size() - end.size(), end.size(), end) == 0;
+}
+
+// Whether the value names a face in the photo: programs mark them in two ways. What is below a
+// structure has the prefixes that the file gives it.
+bool isFaceName(const Exiv2::XmpData &xmp, const std::string &key)
+{
+    const std::string name = "Name";
+    if (isWithin(key, "Xmp.MP.RegionInfo/", ":PersonDisplayName"))
+        return true;
+    if (!isWithin(key, "Xmp.mwg-rs.Regions/", ":" + name))
+        return false;
+    const auto type = xmp.findKey(Exiv2::XmpKey(key.substr(0, key.size() - name.size()) + "Type"));
+    return type == xmp.end() || type->toString() == "Face";
+}
+
+void addPeople(const Exiv2::XmpData &xmp, std::vector<std::string> *keywords)
+{
+    const auto listed = xmp.findKey(Exiv2::XmpKey("Xmp.iptcExt.PersonInImage"));
+    for (long i = 0; listed != xmp.end() && i < listed->count(); ++i)
+        addKeyword(listed->toString(i), keywords);
+    for (const Exiv2::Xmpdatum &datum : xmp)
+        if (isFaceName(xmp, datum.key()))
+            addKeyword(datum.toString(), keywords);
 }
 
 std::vector<std::string> keywordsOf(const Exiv2::XmpData &xmp, const Exiv2::IptcData &iptc)
 {
     std::vector<std::string> keywords;
-    guarded([&] {
-        const auto subjects = xmp.findKey(Exiv2::XmpKey("Xmp.dc.subject"));
-        for (long i = 0; subjects != xmp.end() && i < subjects->count(); ++i)
-            addKeyword(subjects->toString(i), &keywords);
-    });
-    if (!keywords.empty())
-        return keywords;
-    guarded([&] {
-        for (const Exiv2::Iptcdatum &datum : iptc)
-            if (datum.key() == "Iptc.Application2.Keywords")
-                addKeyword(datum.toString(), &keywords);
-    });
+    guarded([&] { addSubjects(xmp, &keywords); });
+    if (keywords.empty())
+        guarded([&] { addIptcKeywords(iptc, &keywords); });
+    guarded([&] { addPeople(xmp, &keywords); });
     return keywords;
 }
 

@@ -12,6 +12,6 @@ struct EmbeddedMetadata
     std::string_view xmp;
 };
 
-// Fills in the texts, the time and the place. XMP wins over IPTC, and IPTC over EXIF. A damaged
-// block is left out. May be called from any thread.
+// Fills in the texts, the time and the place. XMP wins over IPTC, and IPTC over EXIF; people who
+// are named in XMP count as keywords. A damaged block is left out. May be called from any thread.
 void readEmbeddedMetadata(const EmbeddedMetadata &blocks, PhotoMetadata *metadata);

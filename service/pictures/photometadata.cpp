@@ -19,7 +19,6 @@ PhotoMetadata metadataOf(VipsImage *image)
     PhotoMetadata metadata;
     metadata.width = vips_image_get_width(image);
     metadata.height = vips_image_get_height(image);
-    metadata.orientation = vips_image_get_orientation(image);
     if (vips_image_get_orientation_swap(image))
         std::swap(metadata.width, metadata.height);
     readEmbeddedMetadata({block(image, VIPS_META_EXIF_NAME), block(image, VIPS_META_IPTC_NAME),

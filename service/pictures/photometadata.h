@@ -10,10 +10,9 @@ struct PhotoMetadata
 {
     int width = 0; // upright pixels: already swapped for the orientations that lie on a side
     int height = 0;
-    int orientation = 1; // the file's EXIF orientation, 1 to 8
     std::string title;
     std::string caption;
-    std::vector<std::string> keywords; // in the file's order, each once
+    std::vector<std::string> keywords; // in the file's order, each once; then whom it shows
     std::string taken;                 // local time as 2026-05-01T10:00:00, empty if unknown
     std::optional<double> latitude;    // degrees, north positive
     std::optional<double> longitude;   // degrees, east positive

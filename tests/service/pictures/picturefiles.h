@@ -32,7 +32,7 @@ void writePicture(const std::string &path, int width, int height, int orientatio
 // Sets an EXIF, IPTC or XMP value in the file; may be repeated for values that come in lists.
 void addMetadata(const std::string &path, const std::string &key, const std::string &value);
 
-void writeBytes(const std::string &path, const std::string &bytes);
+void writeBytes(const std::string &path, const std::string &bytes = {});
 
 // Number and total size of the files below a folder.
 struct Contents
