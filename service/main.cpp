@@ -1,5 +1,6 @@
 #include "cli/commands.h"
 #include "cli/serve.h"
+#include "index/users.h"
 
 #include <CLI/CLI.hpp>
 
@@ -41,6 +42,7 @@ void addServe(CLI::App &program, ServeOptions &options, int &result)
     command->add_option("--photos", options.photos, "Photo folder of the first user")
         ->check(CLI::ExistingDirectory);
     command->add_option("--user", options.user, "Mail of the first user, if there is none yet")
+        ->check(CLI::Validator(mailProblem, "", "mail"))
         ->capture_default_str();
     command->add_option("--listen", service.listen, "Address to listen on")->capture_default_str();
     command->add_option("--port", service.port, "Port to listen on, 0 for a free one")
@@ -93,17 +95,20 @@ void addUsers(CLI::App &program, UserOptions &options, int &result)
     CLI::App *token = users->add_subcommand("token", "Print tokens for a user, valid for 90 days");
     CLI::App *password = users->add_subcommand(
         "passwd", "Give a user a password, the first line of the input; ends their sign-ins");
-    for (CLI::App *command : {add, list, remove, token, password})
+    CLI::App *signOut = users->add_subcommand(
+        "sign-out", "End a user's sign-ins on all screens, as when a television is lost");
+    for (CLI::App *command : {add, list, remove, token, password, signOut})
         addData(command, options.data);
-    for (CLI::App *command : {add, remove, token, password})
+    for (CLI::App *command : {add, remove, token, password, signOut})
         command->add_option("mail", options.mail, "The user's mail address")->required();
     add->add_option("--name", options.name, "The name that others see")->required();
     add->add_option("--photos", options.photos, "The user's photo folder");
-    add->callback([&] { result = runUserAdd(options); });
     add->add_flag("--password", options.readsPassword, "Read a password as passwd does");
+    add->callback([&] { result = runUserAdd(options); });
     list->callback([&] { result = runUserList(options.data); });
     remove->callback([&] { result = runUserRemove(options.data, options.mail); });
     password->callback([&] { result = runUserPassword(options.data, options.mail); });
+    signOut->callback([&] { result = runUserSignOut(options.data, options.mail); });
     token->callback([&] { result = runUserToken(options.data, options.mail); });
 }
 
@@ -133,6 +138,7 @@ int main(int argc, char **argv)
     CLI::App program("Serves folders of photos to the album browser.", "orvala-service");
     program.require_subcommand(1);
     program.set_config("--config", "", "Settings from a file, those of serve below a line [serve]");
+    program.allow_config_extras(CLI::config_extras_mode::error);
     const std::string standardData = "orvala-data";
     ServeOptions serve;
     serve.service.data = standardData;

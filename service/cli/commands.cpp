@@ -40,16 +40,9 @@ int withIndex(const std::string &data, const std::function<int(Database &)> &wor
         return fail(error);
     try {
         return work(*database);
-    } catch (const SQLite::Exception &exception) {
+    } catch (const std::exception &exception) {
         return fail(exception.what());
     }
-}
-
-bool isMail(const std::string &mail)
-{
-    const std::size_t at = mail.find('@');
-    return at != std::string::npos && at > 0 && at + 1 < mail.size() &&
-           mail.find_first_of(" \t\r\n/?#&") == std::string::npos;
 }
 
 bool isFolder(const std::string &path)
@@ -82,8 +75,8 @@ std::string readPassword()
 
 int runUserAdd(const UserOptions &options)
 {
-    if (!isMail(options.mail))
-        return fail("\"" + options.mail + "\" is no mail address");
+    if (const std::string problem = mailProblem(options.mail); !problem.empty())
+        return fail(problem);
     if (!options.photos.empty() && !isFolder(options.photos))
         return fail("there is no folder " + options.photos);
     const std::string password = options.readsPassword ? readPassword() : "";
@@ -125,6 +118,13 @@ int runUserPassword(const std::string &data, const std::string &mail)
         return fail(problem);
     return withIndex(data, [&](Database &database) {
         return setPassword(database, mail, password) ? 0 : fail("there is no user " + mail);
+    });
+}
+
+int runUserSignOut(const std::string &data, const std::string &mail)
+{
+    return withIndex(data, [&](Database &database) {
+        return signOut(database, mail) ? 0 : fail("there is no user " + mail);
     });
 }
 

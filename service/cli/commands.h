@@ -18,6 +18,8 @@ int runUserList(const std::string &data);
 int runUserRemove(const std::string &data, const std::string &mail);
 // The new password is the first line of the input.
 int runUserPassword(const std::string &data, const std::string &mail);
+// Ends the user's sign-ins, on all screens.
+int runUserSignOut(const std::string &data, const std::string &mail);
 // Prints {"access_token", "refresh_token", "expires_in"}.
 int runUserToken(const std::string &data, const std::string &mail);
 // Paths in the file start at the folder, when one is given.

@@ -120,9 +120,9 @@ void apply(Session &session, const Waiting &item, std::int64_t photoId)
               "INSERT INTO comments (photo, author, content, published) VALUES (?, ?, ?, ?)",
               photoId, item.author, item.content, item.published.empty() ? now : item.published)
             .run();
-    else
+    for (const std::string &tag : tagsIn(item.kind == tagKind ? item.content : ""))
         Query(session, "INSERT OR IGNORE INTO tags (photo, tag, author) VALUES (?, ?, ?)", photoId,
-              item.content, item.author)
+              tag, item.author)
             .run();
     Query(session, "UPDATE imports SET done = 1 WHERE id = ?", item.id).run();
     refreshPhotoSearch(session, photoId);
@@ -141,15 +141,15 @@ int applyWaiting(Session &session)
     return waiting;
 }
 
-bool checkPasswords(const json &document, std::string *error)
+bool checkUsers(const json &document, std::string *error)
 {
     for (const json &user : document.value("users", json::array())) {
+        const std::string mail = textOf(user, "mail");
         const std::string problem =
             user.contains("password") ? passwordProblem(textOf(user, "password")) : "";
-        if (problem.empty())
-            continue;
-        *error = textOf(user, "mail") + ": " + problem;
-        return false;
+        *error = problem.empty() ? mailProblem(mail) : mail + ": " + problem;
+        if (!error->empty())
+            return false;
     }
     return true;
 }
@@ -193,7 +193,7 @@ bool checkShape(const json &document, std::string *error)
     return checkList(document, "users", {"mail", "name"}, error) &&
            checkList(document, "comments", {"photo", "author", "text"}, error) &&
            checkList(document, "tags", {"photo", "author", "tag"}, error) &&
-           checkTimes(document, error) && checkPasswords(document, error);
+           checkTimes(document, error) && checkUsers(document, error);
 }
 
 void makeAbsolute(json &entry, const char *key, const std::filesystem::path &folder)

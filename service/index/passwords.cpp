@@ -2,6 +2,7 @@
 
 #include "base/secrets.h"
 #include "index/database.h"
+#include "index/tokens.h"
 #include "index/users.h"
 
 namespace {
@@ -37,10 +38,11 @@ bool setPassword(Database &database, const std::string &mail, const std::string 
 {
     const std::string hash = passwordHash(password);
     Database::Writer writer(database);
-    if (Query(writer, "UPDATE users SET password = ? WHERE mail = ?", hash, mail).run() == 0)
+    const auto user = userWithMail(writer, mail);
+    if (!user)
         return false;
-    Query(writer, "DELETE FROM tokens WHERE user = (SELECT id FROM users WHERE mail = ?)", mail)
-        .run();
+    Query(writer, "UPDATE users SET password = ? WHERE id = ?", hash, user->id).run();
+    endTokens(writer, user->id);
     writer.commit();
     return true;
 }

@@ -3,6 +3,7 @@
 #include "base/secrets.h"
 #include "base/texts.h"
 #include "index/database.h"
+#include "index/users.h"
 
 #include <limits>
 
@@ -57,6 +58,22 @@ std::optional<std::string> refreshAccess(Database &database, const std::string &
     std::string token = issue(writer, userId, accessKind, currentSeconds() + seconds);
     writer.commit();
     return token;
+}
+
+void endTokens(Session &writer, std::int64_t userId)
+{
+    Query(writer, "DELETE FROM tokens WHERE user = ?", userId).run();
+}
+
+bool signOut(Database &database, const std::string &mail)
+{
+    Database::Writer writer(database);
+    const auto user = userWithMail(writer, mail);
+    if (!user)
+        return false;
+    endTokens(writer, user->id);
+    writer.commit();
+    return true;
 }
 
 std::optional<UserRecord> userOfToken(Session &session, const std::string &accessToken)

@@ -39,6 +39,14 @@ std::optional<UserRecord> userWithMail(Session &session, const std::string &mail
         Query(session, "SELECT id, mail, name, photos FROM users WHERE mail = ?", mail));
 }
 
+std::string mailProblem(const std::string &mail)
+{
+    const std::size_t at = mail.find('@');
+    const bool isMail = at != std::string::npos && at > 0 && at + 1 < mail.size() &&
+                        mail.find_first_of(" \t\r\n/?#&") == std::string::npos;
+    return isMail ? std::string() : "\"" + mail + "\" is no mail address";
+}
+
 std::int64_t saveUser(Session &writer, const UserRecord &user)
 {
     Query(writer,

@@ -12,6 +12,9 @@ std::vector<UserRecord> allUsers(Session &session);
 std::optional<UserRecord> userWithId(Session &session, std::int64_t id);
 std::optional<UserRecord> userWithMail(Session &session, const std::string &mail);
 
+// Why a text cannot be a user's mail address; empty when it can. Users go by it in addresses.
+std::string mailProblem(const std::string &mail);
+
 // Adds the user or changes name and folder of the one with this mail; an empty folder leaves the
 // folder as it was. The result is the user's id.
 std::int64_t saveUser(Session &writer, const UserRecord &user);
