@@ -12,10 +12,9 @@
 class Database;
 class Scanner;
 
-// The running service: index, scan and server. Everything it keeps is in its data folder.
 struct ServiceSettings
 {
-    std::string data;
+    std::string data; // folder of all that the service keeps
     std::string listen = "127.0.0.1";
     int port = 0; // 0: a free one
     bool withTls = true;
@@ -29,6 +28,7 @@ struct ServiceSettings
     std::int64_t thumbnailBytes = std::int64_t(8) << 30;
 };
 
+// The running service: index, scan and server.
 class Service
 {
 public:

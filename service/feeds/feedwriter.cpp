@@ -31,10 +31,33 @@ Size fitted(const PhotoRecord &photo, const Box &box)
             std::max(1, int(photo.height * scale + 0.5))};
 }
 
+FeedJson feedText(const std::string &text)
+{
+    return {{"$t", text}};
+}
+
+FeedJson feedNumber(std::int64_t number)
+{
+    return feedText(std::to_string(number));
+}
+
+// Where the picture of a photo is fetched; "/s" and a width go in front of the last "/" for a
+// smaller one.
+std::string pictureAddress(const PhotoRecord &photo, const std::string &origin)
+{
+    const std::string name = percentEncoded(withoutExtension(photo.fileName));
+    return origin + "/photos/" + photo.key + "/" + name + ".jpg";
+}
+
 std::string sizedAddress(const PhotoRecord &photo, const std::string &origin, int width)
 {
     std::string address = pictureAddress(photo, origin);
     return address.insert(address.rfind('/'), "/s" + std::to_string(width));
+}
+
+std::string thumbnailAddress(const PhotoRecord &photo, const std::string &origin)
+{
+    return sizedAddress(photo, origin, fitted(photo, thumbnailBoxes.back()).width);
 }
 
 FeedJson thumbnail(const PhotoRecord &photo, const std::string &origin, const Box &box)
@@ -100,27 +123,6 @@ void addPlace(FeedJson &entry, const PhotoRecord &photo)
 }
 
 } // namespace
-
-FeedJson feedText(const std::string &text)
-{
-    return {{"$t", text}};
-}
-
-FeedJson feedNumber(std::int64_t number)
-{
-    return feedText(std::to_string(number));
-}
-
-std::string pictureAddress(const PhotoRecord &photo, const std::string &origin)
-{
-    const std::string name = percentEncoded(withoutExtension(photo.fileName));
-    return origin + "/photos/" + photo.key + "/" + name + ".jpg";
-}
-
-std::string thumbnailAddress(const PhotoRecord &photo, const std::string &origin)
-{
-    return sizedAddress(photo, origin, fitted(photo, thumbnailBoxes.back()).width);
-}
 
 FeedJson photoEntry(const PhotoRecord &photo, const std::string &origin)
 {

@@ -15,9 +15,6 @@ using FeedJson = nlohmann::ordered_json;
 // The width of the largest picture that a grid shows, in pixels.
 constexpr int widestThumbnail = 336;
 
-FeedJson feedText(const std::string &text);
-FeedJson feedNumber(std::int64_t number);
-
 // `origin` is what all addresses begin with, as in "https://192.168.1.5:8443".
 FeedJson photoEntry(const PhotoRecord &photo, const std::string &origin);
 // `cover` may be null.
@@ -43,9 +40,3 @@ std::string feedDocument(const FeedHead &head, FeedJson entries);
 
 // One entry alone, as the answer to what was posted.
 std::string entryDocument(FeedJson entry);
-
-// Where the picture of a photo is fetched; "/s" and a width go in front of the last "/" for a
-// smaller one.
-std::string pictureAddress(const PhotoRecord &photo, const std::string &origin);
-// The same, in the size in which grids show it.
-std::string thumbnailAddress(const PhotoRecord &photo, const std::string &origin);

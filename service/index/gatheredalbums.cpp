@@ -13,10 +13,6 @@ namespace {
 constexpr std::int64_t mostOfList = 500;
 constexpr std::int64_t all = 1'000'000'000;
 
-const std::array<const char *, 12> monthNames = {"January",   "February", "March",    "April",
-                                                 "May",       "June",     "July",     "August",
-                                                 "September", "October",  "November", "December"};
-
 // Which photos an album holds and in which order. The condition's values are the user (?1), the
 // bounds `from` and `to` (?2, ?3) and a time before which the photos were taken (?4).
 struct Selection
@@ -93,8 +89,7 @@ Selection period(const std::string &text)
     selection.to = text + "~";
     if (const std::size_t dash = text.find('-'); dash != std::string::npos) {
         selection.feedId = "month-" + text;
-        const std::size_t month = static_cast<std::size_t>(std::stoi(text.substr(dash + 1)));
-        selection.title = std::string(monthNames[month - 1]) + " " + text.substr(0, dash);
+        selection.title = monthName(std::stoi(text.substr(dash + 1))) + " " + text.substr(0, dash);
     }
     return selection;
 }

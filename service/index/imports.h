@@ -7,8 +7,8 @@
 class Database;
 
 // Brings in users, comments and tags from elsewhere. Importing the same again changes nothing. What
-// belongs to a photo that is not in the index waits until a scan has found it. A
-// user who has a password keeps it.
+// belongs to a photo that is not in the index waits until a scan has found it. A user who has a
+// password keeps it.
 //
 //   {"users": [{"mail", "name", "photos", "password"}],
 //    "comments": [{"photo": "relative/path.jpg", "author": mail, "text", "published"}],

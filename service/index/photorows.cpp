@@ -17,12 +17,11 @@ PhotoRecord photoAt(const Query &query)
     photo.title = query.text(9);
     photo.caption = query.text(10);
     photo.published = query.text(11);
-    photo.mimeType = query.text(12);
-    photo.keywords = query.text(13);
-    photo.commentCount = static_cast<int>(query.number(14));
-    if (!query.isNull(15) && !query.isNull(16)) {
-        photo.latitude = query.real(15);
-        photo.longitude = query.real(16);
+    photo.keywords = query.text(12);
+    photo.commentCount = static_cast<int>(query.number(13));
+    if (!query.isNull(14) && !query.isNull(15)) {
+        photo.latitude = query.real(14);
+        photo.longitude = query.real(15);
     }
     return photo;
 }

@@ -7,7 +7,7 @@ class Query;
 // One text for every list of photos: what follows it picks and orders.
 #define PHOTO_COLUMNS                                                                              \
     "SELECT p.id, p.album, a.user, u.name, p.key, p.name, p.size, p.width, p.height, p.title, "    \
-    "p.caption, p.published, p.mimeType, "                                                         \
+    "p.caption, p.published, "                                                                     \
     "(SELECT group_concat(tag, ', ') FROM (SELECT tag FROM tags WHERE photo = p.id ORDER BY "      \
     "id)), "                                                                                       \
     "(SELECT count(*) FROM comments WHERE photo = p.id), p.latitude, p.longitude "                 \

@@ -29,8 +29,7 @@ struct PhotoRecord
     std::string title;
     std::string caption;
     std::string published; // local time without zone
-    std::string mimeType;
-    std::string keywords; // separated by ", "
+    std::string keywords;  // separated by ", "
     int commentCount = 0;
     std::optional<double> latitude;
     std::optional<double> longitude;

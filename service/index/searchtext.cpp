@@ -5,7 +5,6 @@
 #include <glib.h>
 
 #include <algorithm>
-#include <array>
 #include <memory>
 #include <utility>
 
@@ -130,10 +129,6 @@ constexpr Occasion occasions[] = {{"12-31", "12-31", "new year"},
                                   {"10-31", "10-31", "halloween"},
                                   {"12-24", "12-26", "christmas"}};
 
-constexpr std::array<const char *, 12> months = {"january",   "february", "march",    "april",
-                                                 "may",       "june",     "july",     "august",
-                                                 "september", "october",  "november", "december"};
-
 } // namespace
 
 std::vector<std::string> searchWords(const std::string &text)
@@ -174,11 +169,9 @@ std::string searchDate(const std::string &time)
     if (time.size() < std::string("2019-12-24").size())
         return {};
     const std::string year = time.substr(0, 4), month = time.substr(5, 2), day = time.substr(8, 2);
-    const auto number = parseNumber(month);
     std::string text = year + " " + month + " " + day;
-    if (number && *number >= 1 && *number <= 12)
-        text += std::string(" ") + months[static_cast<std::size_t>(*number - 1)] + " " + day + " " +
-                year;
+    if (const std::string name = monthName(parseNumber(month).value_or(0)); !name.empty())
+        text += " " + searchText(name) + " " + day + " " + year;
     const std::string date = time.substr(5, 5);
     for (const Occasion &occasion : occasions) {
         if (occasion.first <= date && date <= occasion.last)
