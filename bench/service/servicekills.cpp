@@ -26,6 +26,7 @@ using Texts = std::set<std::string>;
 
 const char anna[] = "anna@orvala.example";
 constexpr int roundsOfAFolder = 20;
+constexpr int manyPhotos = 400;
 constexpr std::chrono::seconds patience{20};
 
 int missingOf(const Texts &expected, const Texts &found)
@@ -69,6 +70,10 @@ private:
         fs::remove_all(mFolder);
         fs::create_directories(path("photos/Sea"));
         std::ofstream(path("photos/Sea/first.jpg")) << Writers::pictureOf("first");
+        fs::create_directories(path("photos/Many")); // so that kills fall into the first scan
+        for (int i = 0; i < manyPhotos; ++i)
+            fs::create_hard_link(path("photos/Sea/first.jpg"),
+                                 path("photos/Many/" + std::to_string(i) + ".jpg"));
         mExpected = {};
         mChecked.clear();
         std::string error;
@@ -122,7 +127,11 @@ private:
                 continue;
             mPort = std::stoi(readWholeFile(path("ready")));
             const json albums = entries("/data/feed/api/user/default");
-            mAlbum = albums.empty() ? "" : pathOf(albums[0]["id"]["$t"]);
+            mAlbum.clear();
+            for (const json &entry : albums) {
+                if (entry["title"]["$t"] == "Sea")
+                    mAlbum = pathOf(entry["id"]["$t"]);
+            }
             const json photos = mAlbum.empty() ? json() : entries(mAlbum);
             mPhoto.clear();
             for (const json &entry : photos) {
@@ -202,6 +211,11 @@ private:
     {
         SQLite::Database index(path("data/index.db"), SQLite::OPEN_READWRITE);
         damaged += index.execAndGet("PRAGMA integrity_check").getString() != "ok";
+        // Counts and search texts go with the photos they belong to.
+        const auto count = [&index](const char *query) { return index.execAndGet(query).getInt(); };
+        const int photos = count("SELECT count(*) FROM photos");
+        damaged += photos != count("SELECT coalesce(sum(photoCount), 0) FROM albums") ||
+                   photos != count("SELECT count(*) FROM photoSearch");
         for (const auto &entry : fs::directory_iterator(path("photos/Sea")))
             leftBehind += entry.path().filename().string()[0] == '.';
     }

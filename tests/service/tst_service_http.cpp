@@ -2,12 +2,16 @@
 #include "support/testservice.h"
 
 #include "http/accesslog.h"
+#include "http/httpserver.h"
 
 #include <gtest/gtest.h>
 
 #include <arpa/inet.h>
+#include <fcntl.h>
+#include <openssl/err.h>
 #include <sys/socket.h>
 
+#include <future>
 #include <thread>
 
 namespace {
@@ -23,42 +27,36 @@ public:
         : mSocket(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0))
     {
         sockaddr_in address{};
+        const auto *bare = reinterpret_cast<const sockaddr *>(&address);
         address.sin_family = AF_INET;
         address.sin_addr.s_addr = htonl(device);
-        ::bind(mSocket, reinterpret_cast<sockaddr *>(&address), sizeof address);
+        ::bind(mSocket, bare, sizeof address);
         address.sin_port = htons(static_cast<std::uint16_t>(port));
         address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
-        mConnected =
-            ::connect(mSocket, reinterpret_cast<sockaddr *>(&address), sizeof address) == 0;
+        EXPECT_EQ(::connect(mSocket, bare, sizeof address), 0);
     }
     ~RawClient() { ::close(mSocket); }
 
-    bool isConnected() const { return mConnected; }
     bool send(const std::string &bytes)
     {
         return ::send(mSocket, bytes.data(), bytes.size(), MSG_NOSIGNAL) ==
                static_cast<ssize_t>(bytes.size());
     }
-    // All that comes until the server closes the connection.
-    std::string readToEnd()
+    // How often it takes the bytes until the server closes the connection.
+    int sendOften(const std::string &bytes)
     {
-        std::string text;
-        char bytes[4096];
-        for (ssize_t n; (n = ::recv(mSocket, bytes, sizeof bytes, 0)) > 0;)
-            text.append(bytes, n);
-        return text;
+        int count = 0;
+        while (count < 100'000 && send(bytes))
+            ++count;
+        return count;
     }
-    // Reads until so many answers have begun.
-    std::string readAnswers(int count)
+    // Until so many answers have begun, or the server closes the connection.
+    std::string read(int answers)
     {
         std::string text;
         char bytes[4096];
-        while (answersIn(text) < count) {
-            const ssize_t n = ::recv(mSocket, bytes, sizeof bytes, 0);
-            if (n <= 0)
-                break;
+        for (ssize_t n; answersIn(text) < answers && (n = ::recv(mSocket, bytes, 4096, 0)) > 0;)
             text.append(bytes, n);
-        }
         return text;
     }
     static int answersIn(const std::string &text)
@@ -71,7 +69,6 @@ public:
 
 private:
     int mSocket;
-    bool mConnected;
 };
 
 class Http : public testing::Test, protected TestService
@@ -81,144 +78,107 @@ protected:
     {
         RawClient client(service().port());
         client.send(request);
-        return client.readToEnd().substr(0, 12);
+        return client.read(2).substr(0, 12);
     }
 };
 
 const std::string closing = "Host: x\r\nConnection: close\r\n\r\n";
 const std::string page = "GET /data/feed/api/featured HTTP/1.1\r\n";
+const std::string tokenPost = "POST /o/oauth2/token HTTP/1.1\r\n";
 
 } // namespace
 
 TEST_F(Http, oddRequestsGetClearAnswers)
 {
     start();
-    const std::string answer = "HTTP/1.1 ";
-    EXPECT_EQ(answerTo(page + closing), answer + "200");
-    EXPECT_EQ(answerTo("NONSENSE\r\n\r\n").substr(0, 9), answer);
-    EXPECT_EQ(answerTo("GET /" + std::string(9000, 'a') + " HTTP/1.1\r\n" + closing),
-              answer + "414");
-    EXPECT_EQ(answerTo("GET /" + std::string(2000, 'a') + " HTTP/1.1\r\n" + closing),
-              answer + "414");
-    EXPECT_EQ(answerTo("GET /nowhere HTTP/1.1\r\n" + closing), answer + "404");
-    EXPECT_EQ(answerTo("DELETE /data/feed/api/featured HTTP/1.1\r\n" + closing), answer + "405");
-    EXPECT_EQ(answerTo("POST /o/oauth2/token HTTP/1.1\r\nContent-Length: 99999999\r\n" + closing),
-              answer + "413");
-    const std::string post = "POST /o/oauth2/token HTTP/1.1\r\n";
-    EXPECT_EQ(answerTo(post + "Content-Length: -5\r\n" + closing), answer + "413");
-    EXPECT_EQ(answerTo(post + closing), answer + "411");
-    EXPECT_EQ(answerTo(post + "Content-Length: 3\r\nContent-Encoding: gzip\r\n" + closing + "abc"),
-              answer + "415");
-    EXPECT_EQ(answerTo(post + "Content-Length: 3\r\nContent-Type: multipart/form-data\r\n" +
-                       closing + "abc"),
-              answer + "415");
-    EXPECT_EQ(answerTo(post + "Content-Length: 3\r\nContent-Length: 30\r\n" + closing + "abc"),
-              answer + "400");
-    EXPECT_EQ(answerTo(post + "Content-Length: 30\r\nTransfer-Encoding: chunked\r\n" + closing),
-              answer + "400");
-    std::string chunks = post + "Transfer-Encoding: chunked\r\n" + closing;
+    std::string chunks = "Transfer-Encoding: chunked\r\n" + closing;
     for (int i = 0; i < 20; ++i)
         chunks += "10000\r\n" + std::string(65536, 'x') + "\r\n";
-    EXPECT_EQ(answerTo(chunks + "0\r\n\r\n"), answer + "413");
-    EXPECT_EQ(answerTo(page + "Range: bytes=0-1\r\n" + closing), answer + "200");
-    EXPECT_EQ(get("/data/feed/api/featured?x=%zz%&&=&a")->status, 200);
-}
-
-TEST_F(Http, endlessHeadersAreCutOff)
-{
-    start();
-    RawClient client(service().port());
-    client.send(page);
+    const std::string length = "Content-Length: 3\r\n", end = closing + "abc";
+    const std::pair<std::string, const char *> rows[] = {
+        {page + closing, "200"},
+        {page + "Range: bytes=0-1\r\n" + closing, "200"},
+        {"GET /data/feed/api/featured?x=%zz%&&=&a HTTP/1.1\r\n" + closing, "200"},
+        {"NONSENSE\r\n\r\n", "400"},
+        {"GET /" + std::string(9000, 'a') + " HTTP/1.1\r\n" + closing, "414"},
+        {"GET /" + std::string(2000, 'a') + " HTTP/1.1\r\n" + closing, "414"},
+        {"GET /nowhere HTTP/1.1\r\n" + closing, "404"},
+        {"DELETE /data/feed/api/featured HTTP/1.1\r\n" + closing, "405"},
+        {tokenPost + "Content-Length: 99999999\r\n" + closing, "413"},
+        {tokenPost + "Content-Length: -5\r\n" + closing, "413"},
+        {tokenPost + chunks + "0\r\n\r\n", "413"},
+        {tokenPost + closing, "411"},
+        {tokenPost + length + "Content-Encoding: gzip\r\n" + end, "415"},
+        {tokenPost + length + "Content-Type: multipart/form-data\r\n" + end, "415"},
+        {tokenPost + length + "Content-Length: 30\r\n" + end, "400"},
+        {tokenPost + length + "Transfer-Encoding: chunked\r\n" + end, "400"}};
+    for (const auto &[request, status] : rows)
+        EXPECT_EQ(answerTo(request), std::string("HTTP/1.1 ") + status) << request.substr(0, 99);
     const std::string line = "X: " + std::string(1000, 'x') + "\r\n";
-    int lines = 0;
-    while (lines < 100'000 && client.send(line))
-        ++lines;
-    EXPECT_LT(lines, 100'000);
-    RawClient other(service().port());
-    other.send(std::string(1000, 'x'));
-    int pieces = 0;
-    while (pieces < 100'000 && other.send(line.substr(0, 1000)))
-        ++pieces;
-    EXPECT_LT(pieces, 100'000);
+    RawClient headers(service().port()), lines(service().port());
+    headers.send(page);
+    EXPECT_LT(headers.sendOften(line), 100'000);
+    EXPECT_LT(lines.sendOften(line.substr(0, 1000)), 100'000);
 }
 
-TEST_F(Http, aBodyThatNobodyReadsIsNoNextRequest)
+TEST_F(Http, everyRequestIsAnsweredOnce)
 {
     start();
-    RawClient client(service().port());
-    const std::string hidden = page + closing;
-    client.send(page + "Host: x\r\nContent-Length: " + std::to_string(hidden.size()) + "\r\n\r\n" +
-                hidden);
-    EXPECT_EQ(RawClient::answersIn(client.readToEnd()), 1);
-}
-
-TEST_F(Http, requestsSentAheadAreAllAnswered)
-{
-    start();
-    RawClient client(service().port());
-    const std::string request = page + "Host: x\r\n\r\n";
-    client.send(request + request + request.substr(0, 10));
-    EXPECT_EQ(RawClient::answersIn(client.readAnswers(2)), 2);
+    const std::string request = page + "Host: x\r\n\r\n", hidden = page + closing;
+    RawClient client(service().port()), other(service().port());
+    client.send(request + request + request.substr(0, 10)); // sent ahead
+    EXPECT_EQ(RawClient::answersIn(client.read(2)), 2);
     client.send(request.substr(10));
-    EXPECT_EQ(RawClient::answersIn(client.readAnswers(1)), 1);
+    EXPECT_EQ(RawClient::answersIn(client.read(1)), 1);
+    // A body that nobody reads is no next request.
+    other.send(page + "Host: x\r\nContent-Length: " + std::to_string(hidden.size()) + "\r\n\r\n" +
+               hidden);
+    EXPECT_EQ(RawClient::answersIn(other.read(9)), 1);
 }
 
-TEST_F(Http, silentClientsCostNobodyElse)
+TEST_F(Http, silentAndSlowClientsCostNobodyElse)
 {
-    start(true);
-    std::vector<std::unique_ptr<RawClient>> silent;
-    for (int i = 0; i < 300; ++i) {
-        silent.push_back(std::make_unique<RawClient>(service().port()));
-        ASSERT_TRUE(silent.back()->isConnected());
-    }
-    std::atomic<int> good{0};
-    std::vector<std::thread> threads;
-    for (int i = 0; i < 8; ++i) {
-        threads.emplace_back([&] {
-            httplib::SSLClient client("127.0.0.1", service().port());
+    for (const bool withTls : {true, false}) {
+        start(withTls);
+        const int port = service().port();
+        std::vector<std::unique_ptr<RawClient>> others;
+        for (int i = 0; i < 300; ++i) // more than there are threads
+            others.push_back(std::make_unique<RawClient>(port, INADDR_LOOPBACK + 1));
+        for (int i = 0; i < 200; ++i)
+            others[i]->send(i % 2 ? page + "Host: x\r\nX: "
+                                  : tokenPost + "Content-Length: 99\r\n\r\nx");
+        const auto ask = [&] { // 25 times on one connection
+            httplib::Client client((withTls ? "https" : "http") + std::string("://127.0.0.1:") +
+                                   std::to_string(port));
             client.enable_server_certificate_verification(false);
             client.set_keep_alive(true);
+            int good = 0;
             for (int n = 0; n < 25; ++n) {
-                const auto answer = client.Get("/data/feed/api/featured");
+                const auto answer = client.Get(feedBase + "featured");
                 good += answer && answer->status == 200 && answer->body.back() == '}';
             }
-        });
+            return good;
+        };
+        std::vector<std::future<int>> clients;
+        for (int i = 0; i < 8; ++i)
+            clients.push_back(std::async(std::launch::async, ask));
+        for (std::future<int> &client : clients)
+            EXPECT_EQ(client.get(), 25);
+        // And with all of them open the service stops at once.
+        const auto start = Clock::now();
+        stop();
+        EXPECT_LT(Clock::now() - start, std::chrono::seconds(1));
     }
-    for (std::thread &thread : threads)
-        thread.join();
-    EXPECT_EQ(good, 8 * 25);
-    // And with all of them open the service stops at once.
-    const auto start = Clock::now();
-    stop();
-    EXPECT_LT(Clock::now() - start, std::chrono::seconds(1));
-}
-
-TEST_F(Http, slowClientsCostNobodyElse)
-{
-    start();
-    std::vector<std::unique_ptr<RawClient>> slow;
-    for (int i = 0; i < 200; ++i) { // more than there are threads
-        slow.push_back(std::make_unique<RawClient>(service().port(), INADDR_LOOPBACK + 1));
-        ASSERT_TRUE(slow.back()->send(
-            i % 2 ? page + "Host: x\r\nX: "
-                  : "POST /o/oauth2/token HTTP/1.1\r\nContent-Length: 100\r\n\r\nx"));
-    }
-    const auto start = Clock::now();
-    EXPECT_EQ(statusOf("/data/feed/api/featured"), 200);
-    stop();
-    EXPECT_LT(Clock::now() - start, std::chrono::seconds(1));
 }
 
 TEST_F(Http, theCertificateIsMadeOnceAndPrivate)
 {
-    namespace fs = std::filesystem;
     start(true);
     stop();
     const std::string certificate = readWholeFile(file("data/certificate.pem"));
-    EXPECT_EQ(fs::status(file("data/certificate.pem")).permissions(),
-              fs::perms::owner_read | fs::perms::owner_write);
-    EXPECT_EQ(fs::status(file("data/index.db")).permissions(),
-              fs::perms::owner_read | fs::perms::owner_write);
+    for (const char *name : {"data/certificate.pem", "data/index.db"})
+        EXPECT_EQ(fs::status(file(name)).permissions(),
+                  fs::perms::owner_read | fs::perms::owner_write);
     start(true);
     EXPECT_EQ(readWholeFile(file("data/certificate.pem")), certificate);
     std::string error;
@@ -232,14 +192,63 @@ TEST_F(Http, theCertificateIsMadeOnceAndPrivate)
     EXPECT_FALSE(Service::start(second, &error));
 }
 
+TEST_F(Http, aFailureCostsOneAnswer)
+{
+    Router router;
+    router.addReader(
+        "upload", [](const Router::Call &, httplib::Response &) {},
+        [](const Router::Call &, httplib::Response &) -> std::size_t {
+            throw std::runtime_error("the index is away");
+        });
+    HttpServer::Settings settings;
+    settings.address = "127.0.0.1";
+    HttpServer server(router, settings);
+    ASSERT_TRUE(server.start());
+    httplib::Client client("127.0.0.1", server.port());
+    EXPECT_EQ(client.Post("/upload", "x", "text/plain")->status, 500);
+    EXPECT_EQ(client.Get("/")->status, 404);
+}
+
+// What went wrong with another connection on the same thread counts for nothing.
+TEST_F(Http, aConnectionHeedsItsOwnErrorsOnly)
+{
+    std::string error;
+    const std::string pem = file("data/pem");
+    ASSERT_TRUE(ensureSelfSignedCertificate(pem, &error)) << error;
+    const SslContext context = makeSslContext(pem, pem, &error);
+    int ends[2];
+    ASSERT_EQ(::socketpair(AF_UNIX, SOCK_STREAM, 0, ends), 0);
+    std::thread other([peer = ends[1]] { // says what it has heard
+        const SslContext any(SSL_CTX_new(TLS_client_method()));
+        const std::unique_ptr<SSL, decltype(&SSL_free)> ssl(SSL_new(any.get()), SSL_free);
+        SSL_set_fd(ssl.get(), peer);
+        char byte = 0;
+        if (SSL_connect(ssl.get()) == 1 && SSL_read(ssl.get(), &byte, 1) == 1)
+            SSL_write(ssl.get(), &byte, 1);
+    });
+    ClientStream::Limits limits;
+    limits.headBytes = 1;
+    ::fcntl(ends[0], F_SETFL, O_NONBLOCK);
+    ClientStream stream(ends[0], context.get(), -1, limits);
+    EXPECT_TRUE(stream.handshake());
+    stream.write("x", 1);
+    ERR_raise(ERR_LIB_SSL, SSL_R_HTTP_REQUEST);
+    char byte = 0;
+    EXPECT_EQ(stream.read(&byte, 1), 1);
+    other.join();
+    ::close(ends[1]);
+}
+
 TEST(AccessLog, cutsSecretsOut)
 {
-    EXPECT_EQ(withoutSecrets("/user/1?kind=tag&access_token=abc&alt=json"),
-              "/user/1?kind=tag&access_token=***&alt=json");
-    EXPECT_EQ(withoutSecrets("/a?acc%65ss_token=abc"), "/a?acc%65ss_token=***");
-    EXPECT_EQ(withoutSecrets("/a?code=x&&q=1?"), "/a?code=***&&q=1?");
-    EXPECT_EQ(withoutSecrets("/photos/kEy-1/s336/Sea.jpg?password=x"),
-              "/photos/***/s336/Sea.jpg?password=***");
-    EXPECT_EQ(withoutSecrets("/photos/kEy-1"), "/photos/***");
-    EXPECT_EQ(withoutSecrets("/plain"), "/plain");
+    const std::pair<const char *, const char *> rows[] = {
+        {"/user/1?kind=tag&access_token=abc&alt=json",
+         "/user/1?kind=tag&access_token=***&alt=json"},
+        {"/a?acc%65ss_token=abc", "/a?acc%65ss_token=***"},
+        {"/a?code=x&&q=1?", "/a?code=***&&q=1?"},
+        {"/photos/kEy-1/s336/Sea.jpg?password=x", "/photos/***/s336/Sea.jpg?password=***"},
+        {"/photos/kEy-1", "/photos/***"},
+        {"/plain", "/plain"}};
+    for (const auto &[target, written] : rows)
+        EXPECT_EQ(withoutSecrets(target), written);
 }

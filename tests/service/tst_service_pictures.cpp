@@ -1,3 +1,4 @@
+#include "pictures/wholefile.h"
 #include "support/testservice.h"
 
 #include <gtest/gtest.h>
@@ -63,14 +64,19 @@ TEST_F(Pictures, areNotSentAgainWhileTheyAreTheSame)
     EXPECT_EQ(get(sized("s16"), {{"If-None-Match", tag}})->status, 200);
 
     writePicture(photo("one.jpg"), 64, 32);
+    std::string large = readWholeFile(photo("one.jpg"));
+    large.append(3'000'000, '\n'); // behind the end of the picture
+    writeBytes(photo("one.jpg"), large);
     scan();
     EXPECT_EQ(get(sized("s24"), {{"If-None-Match", tag}})->status, 200);
-    EXPECT_EQ(decode(get(mAddress)->body).width, 64);
+    const auto original = get(mAddress);
+    EXPECT_EQ(original->body, large);
+    EXPECT_EQ(original->get_header_value("Content-Type"), "image/jpeg");
 }
 
 TEST_F(Pictures, aFileThatVanishedIsNotFound)
 {
-    std::filesystem::remove(photo("one.jpg"));
+    fs::remove(photo("one.jpg"));
     EXPECT_EQ(statusOf(sized("s20")), 404);
     writeBytes(photo("one.jpg"), "something else");
     EXPECT_EQ(statusOf(sized("s20")), 415);

@@ -1,6 +1,5 @@
 #include "support/testservice.h"
 
-#include "index/catalogue.h"
 #include "pictures/wholefile.h"
 
 #include <gtest/gtest.h>
@@ -9,33 +8,50 @@
 #include <sys/resource.h>
 #include <sys/wait.h>
 
-#include <array>
 #include <csignal>
 #include <thread>
 
-namespace fs = std::filesystem;
 extern char **environ;
 
 namespace {
 
-using Words = std::vector<std::string>;
+struct Output
+{
+    int status;
+    std::string text;
+};
 
 // The real program in a process of its own.
-class Process
+class Program : public testing::Test
 {
-public:
-    explicit Process(const Words &arguments)
+protected:
+    void SetUp() override { fs::create_directories(mFolder.file("photos/a")); }
+    void TearDown() override { end(SIGKILL); }
+
+    void serve()
     {
-        std::vector<char *> words;
-        for (const std::string &argument : arguments)
-            words.push_back(const_cast<char *>(argument.c_str()));
-        words.push_back(nullptr);
-        posix_spawn(&mId, SERVICE_PROGRAM, nullptr, nullptr, words.data(), environ);
-    }
-    ~Process()
-    {
-        if (mId > 0)
-            end(SIGKILL);
+        const std::string ready = mFolder.file("ready");
+        fs::remove(ready);
+        std::string words[] = {"orvala-service",
+                               "serve",
+                               "--http",
+                               "--data",
+                               mData,
+                               "--photos",
+                               mFolder.file("photos"),
+                               "--ready-file",
+                               ready,
+                               "--log-level",
+                               "off",
+                               "--gathered",
+                               "none"};
+        std::vector<char *> arguments;
+        for (std::string &word : words)
+            arguments.push_back(word.data());
+        arguments.push_back(nullptr);
+        posix_spawn(&mId, SERVICE_PROGRAM, nullptr, nullptr, arguments.data(), environ);
+        ASSERT_TRUE(waitFor([&] { return fs::exists(ready); }));
+        mPort = std::stoi(readWholeFile(ready));
     }
     // How large its files may grow from now on.
     void limitFiles(rlim_t bytes)
@@ -46,73 +62,42 @@ public:
     // The wait status.
     int end(int signal)
     {
-        ::kill(mId, signal);
         int status = 0;
-        ::waitpid(mId, &status, 0);
+        if (mId > 0 && ::kill(mId, signal) == 0)
+            ::waitpid(mId, &status, 0);
         mId = 0;
         return status;
     }
-
-private:
-    pid_t mId = 0;
-};
-
-struct Output
-{
-    int status;
-    std::string text;
-};
-
-Output run(const std::string &arguments)
-{
-    std::FILE *pipe = ::popen((SERVICE_PROGRAM " " + arguments + " 2>&1").c_str(), "r");
-    Output output;
-    std::array<char, 4096> bytes;
-    for (std::size_t n; (n = std::fread(bytes.data(), 1, bytes.size(), pipe)) > 0;)
-        output.text.append(bytes.data(), n);
-    output.status = WEXITSTATUS(::pclose(pipe));
-    return output;
-}
-
-class Program : public testing::Test
-{
-protected:
-    void SetUp() override { fs::create_directories(mFolder.file("photos/a")); }
-
-    std::string data() const { return mFolder.file("data"); }
-    std::unique_ptr<Process> serve()
+    Output run(const std::string &arguments)
     {
-        const std::string ready = mFolder.file("ready");
-        fs::remove(ready);
-        auto process =
-            std::make_unique<Process>(Words{"orvala-service", "serve", "--http", "--data", data(),
-                                            "--photos", mFolder.file("photos"), "--ready-file",
-                                            ready, "--log-level", "off", "--gathered", "none"});
-        waitFor([&] { return fs::exists(ready); });
-        mPort = fs::exists(ready) ? std::stoi(readWholeFile(ready)) : 0;
-        return process;
+        const std::string output = mFolder.file("output");
+        const std::string command = SERVICE_PROGRAM " " + arguments + " >" + output + " 2>&1";
+        const int status = std::system(command.c_str());
+        return {WEXITSTATUS(status), readWholeFile(output)};
     }
-    std::string total()
+    // Of the command `user`.
+    Output user(const std::string &arguments) { return run("user " + arguments + mInData); }
+    httplib::Result get(const std::string &path)
     {
-        httplib::Client client("127.0.0.1", mPort);
-        const auto answer = client.Get("/data/feed/api/featured");
-        if (!answer || answer->status != 200)
-            return "no answer";
-        return valueOf(json::parse(answer->body)["feed"], "openSearch$totalResults");
+        return httplib::Client("127.0.0.1", mPort).Get(path);
     }
-    static bool waitFor(const std::function<bool()> &condition)
+    json entries(const std::string &path) { return json::parse(get(path)->body)["feed"]["entry"]; }
+    bool hasPhotos(std::size_t count)
     {
-        const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(30);
-        while (!condition()) {
-            if (std::chrono::steady_clock::now() > end)
-                return false;
-            std::this_thread::yield();
-        }
-        return true;
+        return waitFor(
+            [&] { return entries(feedBase + "featured?max-results=1000").size() == count; });
+    }
+    std::string tokenOf(const std::string &mail)
+    {
+        const json tokens = json::parse(user("token " + mail).text);
+        return "?access_token=" + tokens["access_token"].get<std::string>();
     }
 
     TemporaryFolder mFolder;
+    const std::string mData = mFolder.file("data"), mInData = " --data " + mData;
+    const std::string mPhoto = mFolder.file("photos/a/one.jpg");
     int mPort = 0;
+    pid_t mId = 0;
 };
 
 } // namespace
@@ -120,25 +105,21 @@ protected:
 TEST_F(Program, doesNotWaitForLargePhotosAtTheEnd)
 {
     writePicture(mFolder.file("photos/a/large.png"), 6000, 4000);
-    const auto process = serve();
-    ASSERT_TRUE(waitFor([&] { return total() == "1"; }));
-    httplib::Client client("127.0.0.1", mPort);
-    const json feed = json::parse(client.Get("/data/feed/api/featured")->body)["feed"];
-    const std::string address = pathOf(feed["entry"][0]["content"]["src"]);
+    serve();
+    ASSERT_TRUE(hasPhotos(1));
+    const std::string address = pathOf(entries(feedBase + "featured")[0]["content"]["src"]);
     std::vector<std::thread> threads;
     std::atomic<int> asked{0};
     for (int width = 300; width < 320; ++width) {
-        threads.emplace_back([&, width] {
-            httplib::Client other("127.0.0.1", mPort);
-            std::string sized = address;
+        threads.emplace_back([&, sized = address, width]() mutable {
             sized.insert(sized.rfind('/'), "/s" + std::to_string(width));
             ++asked;
-            other.Get(sized);
+            get(sized);
         });
     }
     waitFor([&] { return asked == 20; });
     const auto start = std::chrono::steady_clock::now();
-    EXPECT_EQ(process->end(SIGTERM), 0);
+    EXPECT_EQ(end(SIGTERM), 0);
     EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::seconds(1));
     for (std::thread &thread : threads)
         thread.join();
@@ -146,128 +127,91 @@ TEST_F(Program, doesNotWaitForLargePhotosAtTheEnd)
 
 TEST_F(Program, aFullDiskIsSaidAndHarmsNothing)
 {
-    writePicture(mFolder.file("photos/a/one.jpg"), 16, 16);
-    const auto process = serve();
-    ASSERT_TRUE(waitFor([&] { return total() == "1"; }));
-    const json tokens = json::parse(run("user token family@orvala.example --data " + data()).text);
-    const std::string token = "?access_token=" + tokens["access_token"].get<std::string>();
+    writePicture(mPhoto, 16, 16);
+    serve();
+    ASSERT_TRUE(hasPhotos(1));
+    const std::string token = tokenOf("family@orvala.example");
+    const std::string album = pathOf(valueOf(entries(feedBase + "user/default" + token)[0], "id"));
+    const std::string photo = pathOf(valueOf(entries(album + token)[0], "id"));
     httplib::Client client("127.0.0.1", mPort);
-    const auto feed = [&](const std::string &path) {
-        return json::parse(client.Get(path)->body)["feed"]["entry"];
-    };
-    const std::string album = pathOf(valueOf(feed("/data/feed/api/user/default" + token)[0], "id"));
-    const std::string photo = pathOf(valueOf(feed(album + token)[0], "id"));
     const auto comment = [&] {
-        return client
-            .Post(photo + token,
-                  entryOf("<content>" + std::string(9000, 'x') + "</content>", "comment"),
-                  "application/atom+xml")
-            ->status;
+        const std::string text = "<content>" + std::string(9000, 'x') + "</content>";
+        return client.Post(photo + token, entryOf(text, "comment"), "application/atom+xml")->status;
     };
-    const std::string picture = readWholeFile(mFolder.file("photos/a/one.jpg"));
     const auto upload = [&] {
         const std::string body = "--B\nContent-Type: application/atom+xml\n\n" +
                                  entryOf("", "photo") + "\n--B\nContent-Type: image/jpeg\n\n" +
-                                 picture + std::string(500'000, 'x') + "\n--B--";
+                                 readWholeFile(mPhoto) + std::string(500'000, 'x') + "\n--B--";
         return client.Post(album + token, body, "multipart/related; boundary=B")->status;
     };
-    process->limitFiles(400'000);
+    limitFiles(400'000);
     std::size_t stored = 0;
     int status = 201;
     for (; stored < 1000 && (status = comment()) == 201; ++stored)
         continue;
     EXPECT_EQ(status, 507);
     EXPECT_EQ(upload(), 507);
-    EXPECT_EQ(feed(photo + token + "&kind=comment").size(), stored);
+    EXPECT_EQ(entries(photo + token + "&kind=comment").size(), stored);
     EXPECT_EQ(contentsOf(mFolder.file("photos/a")).files, 1);
-    process->limitFiles(RLIM_INFINITY);
+    limitFiles(RLIM_INFINITY);
     EXPECT_EQ(comment(), 201);
     EXPECT_EQ(upload(), 201);
-    EXPECT_EQ(process->end(SIGTERM), 0);
-}
-
-TEST_F(Program, survivesBeingKilledAtAnyMoment)
-{
-    writePicture(mFolder.file("plain.jpg"), 16, 16);
-    for (int i = 0; i < 1500; ++i)
-        fs::copy_file(mFolder.file("plain.jpg"),
-                      mFolder.file("photos/a/" + std::to_string(i) + ".jpg"));
-    for (int round = 0; round < 12; ++round) {
-        auto process = serve();
-        const auto moment =
-            std::chrono::steady_clock::now() + std::chrono::milliseconds(round * 13);
-        waitFor([&] { return std::chrono::steady_clock::now() > moment; });
-        process->end(SIGKILL);
-        SQLite::Database index(data() + "/index.db", SQLite::OPEN_READWRITE);
-        EXPECT_EQ(index.execAndGet("PRAGMA integrity_check").getString(), "ok");
-        // Counts and search texts go with the photos they belong to.
-        EXPECT_EQ(index.execAndGet("SELECT count(*) FROM photos").getInt(),
-                  index.execAndGet("SELECT coalesce(sum(photoCount), 0) FROM albums").getInt());
-        EXPECT_EQ(index.execAndGet("SELECT count(*) FROM photos").getInt(),
-                  index.execAndGet("SELECT count(*) FROM photoSearch").getInt());
-    }
-    const auto process = serve();
-    EXPECT_TRUE(waitFor([&] { return total() == "1500"; }));
 }
 
 TEST_F(Program, aRestartReadsNoPhotoAgain)
 {
-    writePicture(mFolder.file("photos/a/one.jpg"), 16, 16);
-    auto process = serve();
-    ASSERT_TRUE(waitFor([&] { return total() == "1"; }));
-    process->end(SIGTERM);
+    writePicture(mPhoto, 16, 16);
+    serve();
+    ASSERT_TRUE(hasPhotos(1));
+    end(SIGTERM);
     // Same size and time, other bytes: whoever reads it finds no picture.
-    const auto time = fs::last_write_time(mFolder.file("photos/a/one.jpg"));
-    writeBytes(mFolder.file("photos/a/one.jpg"),
-               std::string(fs::file_size(mFolder.file("photos/a/one.jpg")), 'x'));
-    fs::last_write_time(mFolder.file("photos/a/one.jpg"), time);
+    const auto time = fs::last_write_time(mPhoto);
+    writeBytes(mPhoto, std::string(fs::file_size(mPhoto), 'x'));
+    fs::last_write_time(mPhoto, time);
     writePicture(mFolder.file("photos/b.jpg"), 16, 16); // found after it, in the next folder
-    process = serve();
-    EXPECT_TRUE(waitFor([&] { return total() == "2"; }));
+    serve();
+    EXPECT_TRUE(hasPhotos(2));
 }
 
 TEST_F(Program, commandsWorkBesideTheService)
 {
-    const auto process = serve();
-    const std::string inData = " --data " + data();
-    EXPECT_EQ(
-        run("user add ben@orvala.example --name Ben --photos " + mFolder.file("photos") + inData)
-            .status,
-        0);
-    const Output list = run("user list" + inData);
-    EXPECT_NE(list.text.find("family@orvala.example\tFamily"), std::string::npos);
-    EXPECT_NE(list.text.find("2\tben@orvala.example\tBen"), std::string::npos);
-    const json tokens = json::parse(run("user token ben@orvala.example" + inData).text);
-    EXPECT_EQ(tokens["expires_in"], 90 * 24 * 3600);
-    httplib::Client client("127.0.0.1", mPort);
-    const std::string path =
-        "/data/feed/api/user/default?access_token=" + tokens["access_token"].get<std::string>();
-    EXPECT_EQ(client.Get(path)->status, 200);
-    writeBytes(mFolder.file("import.json"),
+    serve();
+    const std::string ben = " ben@orvala.example";
+    EXPECT_EQ(user("add" + ben + " --name Ben --photos " + mFolder.file("photos")).status, 0);
+    const std::string list = user("list").text;
+    EXPECT_NE(list.find("family@orvala.example\tFamily"), std::string::npos);
+    EXPECT_NE(list.find("2\tben@orvala.example\tBen"), std::string::npos);
+    writeBytes(mFolder.file("import"),
                R"({"tags":[{"photo":"a/x.jpg","author":"ben@orvala.example","tag":"t"}]})");
-    EXPECT_NE(run("import " + mFolder.file("import.json") + inData).text.find("1 waiting"),
+    EXPECT_NE(run("import " + mFolder.file("import") + mInData).text.find("1 waiting"),
               std::string::npos);
-    writeBytes(mFolder.file("short"), "short\n");
-    writeBytes(mFolder.file("long"), "long enough\n");
-    const std::string passwd = "user passwd ben@orvala.example" + inData + " < ";
-    EXPECT_EQ(run(passwd + mFolder.file("short")).status, 1);
-    EXPECT_EQ(client.Get(path)->status, 200);
-    EXPECT_EQ(run(passwd + mFolder.file("long")).status, 0);
-    EXPECT_EQ(client.Get(path)->status, 401); // the old sign-ins end
-    EXPECT_EQ(run("user remove ben@orvala.example" + inData).status, 0);
+    const std::string path = feedBase + "user/default" + tokenOf(ben);
+    EXPECT_EQ(user("passwd" + ben + " </dev/null").status, 1);
+    EXPECT_EQ(user("sign-out nobody@orvala.example").status, 1);
+    EXPECT_EQ(get(path)->status, 200);
+    EXPECT_EQ(user("sign-out" + ben).status, 0);
+    EXPECT_EQ(get(path)->status, 401);
+    const std::string other = feedBase + "user/default" + tokenOf(ben);
+    writeBytes(mFolder.file("password"), "long enough\n");
+    EXPECT_EQ(user("passwd" + ben + " <" + mFolder.file("password")).status, 0);
+    EXPECT_EQ(get(other)->status, 401);
+    EXPECT_EQ(user("remove" + ben).status, 0);
 }
 
 TEST_F(Program, mistakesAreExplained)
 {
     writeBytes(mFolder.file("file"), "no folder, no index");
     fs::create_directories(mFolder.file("broken/index.db"));
+    writeBytes(mFolder.file("range"), "[serve]\nport = 70000\n");
+    writeBytes(mFolder.file("typing"), "[serve]\nprot = 7000\n");
     for (const std::string &arguments :
-         {"--data " + mFolder.file("file/data"), "--data " + mFolder.file("broken"),
-          "--listen 192.0.2.1 --data " + data()}) {
-        const Output output = run("serve --http " + arguments);
-        EXPECT_EQ(output.status, 1) << arguments;
-        EXPECT_NE(output.text.find(": "), std::string::npos) << output.text;
+         {"serve --http --data " + mFolder.file("file/data"),
+          "serve --http --data " + mFolder.file("broken"),
+          "serve --http --listen 192.0.2.1" + mInData,
+          "--config " + mFolder.file("range") + " serve" + mInData,
+          "--config " + mFolder.file("typing") + " serve" + mInData}) {
+        const Output output = run(arguments);
+        EXPECT_NE(output.status, 0) << arguments;
+        EXPECT_NE(output.text.find(' '), std::string::npos) << output.text;
     }
-    writeBytes(mFolder.file("settings"), "[serve]\nport = 70000\n");
-    EXPECT_NE(run("--config " + mFolder.file("settings") + " serve").status, 0);
 }

@@ -8,7 +8,7 @@
 
 namespace {
 
-const std::string user = "/data/feed/api/user/";
+const std::string user = feedBase + "user/";
 
 // Every address that takes a token, with everybody who may come: Ben owns an open and a private
 // album, Anna is another user.
@@ -23,23 +23,20 @@ protected:
 
     void SetUp() override
     {
+        for (const char *name : {"own.jpg", "../ben/Open/one.jpg", "../ben/Secret/one.jpg"})
+            addPhoto(name);
+        writeBytes(file("ben/Secret/.private"));
         start();
         addUser("ben@orvala.example", "Ben", "ben");
         addUser("cleo@orvala.example", "Cleo", "cleo");
-        for (const std::string folder : {"ben/Open", "ben/Secret"}) {
-            std::filesystem::create_directories(file(folder));
-            writePicture(file(folder + "/one.jpg"), 32, 48);
-        }
-        writeBytes(file("ben/Secret/.private"), "");
-        addPhoto("own.jpg");
         scan();
         mAnna = token("anna@orvala.example");
         mBen = token("ben@orvala.example");
         const json albums = publicFeed(user + "default?access_token=" + mBen);
-        for (const json &entry : albums["entry"])
-            mAlbums[valueOf(entry, "title")] = pathOf(valueOf(entry, "id"));
-        for (const auto &[title, path] : mAlbums) {
-            const json photos = publicFeed(path + "?access_token=" + mBen);
+        for (const json &album : albums["entry"]) {
+            const std::string title = valueOf(album, "title");
+            mAlbums[title] = pathOf(valueOf(album, "id"));
+            const json photos = publicFeed(mAlbums[title] + "?access_token=" + mBen);
             mPhotos[title] = pathOf(valueOf(photos["entry"][0], "id"));
             const auto answer =
                 ask({"POST", mPhotos[title], entryOf("<content>x</content>", "comment"), 0}, mBen);
@@ -50,18 +47,12 @@ protected:
 
     httplib::Result ask(const Row &row, const std::string &token)
     {
-        httplib::Client client("127.0.0.1", service().port());
         const char mark = row.path.find('?') == std::string::npos ? '?' : '&';
         const std::string target =
             row.path + (token.empty() ? "" : mark + ("access_token=" + percentEncoded(token)));
         if (row.method == "POST")
-            return client.Post(target, row.body, "multipart/related; boundary=B");
-        return row.method == "DELETE" ? client.Delete(target) : client.Get(target);
-    }
-
-    static std::string entry(std::string path, const std::string &rest)
-    {
-        return path.replace(path.find("/feed/"), 6, "/entry/") + rest;
+            return post(target, row.body, "multipart/related; boundary=B");
+        return row.method == "DELETE" ? erase(target) : get(target);
     }
     std::vector<Row> rowsFor(const std::string &album, bool isPrivate)
     {
@@ -73,8 +64,8 @@ protected:
                 {"POST", photo, entryOf("<content>y</content>", "comment"), isPrivate ? 403 : 201},
                 {"POST", photo, entryOf("<title>u</title>", "tag"), 403},
                 {"POST", mAlbums[album], "--B\n\nx\n--B--", 403},
-                {"DELETE", entry(photo, "/commentid/" + mComments[album]), "", 403},
-                {"DELETE", entry(photo, "/tag/t"), "", 403}};
+                {"DELETE", entryPathOf(photo, "/commentid/" + mComments[album]), "", 403},
+                {"DELETE", entryPathOf(photo, "/tag/t"), "", 403}};
     }
 
     std::string mAnna, mBen;
@@ -110,7 +101,7 @@ TEST_F(Rights, everyAddressLooksAtTheToken)
         EXPECT_EQ(ask(row, mAnna)->status, row.annas) << row.method << row.path << row.body;
     }
     const json tags = publicFeed(mPhotos["Secret"] + "?kind=tag&access_token=" + mBen);
-    EXPECT_EQ(titlesOf(tags), std::vector<std::string>{"t"});
+    EXPECT_EQ(titlesOf(tags), Titles{"t"});
     EXPECT_EQ(get(user + "1", {{"Authorization", "Bearer " + mAnna}})->status, 200);
 }
 
@@ -122,7 +113,7 @@ TEST_F(Rights, nothingIsReachedThroughSomethingElse)
         {"GET", mAlbums["Open"] + "/photoid/" + secret + "?kind=comment", "", 404},
         {"GET", user + "default/albumid/" + idOf(mAlbums["Secret"]), "", 404},
         {"GET", user + "1/albumid/" + idOf(mAlbums["Secret"]) + "/photoid/" + secret, "", 404},
-        {"DELETE", entry(mPhotos["Open"], "/commentid/" + mComments["Secret"]), "", 404},
+        {"DELETE", entryPathOf(mPhotos["Open"], "/commentid/" + mComments["Secret"]), "", 404},
         {"POST", mAlbums["Open"] + "/photoid/" + secret, "", 404},
         {"GET", user + "9", "", 404},
         {"GET", user + "2/albumid/x", "", 404},
@@ -132,7 +123,6 @@ TEST_F(Rights, nothingIsReachedThroughSomethingElse)
         {"GET", mPhotos["Open"] + "?kind=user", "", 400}};
     for (const Row &row : rows)
         EXPECT_EQ(ask(row, mAnna)->status, row.annas) << row.method << row.path;
-    EXPECT_EQ(titlesOf(publicFeed("/data/feed/api/featured")).size(), 2u);
-    EXPECT_EQ(titlesOf(publicFeed(user + "2?access_token=" + mAnna)),
-              std::vector<std::string>{"Open"});
+    EXPECT_EQ(titlesOf(publicFeed(feedBase + "featured")).size(), 2u);
+    EXPECT_EQ(titlesOf(publicFeed(user + "2?access_token=" + mAnna)), Titles{"Open"});
 }

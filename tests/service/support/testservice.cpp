@@ -7,6 +7,8 @@
 #include <gtest/gtest.h>
 #include <spdlog/spdlog.h>
 
+#include <thread>
+
 namespace {
 
 const char anna[] = "anna@orvala.example";
@@ -16,7 +18,7 @@ const char anna[] = "anna@orvala.example";
 TestService::TestService()
 {
     spdlog::set_level(spdlog::level::off);
-    std::filesystem::create_directories(file("photos"));
+    fs::create_directories(file("photos"));
     std::string error;
     const auto database = openIndex(file("data"), &error);
     EXPECT_EQ(error, "");
@@ -34,22 +36,30 @@ void TestService::start(bool withTls)
     std::string error;
     mService = Service::start(settings, &error);
     ASSERT_TRUE(mService) << error;
+    scan();
 }
 
 void TestService::addPhoto(const std::string &name,
                            const std::map<std::string, std::string> &metadata)
 {
     const std::string path = photo(name);
-    std::filesystem::create_directories(std::filesystem::path(path).parent_path());
+    fs::create_directories(fs::path(path).parent_path());
     writePicture(path, 48, 32);
     for (const auto &[key, value] : metadata)
         addMetadata(path, key, value);
 }
 
+void TestService::addTaken(const std::string &name, const std::string &time,
+                           const std::string &caption)
+{
+    addPhoto(name,
+             {{"Exif.Photo.DateTimeOriginal", time}, {"Exif.Image.ImageDescription", caption}});
+}
+
 std::int64_t TestService::addUser(const std::string &mail, const std::string &name,
                                   const std::string &folder)
 {
-    std::filesystem::create_directories(file(folder));
+    fs::create_directories(file(folder));
     return saveUser(database(), {0, mail, name, file(folder)});
 }
 
@@ -72,8 +82,18 @@ bool TestService::import(const json &document)
 
 httplib::Result TestService::get(const std::string &path, const httplib::Headers &headers)
 {
-    httplib::Client client("127.0.0.1", mService->port());
-    return client.Get(path, headers);
+    return httplib::Client("127.0.0.1", mService->port()).Get(path, headers);
+}
+
+httplib::Result TestService::post(const std::string &path, const std::string &body,
+                                  const std::string &type)
+{
+    return httplib::Client("127.0.0.1", mService->port()).Post(path, body, type);
+}
+
+httplib::Result TestService::erase(const std::string &path)
+{
+    return httplib::Client("127.0.0.1", mService->port()).Delete(path);
 }
 
 json TestService::feed(const std::string &path)
@@ -106,11 +126,18 @@ std::string TestService::albumPath(const std::string &title)
     return {};
 }
 
-std::vector<std::string> titlesOf(const json &feed)
+Titles titlesOf(const json &feed)
 {
-    std::vector<std::string> titles;
+    Titles titles;
     for (const json &entry : feed["entry"])
         titles.push_back(valueOf(entry, "title"));
+    return titles;
+}
+
+Titles sortedTitlesOf(const json &feed)
+{
+    Titles titles = titlesOf(feed);
+    std::sort(titles.begin(), titles.end());
     return titles;
 }
 
@@ -122,6 +149,11 @@ std::string entryOf(const std::string &content, const std::string &kind)
            kind + "\"/></entry>";
 }
 
+std::string entryPathOf(std::string photo, const std::string &entry)
+{
+    return photo.replace(photo.find("/feed/"), 6, "/entry/") + entry;
+}
+
 std::string pathOf(const std::string &address)
 {
     return address.substr(address.find('/', std::string("https://").size()));
@@ -130,4 +162,12 @@ std::string pathOf(const std::string &address)
 std::string valueOf(const json &feed, const std::string &name)
 {
     return feed.value(name, json::object()).value("$t", "");
+}
+
+bool waitFor(const std::function<bool()> &condition)
+{
+    const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(30);
+    while (!condition() && std::chrono::steady_clock::now() < end)
+        std::this_thread::yield();
+    return condition();
 }

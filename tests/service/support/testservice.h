@@ -11,6 +11,10 @@
 #include <map>
 
 using nlohmann::json;
+using Titles = std::vector<std::string>;
+namespace fs = std::filesystem;
+
+inline const std::string feedBase = "/data/feed/api/";
 
 // A running service with a folder of photos and a data folder of its own.
 class TestService
@@ -23,6 +27,7 @@ public:
     GatheredKinds gathered = {};
     std::string today = "2026-05-01";
 
+    // And waits until the service knows the folders.
     void start(bool withTls = false);
     void stop() { mService.reset(); }
     Service &service() { return *mService; }
@@ -34,6 +39,9 @@ public:
     std::string photo(const std::string &name) const { return file("photos/" + name); }
     // A small picture below "photos", with the metadata that is given by key.
     void addPhoto(const std::string &name, const std::map<std::string, std::string> &metadata = {});
+    // `time` as in "2012:03:01 10:00:00".
+    void addTaken(const std::string &name, const std::string &time,
+                  const std::string &caption = "");
     std::int64_t addUser(const std::string &mail, const std::string &name,
                          const std::string &folder);
     // An access token for the user, valid for the given time.
@@ -41,6 +49,9 @@ public:
     bool import(const json &document);
 
     httplib::Result get(const std::string &path, const httplib::Headers &headers = {});
+    httplib::Result post(const std::string &path, const std::string &body,
+                         const std::string &type = "application/atom+xml");
+    httplib::Result erase(const std::string &path);
     // The feed with Anna's token, or without one; null with any other answer than 200.
     json feed(const std::string &path);
     json publicFeed(const std::string &path);
@@ -54,11 +65,16 @@ private:
     std::string mToken;
 };
 
-// Titles of a feed's entries.
-std::vector<std::string> titlesOf(const json &feed);
+// Titles of a feed's entries, as they come or by the alphabet.
+Titles titlesOf(const json &feed);
+Titles sortedTitlesOf(const json &feed);
 // An entry as a client posts it.
 std::string entryOf(const std::string &content, const std::string &kind);
+// Where something that belongs to a photo is deleted.
+std::string entryPathOf(std::string photo, const std::string &entry);
 // The path of an address that the service has given.
 std::string pathOf(const std::string &address);
 // "feed" > name > "$t".
 std::string valueOf(const json &feed, const std::string &name);
+// False when the condition does not come true within half a minute.
+bool waitFor(const std::function<bool()> &condition);
