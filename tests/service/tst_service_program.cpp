@@ -158,21 +158,6 @@ TEST_F(Program, aFullDiskIsSaidAndHarmsNothing)
     EXPECT_EQ(upload(), 201);
 }
 
-TEST_F(Program, aRestartReadsNoPhotoAgain)
-{
-    writePicture(mPhoto, 16, 16);
-    serve();
-    ASSERT_TRUE(hasPhotos(1));
-    end(SIGTERM);
-    // Same size and time, other bytes: whoever reads it finds no picture.
-    const auto time = fs::last_write_time(mPhoto);
-    writeBytes(mPhoto, std::string(fs::file_size(mPhoto), 'x'));
-    fs::last_write_time(mPhoto, time);
-    writePicture(mFolder.file("photos/b.jpg"), 16, 16); // found after it, in the next folder
-    serve();
-    EXPECT_TRUE(hasPhotos(2));
-}
-
 TEST_F(Program, commandsWorkBesideTheService)
 {
     serve();

@@ -107,9 +107,8 @@ TEST_F(Search, theBestComeFirstOnAllPages)
     EXPECT_EQ(all.back(), "lakeside"); // only begins with the word
     for (std::size_t first = 0; first < 5; ++first) {
         const json page = found("lake", "&max-results=2&start-index=" + std::to_string(first + 1));
-        const auto end = std::min<std::size_t>(first + 2, all.size());
-        const auto start = std::min(first, all.size());
+        const std::size_t start = std::min(first, all.size()),
+                          end = std::min(first + 2, all.size());
         EXPECT_EQ(titlesOf(page), Titles(all.begin() + start, all.begin() + end)) << first;
-        EXPECT_EQ(valueOf(page, "openSearch$totalResults"), "4");
     }
 }

@@ -22,11 +22,11 @@ struct Decoded
     int width = 0;
     int height = 0;
     bool hasMetadata = false;
-    std::string quarters; // one letter each, in the order of writePicture(); ? is another colour
+    std::string quarters; // one digit each, in the order of writePicture(); ? is another grey
 };
 
-// Writes a picture with a red, a green, a blue and a white quarter ("rgbw") from the top left to
-// the bottom right, as it lies in the file. The ending decides the format.
+// Writes a picture with four quarters from black to white ("0123") from the top left to the bottom
+// right, as it lies in the file. The ending decides the format.
 void writePicture(const std::string &path, int width, int height, int orientation = 1);
 
 // Sets an EXIF, IPTC or XMP value in the file; may be repeated for values that come in lists.

@@ -32,6 +32,7 @@ void TestService::start(bool withTls)
     settings.data = file("data");
     settings.withTls = withTls;
     settings.gathered = gathered;
+    settings.threads = threads;
     settings.today = [this] { return today; };
     std::string error;
     mService = Service::start(settings, &error);

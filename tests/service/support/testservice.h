@@ -26,6 +26,7 @@ public:
     // Without gathered albums, unless a test asks for them.
     GatheredKinds gathered = {};
     std::string today = "2026-05-01";
+    int threads = 64;
 
     // And waits until the service knows the folders.
     void start(bool withTls = false);
