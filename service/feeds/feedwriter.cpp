@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <array>
+#include <cmath>
 
 namespace {
 
@@ -27,8 +28,8 @@ Size fitted(const PhotoRecord &photo, const Box &box)
         return {box.width, box.height};
     const double scale =
         std::min({1.0, double(box.width) / photo.width, double(box.height) / photo.height});
-    return {std::max(1, int(photo.width * scale + 0.5)),
-            std::max(1, int(photo.height * scale + 0.5))};
+    return {std::max(1, static_cast<int>(std::lround(photo.width * scale))),
+            std::max(1, static_cast<int>(std::lround(photo.height * scale)))};
 }
 
 FeedJson feedText(const std::string &text)

@@ -32,6 +32,14 @@ void addressOf(const sockaddr_storage &address, std::string &ip, int &port)
     ip = text;
 }
 
+void findPeer(int socket, std::string &ip, int &port)
+{
+    sockaddr_storage address{};
+    socklen_t length = sizeof address;
+    if (getpeername(socket, reinterpret_cast<sockaddr *>(&address), &length) == 0)
+        addressOf(address, ip, port);
+}
+
 } // namespace
 
 ClientStream::ClientStream(int socket, SSL_CTX *context, int stopEvent, const Limits &limits)
@@ -50,7 +58,7 @@ ClientStream::ClientStream(int socket, SSL_CTX *context, int stopEvent, const Li
         SSL_set_accept_state(mSsl);
     }
     int port = 0;
-    get_remote_ip_and_port(mAddress, port);
+    findPeer(mSocket, mAddress, port);
     beginRequest();
 }
 
@@ -172,10 +180,7 @@ ssize_t ClientStream::write(const char *bytes, size_t size)
 
 void ClientStream::get_remote_ip_and_port(std::string &ip, int &port) const
 {
-    sockaddr_storage address{};
-    socklen_t length = sizeof address;
-    if (getpeername(mSocket, reinterpret_cast<sockaddr *>(&address), &length) == 0)
-        addressOf(address, ip, port);
+    findPeer(mSocket, ip, port);
 }
 
 void ClientStream::get_local_ip_and_port(std::string &ip, int &port) const

@@ -139,8 +139,9 @@ void HttpServer::setUp()
                       const httplib::ContentReader &reader) { post(request, response, reader); });
     Put(".*", answer).Patch(".*", answer).Delete(".*", answer);
     set_error_handler(Handler(explainFailure));
-    set_exception_handler([this](const httplib::Request &, httplib::Response &response,
-                                 std::exception_ptr what) { explainException(response, what); });
+    set_exception_handler(
+        [this](const httplib::Request &, httplib::Response &response,
+               const std::exception_ptr &what) { explainException(response, what); });
     set_logger(logRequest);
 }
 
@@ -174,7 +175,7 @@ void HttpServer::post(const httplib::Request &request, httplib::Response &respon
     answerError(response, status, messageOf(status));
 }
 
-void HttpServer::explainException(httplib::Response &response, std::exception_ptr what) const
+void HttpServer::explainException(httplib::Response &response, const std::exception_ptr &what) const
 {
     try {
         std::rethrow_exception(what);

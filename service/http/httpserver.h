@@ -49,7 +49,7 @@ private:
     HandlerResponse takeBody(const httplib::Request &request, httplib::Response &response);
     void post(const httplib::Request &request, httplib::Response &response,
               const httplib::ContentReader &reader);
-    void explainException(httplib::Response &response, std::exception_ptr what) const;
+    void explainException(httplib::Response &response, const std::exception_ptr &what) const;
 
     const Router &mRouter;
     const Settings mSettings;
