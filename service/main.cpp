@@ -5,6 +5,7 @@
 #include <CLI/CLI.hpp>
 
 #include <algorithm>
+#include <iostream>
 
 namespace {
 
@@ -131,9 +132,7 @@ void addPhotos(CLI::App &program, std::string &data, int &result)
     command->callback([&] { result = runUnreadable(data); });
 }
 
-} // namespace
-
-int main(int argc, char **argv)
+int run(int argc, char **argv)
 {
     CLI::App program("Serves folders of photos to the album browser.", "orvala-service");
     program.require_subcommand(1);
@@ -151,4 +150,16 @@ int main(int argc, char **argv)
     addPhotos(program, data, result);
     CLI11_PARSE(program, argc, argv);
     return result;
+}
+
+} // namespace
+
+int main(int argc, char **argv)
+{
+    try {
+        return run(argc, argv);
+    } catch (const std::exception &exception) { // as when the disk is full
+        std::cerr << "orvala-service: " << exception.what() << "\n";
+        return 1;
+    }
 }

@@ -31,18 +31,14 @@ int fail(const std::string &message)
     return 1;
 }
 
-// Opens the index for one piece of work and turns what goes wrong in it into a message.
+// Opens the index for one piece of work.
 int withIndex(const std::string &data, const std::function<int(Database &)> &work)
 {
     std::string error;
     const auto database = openIndex(data, &error);
     if (!database)
         return fail(error);
-    try {
-        return work(*database);
-    } catch (const std::exception &exception) {
-        return fail(exception.what());
-    }
+    return work(*database);
 }
 
 bool isFolder(const std::string &path)

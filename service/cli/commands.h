@@ -3,7 +3,7 @@
 #include <string>
 
 // The commands beside `serve`; each works beside a running service. The result is the exit code:
-// what went wrong is on the error output.
+// what went wrong is on the error output, or is thrown when it is the index.
 struct UserOptions
 {
     std::string data;

@@ -96,7 +96,9 @@ void waitForEnd(const sigset_t &signals, Service &service)
     }
 }
 
-int serve(const ServeOptions &options)
+} // namespace
+
+int runServe(const ServeOptions &options)
 {
     const sigset_t signals = blockSignals();
     raiseFileLimit();
@@ -116,15 +118,4 @@ int serve(const ServeOptions &options)
     spdlog::info("stopping");
     endSoon();
     return 0;
-}
-
-} // namespace
-
-int runServe(const ServeOptions &options)
-{
-    try {
-        return serve(options);
-    } catch (const std::exception &exception) { // as when the disk is full
-        return fail(exception.what());
-    }
 }

@@ -2,7 +2,8 @@
 
 #include "service.h"
 
-// `orvala-service serve`: runs the service until SIGTERM or SIGINT; SIGHUP scans at once.
+// `orvala-service serve`: runs the service until SIGTERM or SIGINT; SIGHUP scans at once. Throws as
+// the other commands do.
 struct ServeOptions
 {
     ServiceSettings service;
