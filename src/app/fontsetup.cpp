@@ -7,8 +7,8 @@
 namespace {
 
 // Every family falls back to the interface's font, then to one with the signs of most scripts, the
-// ideographs, Korean, the emoji, and at last whatever there is. Bitmaps are left out, but for the
-// emoji.
+// ideographs, Korean, the emoji, and at last whatever there is. Each font costs every look-up a
+// little: out go those that no caption needs (Tibetan has no other), and bitmaps but for the emoji.
 constexpr char CONFIGURATION[] = R"(<?xml version="1.0"?>
 <fontconfig>
   <dir>/usr/share/fonts</dir>
@@ -30,6 +30,16 @@ constexpr char CONFIGURATION[] = R"(<?xml version="1.0"?>
     <edit name="lcdfilter" mode="append"><const>lcddefault</const></edit>
   </match>
   <selectfont>
+    <acceptfont><glob>*/NotoSerifTibetan*</glob></acceptfont>
+    <rejectfont>
+      <glob>*/type1/*</glob>
+      <glob>*/Type1/*</glob>
+      <glob>*/urw-base35/*</glob>
+      <glob>*Mono*</glob>
+      <glob>*Serif*</glob>
+      <glob>*Display*</glob>
+      <glob>*Condensed*</glob>
+    </rejectfont>
     <rejectfont><pattern>
       <patelt name="scalable"><bool>false</bool></patelt>
       <patelt name="color"><bool>false</bool></patelt>
