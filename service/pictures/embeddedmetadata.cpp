@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <cstring>
 #include <exiv2/exiv2.hpp>
 #include <mutex>
 
@@ -161,16 +162,19 @@ bool isWithin(const std::string &key, const std::string &start, const std::strin
            key.compare(key.size() - end.size(), end.size(), end) == 0;
 }
 
-// Whether the value names a face in the photo: programs mark them in two ways. What is below a
-// structure has the prefixes that the file gives it.
-bool isFaceName(const Exiv2::XmpData &xmp, const std::string &key)
+// Programs mark the parts of a photo in two ways. What is below a structure has the prefixes that
+// the file gives it.
+bool isNameOfPart(const std::string &key)
 {
-    const std::string name = "Name";
-    if (isWithin(key, "Xmp.MP.RegionInfo/", ":PersonDisplayName"))
-        return true;
-    if (!isWithin(key, "Xmp.mwg-rs.Regions/", ":" + name))
-        return false;
-    const auto type = xmp.findKey(Exiv2::XmpKey(key.substr(0, key.size() - name.size()) + "Type"));
+    return isWithin(key, "Xmp.MP.RegionInfo/", ":PersonDisplayName") ||
+           isWithin(key, "Xmp.mwg-rs.Regions/", ":Name");
+}
+
+// One of the two marks pets and other things as well.
+bool isFace(const Exiv2::XmpData &xmp, const std::string &nameOfPart)
+{
+    const std::string part = nameOfPart.substr(0, nameOfPart.size() - std::strlen("Name"));
+    const auto type = xmp.findKey(Exiv2::XmpKey(part + "Type"));
     return type == xmp.end() || type->toString() == "Face";
 }
 
@@ -179,9 +183,12 @@ void addPeople(const Exiv2::XmpData &xmp, std::vector<std::string> *keywords)
     const auto listed = xmp.findKey(Exiv2::XmpKey("Xmp.iptcExt.PersonInImage"));
     for (long i = 0; listed != xmp.end() && i < listed->count(); ++i)
         addKeyword(listed->toString(i), keywords);
-    for (const Exiv2::Xmpdatum &datum : xmp)
-        if (isFaceName(xmp, datum.key()))
+    std::size_t parts = 0;
+    for (const Exiv2::Xmpdatum &datum : xmp) {
+        const std::string key = datum.key();
+        if (isNameOfPart(key) && ++parts <= mostKeywords && isFace(xmp, key))
             addKeyword(datum.toString(), keywords);
+    }
 }
 
 std::vector<std::string> keywordsOf(const Exiv2::XmpData &xmp, const Exiv2::IptcData &iptc)
