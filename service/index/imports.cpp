@@ -141,13 +141,18 @@ int applyWaiting(Session &session)
     return waiting;
 }
 
+std::string problemOf(const json &user)
+{
+    const std::string mail = textOf(user, "mail");
+    const std::string problem =
+        user.contains("password") ? passwordProblem(textOf(user, "password")) : "";
+    return problem.empty() ? mailProblem(mail) : mail + ": " + problem;
+}
+
 bool checkUsers(const json &document, std::string *error)
 {
     for (const json &user : document.value("users", json::array())) {
-        const std::string mail = textOf(user, "mail");
-        const std::string problem =
-            user.contains("password") ? passwordProblem(textOf(user, "password")) : "";
-        *error = problem.empty() ? mailProblem(mail) : mail + ": " + problem;
+        *error = problemOf(user);
         if (!error->empty())
             return false;
     }

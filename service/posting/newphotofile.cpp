@@ -72,6 +72,12 @@ void removeLeftovers(const std::string &folder)
     }
 }
 
+// As in "Sea (2)"; the first one goes without.
+std::string numbered(const std::string &stem, int copy)
+{
+    return copy == 1 ? stem : stem + " (" + std::to_string(copy) + ")";
+}
+
 } // namespace
 
 NewPhotoFile::NewPhotoFile(std::string folder)
@@ -142,8 +148,7 @@ bool NewPhotoFile::publish(const std::string &title, const std::string &extensio
 {
     const std::string stem = fileNameFor(title);
     for (int copy = 1; copy <= mostCopies; ++copy) {
-        const std::string number = copy == 1 ? "" : " (" + std::to_string(copy) + ")";
-        if (rename(stem + number + extension)) {
+        if (rename(numbered(stem, copy) + extension)) {
             syncFolder(mFolder);
             return true;
         }
