@@ -2,6 +2,7 @@
 
 #include "base/i18n.h"
 #include "common/ui/dialogpanel.h"
+#include "common/ui/frames.h"
 #include "common/ui/remotekeys.h"
 
 #include <QKeyEvent>
@@ -16,7 +17,7 @@ constexpr int kWidth = 620;
 constexpr int kHeight = 360;
 
 const QString kStyle = QStringLiteral(
-    "QListView {border-image: url(:/res/PopUpMenu_Content_Bg.png); border: 0px; padding: 12px;"
+    "QListView {background: transparent; border: 0px; padding: 12px;"
     " color: #f2f6f9; font-size: 22px; outline: 0px;}"
     "QListView::item {min-height: 52px; padding: 0px 14px;}"
     "QListView::item:selected {border-image: url(:/res/Button_Focus.png) 6; border-width: 6px;"
@@ -31,7 +32,8 @@ AccountList::AccountList(const QStringList &accounts, QWidget *parent)
     panel->setFixedSize(kWidth, kHeight);
     QLabel *title = makePopupTitle(panel);
     title->setText(I18n::prompt(3));
-    mList = new QListView(panel);
+    auto *content = new QContentFrame(panel);
+    mList = new QListView(content);
     mList->setFocusPolicy(Qt::NoFocus); // the keys come here
     mList->setEditTriggers(QAbstractItemView::NoEditTriggers);
     mList->setTextElideMode(Qt::ElideMiddle);
@@ -44,7 +46,10 @@ AccountList::AccountList(const QStringList &accounts, QWidget *parent)
     rows->setContentsMargins(0, 0, 0, 0);
     rows->setSpacing(0);
     rows->addWidget(title);
-    rows->addWidget(mList, 1);
+    rows->addWidget(content, 1);
+    auto *inner = new QVBoxLayout(content);
+    inner->setContentsMargins(0, 0, 0, 0);
+    inner->addWidget(mList);
     setPanel(panel);
 }
 
