@@ -4,6 +4,7 @@
 #include <QStringList>
 
 class QLabel;
+class ValueLabel;
 
 // A row of the settings panel: a caption and a value between two arrows. Select begins and ends the
 // editing of the value, which Down increases and Up decreases; all other keys are left to the
@@ -42,7 +43,7 @@ private:
     void redraw();
 
     QLabel *mCaption;
-    QLabel *mValueLabel;
+    ValueLabel *mValueLabel;
     QStringList mChoices;
     QString mSuffix;
     int mKind = Number;
