@@ -28,6 +28,7 @@ input:focus, button:focus { border-color: #f2f6f9; box-shadow: 0 0 0 .14em #f2f6
   outline-offset: -2px; }
 input:focus { background: #0f3d61; }
 button:focus { background: #1969a5; }
+::selection { background: transparent; }
 button:disabled { color: #75848f; }
 .message { display: inline-block; padding: .3em 1em; color: #14181f; background: #ffd27a;
   border-radius: 6px; }

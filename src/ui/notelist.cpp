@@ -107,9 +107,12 @@ private:
         const int kind = index.data(KindRole).toInt();
         painter->setFont(textFont());
         painter->setPen(kind == MessageRow ? kDimmed : kText);
+        const QString text = index.data(TextRole).toString();
         const int alignment = kind == MessageRow ? Qt::AlignHCenter : Qt::AlignLeft;
-        painter->drawText(area, alignment | Qt::AlignTop | Qt::TextDontClip,
-                          index.data(TextRole).toString());
+        if (index.data(DeleteRole).toBool())
+            area.setRight(area.right() - kDeleteWidth - kPadding);
+        painter->setLayoutDirection(text.isRightToLeft() ? Qt::RightToLeft : Qt::LeftToRight);
+        painter->drawText(area, alignment | Qt::AlignTop | Qt::TextDontClip, text);
     }
 };
 

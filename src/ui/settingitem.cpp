@@ -2,7 +2,6 @@
 
 #include "common/ui/picture.h"
 #include "common/ui/remotekeys.h"
-#include "common/ui/selfpainted.h"
 #include "common/ui/stretchedpicture.h"
 #include "data/htmlentities.h"
 #include "network/systemconfig.h"
@@ -69,7 +68,7 @@ protected:
 };
 
 SettingItem::SettingItem(const QString &caption, QWidget *parent)
-    : QFrame(parent)
+    : SelfPainted(parent)
     , mCaption(dress(new QLabel(this), Qt::AlignRight | Qt::AlignVCenter))
     , mValueLabel(dress(new ValueLabel(this), Qt::AlignCenter))
 {

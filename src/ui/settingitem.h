@@ -1,5 +1,7 @@
 #pragma once
 
+#include "common/ui/selfpainted.h"
+
 #include <QFrame>
 #include <QStringList>
 
@@ -9,7 +11,7 @@ class ValueLabel;
 // A row of the settings panel: a caption and a value between two arrows. Select begins and ends the
 // editing of the value, which Down increases and Up decreases; all other keys are left to the
 // panel.
-class SettingItem : public QFrame
+class SettingItem : public SelfPainted<QFrame>
 {
     Q_OBJECT
 

@@ -73,7 +73,7 @@ QFont entryFont(QFont font, bool signOut)
 } // namespace
 
 TitleIcon::TitleIcon(const QString &text, bool signOut, QWidget *parent)
-    : QLabel(parent)
+    : SelfPainted(parent)
     , isSignOut(signOut)
 {
     setTextFormat(Qt::PlainText);
