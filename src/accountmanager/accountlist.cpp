@@ -4,6 +4,7 @@
 #include "common/ui/dialogpanel.h"
 #include "common/ui/frames.h"
 #include "common/ui/remotekeys.h"
+#include "common/ui/scrollbarstyle.h"
 #include "common/ui/stretchedpicture.h"
 
 #include <QKeyEvent>
@@ -22,8 +23,8 @@ constexpr int kMargin = 12;
 constexpr int kRowHeight = 52;
 constexpr int kPadding = 20;
 
-const QString kStyle = QStringLiteral(
-    "QListView {background: transparent; border: 0px; font-size: 22px;}");
+const QString kStyle =
+    QStringLiteral("QListView {background: transparent; border: 0px; font-size: 22px;}");
 
 // A style sheet would blur the picture behind the selected row on a dense screen.
 class RowDelegate : public QStyledItemDelegate
@@ -68,7 +69,7 @@ AccountList::AccountList(const QStringList &accounts, QWidget *parent)
     mList->setEditTriggers(QAbstractItemView::NoEditTriggers);
     mList->setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
     mList->setUniformItemSizes(true);
-    mList->setStyleSheet(kStyle);
+    mList->setStyleSheet(kStyle + scrollBarStyle());
     mList->setItemDelegate(new RowDelegate(mList));
     mList->setFixedHeight(qMin(accounts.size(), kMostRows) * kRowHeight);
     mList->setModel(new QStringListModel(accounts, mList));

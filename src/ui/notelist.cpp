@@ -2,6 +2,7 @@
 
 #include "base/i18n.h"
 #include "common/ui/remotekeys.h"
+#include "common/ui/scrollbarstyle.h"
 #include "common/ui/textfit.h"
 #include "network/systemconfig.h"
 
@@ -150,11 +151,8 @@ NoteList::NoteList(const QString &addText, QWidget *parent)
     mRows->setFrameShape(QFrame::NoFrame);
     mRows->setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
     mRows->setVerticalScrollMode(QAbstractItemView::ScrollPerPixel);
-    mRows->setStyleSheet(QStringLiteral(
-        "QListWidget{background:transparent;border:0px;}"
-        "QScrollBar:vertical{width:10px;background:#1c2730;border-radius:5px;}"
-        "QScrollBar::handle:vertical{min-height:40px;background:#c9d5dd;border-radius:5px;}"
-        "QScrollBar::add-line,QScrollBar::sub-line{height:0px;}"));
+    mRows->setStyleSheet(QStringLiteral("QListWidget {background: transparent; border: 0px;}") +
+                         scrollBarStyle());
     fill(QString());
 }
 
