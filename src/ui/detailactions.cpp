@@ -11,8 +11,8 @@
 
 namespace {
 
-constexpr QSize kCell(92, 76);
-constexpr int kGap = 4;
+constexpr QSize kCell(96, 76);
+constexpr int kGap = 2;
 constexpr int kPicture = 28;
 constexpr int kTextHeight = 16; // pixels of the font
 constexpr int kFocusBorder = 2;
