@@ -21,14 +21,18 @@ struct Place
 {
     int first;
     uint weight; // of the second, in 256ths
-
-    Place(int pixel, int target, int source)
-    {
-        const qint64 at = qMax<qint64>(0, (2 * pixel + 1) * qint64(source) * 128 / target - 128);
-        first = int(qMin<qint64>(at / 256, source - 2));
-        weight = uint(qMin<qint64>(256, at - 256 * first));
-    }
 };
+
+QVector<Place> placesOf(int target, int source)
+{
+    QVector<Place> places(target);
+    for (int i = 0; i < target; ++i) {
+        const qint64 at = qMax<qint64>(0, (2 * i + 1) * qint64(source) * 128 / target - 128);
+        const int first = int(qMin<qint64>(at / 256, source - 2));
+        places[i] = {first, uint(qMin<qint64>(256, at - 256 * first))};
+    }
+    return places;
+}
 
 // What lies between two values; what is left below the brightest is for the noise.
 quint16 between(uint first, uint second, uint weight)
@@ -36,12 +40,13 @@ quint16 between(uint first, uint second, uint weight)
     return quint16(((first * (256 - weight) + second * weight) >> 8) * 255 / 256);
 }
 
-Line spread(const QImage &source, int number, int width)
+Line spread(const QImage &source, int number, const QVector<Place> &places)
 {
+    const int width = places.size();
     const auto *pixels = reinterpret_cast<const QRgba64 *>(source.constScanLine(number));
     Line line{QVector<quint16>(width), QVector<quint16>(width), QVector<quint16>(width)};
     for (int x = 0; x < width; ++x) {
-        const Place place(x, width, source.width());
+        const Place place = places.at(x);
         const QRgba64 left = pixels[place.first];
         const QRgba64 right = pixels[place.first + 1];
         line.red[x] = between(left.red(), right.red(), place.weight);
@@ -86,14 +91,16 @@ QPixmap screenBackground(const QSize &pixels)
     if (source.width() < 2 || source.height() < 2 || target.isNull())
         return QPixmap();
     const QVector<quint16> noise = makeNoise(pixels.width());
+    const QVector<Place> columns = placesOf(pixels.width(), source.width());
+    const QVector<Place> rows = placesOf(pixels.height(), source.height());
     Line above;
     Line below;
     int last = -2;
     for (int y = 0; y < pixels.height(); ++y) {
-        const Place place(y, pixels.height(), source.height());
+        const Place place = rows.at(y);
         if (place.first != last) {
-            above = place.first == last + 1 ? below : spread(source, place.first, pixels.width());
-            below = spread(source, place.first + 1, pixels.width());
+            above = place.first == last + 1 ? below : spread(source, place.first, columns);
+            below = spread(source, place.first + 1, columns);
             last = place.first;
         }
         mix(above, below, place.weight, noise.data() + y * 151 % kNoiseSteps,
@@ -104,11 +111,8 @@ QPixmap screenBackground(const QSize &pixels)
 
 void setScreenBackground(QWidget *widget)
 {
-    const qreal ratio = widget->devicePixelRatioF();
-    QPixmap picture = screenBackground((QSizeF(widget->size()) * ratio).toSize());
-    picture.setDevicePixelRatio(ratio);
     QPalette palette = widget->palette();
-    palette.setBrush(QPalette::Window, picture);
+    palette.setBrush(QPalette::Window, screenBackground(widget->size()));
     palette.setBrush(QPalette::WindowText, Qt::white);
     widget->setPalette(palette);
     widget->setAutoFillBackground(true);
