@@ -171,7 +171,7 @@ void DetailStage::paintMessage(QPainter &painter) const
     const QString text = fitText(mMessage, font(), box);
     const QRect needed = fontMetrics().boundingRect(QRect(QPoint(), box), Qt::AlignLeft, text);
     QRect area(QPoint(), needed.size() + QSize(32, 20));
-    const int bottom = mHasFailed ? pictureArea().bottom() : height();
+    const int bottom = mHasFailed && !mPicture.isNull() ? pictureArea().bottom() : height();
     area.moveCenter(QPoint(width() / 2, bottom - area.height() / 2 - 16));
     painter.setRenderHint(QPainter::Antialiasing);
     painter.setPen(Qt::NoPen);
