@@ -49,7 +49,7 @@ private slots:
         const QImage shown = screenBackground(size).toImage();
         QCOMPARE(shown.size(), size);
         const QImage expected =
-            QImage(path(QStringLiteral("orvala_background"))).scaled(size, Qt::IgnoreAspectRatio);
+            QImage(":/res/orvala_background.png").scaled(size, Qt::IgnoreAspectRatio);
         for (int y = 0; y < size.height(); ++y) {
             for (int x = 0; x < size.width(); ++x) {
                 const QColor found = shown.pixelColor(x, y), wanted = expected.pixelColor(x, y);
