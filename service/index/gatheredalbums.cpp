@@ -145,7 +145,7 @@ std::optional<Selection> selectionNamed(const Gathering &gathering, const std::s
     if (isMonth(month) && gathering.kinds.count(Gathered::Months) > 0)
         return period(month);
     for (const Gathered kind : gathering.kinds) {
-        const auto selection = selectionOf(gathering, kind);
+        auto selection = selectionOf(gathering, kind);
         if (selection && selection->feedId == feedId)
             return selection;
     }
