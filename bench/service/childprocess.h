@@ -25,6 +25,7 @@ public:
     {
         arguments.insert(arguments.begin(), "orvala-service");
         std::vector<char *> words;
+        words.reserve(arguments.size() + 1);
         for (std::string &argument : arguments)
             words.push_back(argument.data());
         words.push_back(nullptr);

@@ -228,9 +228,7 @@ private:
     int mPort = 0;
 };
 
-} // namespace
-
-int main(int argc, char **argv)
+int run(int argc, char **argv)
 {
     const int count = argc > 1 ? std::atoi(argv[1]) : 3000;
     if (argc > 2)
@@ -245,4 +243,16 @@ int main(int argc, char **argv)
                 count + count / 3, rounds.acknowledged, rounds.lost, rounds.halfWritten,
                 rounds.damaged, rounds.notStarted, rounds.leftBehind);
     return rounds.lost || rounds.halfWritten || rounds.damaged || rounds.notStarted ? 1 : 0;
+}
+
+} // namespace
+
+int main(int argc, char **argv)
+{
+    try {
+        return run(argc, argv);
+    } catch (const std::exception &exception) {
+        std::printf("broken off: %s\n", exception.what());
+        return 1;
+    }
 }
