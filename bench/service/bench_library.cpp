@@ -64,6 +64,7 @@ double longest(const std::vector<Span> &spans, double Span::*part)
 std::string told(const std::vector<Span> &spans)
 {
     std::vector<double> seconds;
+    seconds.reserve(spans.size());
     for (const Span &span : spans)
         seconds.push_back(span.seconds);
     char text[120];

@@ -28,7 +28,7 @@ public:
         const auto *bare = reinterpret_cast<const sockaddr *>(&address);
         address.sin_family = AF_INET;
         address.sin_addr.s_addr = htonl(device);
-        ::bind(mSocket, bare, sizeof address);
+        EXPECT_EQ(::bind(mSocket, bare, sizeof address), 0);
         address.sin_port = htons(static_cast<std::uint16_t>(port));
         address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
         EXPECT_EQ(::connect(mSocket, bare, sizeof address), 0);
@@ -139,9 +139,9 @@ TEST_F(Http, silentAndSlowClientsCostNobodyElse)
     for (const bool withTls : {true, false}) {
         start(withTls);
         const int port = service().port();
-        std::vector<std::unique_ptr<RawClient>> others;
-        for (int i = 0; i < 300; ++i) // more than there are threads
-            others.push_back(std::make_unique<RawClient>(port, INADDR_LOOPBACK + 1));
+        std::vector<std::unique_ptr<RawClient>> others(300); // more than there are threads
+        for (std::unique_ptr<RawClient> &other : others)
+            other = std::make_unique<RawClient>(port, INADDR_LOOPBACK + 1);
         for (int i = 0; i < 200; ++i)
             others[i]->send(i % 2 ? page + "Host: x\r\nX: "
                                   : tokenPost + "Content-Length: 99\r\n\r\nx");
@@ -157,9 +157,9 @@ TEST_F(Http, silentAndSlowClientsCostNobodyElse)
             }
             return good;
         };
-        std::vector<std::future<int>> clients;
-        for (int i = 0; i < 8; ++i)
-            clients.push_back(std::async(std::launch::async, ask));
+        std::vector<std::future<int>> clients(8);
+        for (std::future<int> &client : clients)
+            client = std::async(std::launch::async, ask);
         for (std::future<int> &client : clients)
             EXPECT_EQ(client.get(), 25);
         // And with all of them open the service stops at once.

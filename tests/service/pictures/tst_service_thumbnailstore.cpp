@@ -72,11 +72,11 @@ TEST_F(ThumbnailStoreTest, AnswersManyThreadsAtOnce)
 {
     writePicture(photo, 1200, 800);
     ThumbnailStore store(cache, plenty);
-    std::vector<std::future<std::string>> answers;
+    std::vector<std::future<std::string>> answers(24);
     for (int i = 0; i < 24; ++i)
-        answers.push_back(std::async(std::launch::async, [&, i] {
+        answers[i] = std::async(std::launch::async, [&, i] {
             return store.picture(photo, "a", i % 3 == 0 ? 640 : 320).bytes;
-        }));
+        });
     for (int i = 0; i < 24; ++i)
         EXPECT_EQ(decode(answers[i].get()).width, i % 3 == 0 ? 640 : 320);
     EXPECT_EQ(contentsOf(cache).files, 2);
