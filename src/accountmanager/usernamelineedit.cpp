@@ -1,9 +1,12 @@
 #include "accountmanager/usernamelineedit.h"
 
 #include "accountmanager/pinlineedit.h"
+#include "common/ui/keymap.h"
 #include "common/ui/remotekeys.h"
 
 #include <QKeyEvent>
+
+#include <utility>
 
 namespace {
 
@@ -17,6 +20,8 @@ UserNameLineEdit::UserNameLineEdit(QWidget *parent)
     setMaxLength(kLongest);
     setStyleSheet(accountFieldStyle());
     setContextMenuPolicy(Qt::NoContextMenu);
+    KeyMap::setTakesText(this);
+    connect(this, &QLineEdit::textEdited, this, [this] { mIsTyped = true; });
 }
 
 void UserNameLineEdit::setInput(const QString &text)
@@ -44,4 +49,11 @@ void UserNameLineEdit::keyPressEvent(QKeyEvent *event)
         setMaxLength(kLongest);
     }
     QLineEdit::keyPressEvent(event);
+}
+
+void UserNameLineEdit::focusOutEvent(QFocusEvent *event)
+{
+    QLineEdit::focusOutEvent(event);
+    if (std::exchange(mIsTyped, false))
+        emit typed();
 }

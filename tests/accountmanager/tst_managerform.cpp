@@ -101,6 +101,21 @@ private slots:
         QCOMPARE(started.size(), 1);
     }
 
+    // Typed straight into the field, a stored login ID is known as well when the field is left.
+    void typedLoginId()
+    {
+        QTest::keyClicks(mForm->findChild<UserNameLineEdit *>(), "anna");
+        press(DEVICE_DOWN_KEY);
+        QCOMPARE(tip(), I18n::login(11));
+        QCOMPARE(QApplication::focusWidget(), boxes().first());
+        for (PinLineEdit *box : boxes())
+            box->setDigit('1');
+        QTRY_VERIFY(button("Next")->isEnabled());
+        boxes().at(2)->setFocus();
+        press(DEVICE_CLEAR_KEY); // three digits are no code
+        QVERIFY(!button("Next")->isEnabled());
+    }
+
     void chosenAccount()
     {
         QSignalSpy signedIn(mForm.get(), &ManagerWidget::loginSucessed);
