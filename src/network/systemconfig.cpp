@@ -18,6 +18,8 @@ namespace {
 
 qreal scaleInForce = 1;
 
+constexpr int longestWait = 24 * 60 * 60; // seconds; timers count in milliseconds, as an int
+
 const QString serviceOrigin = QStringLiteral("https://album.orvala.example");
 
 } // namespace
@@ -249,12 +251,12 @@ bool SystemConfig::verifyCertificates()
 
 int SystemConfig::silenceSeconds()
 {
-    return qMax(0, integer("Network/SilenceSeconds", 0));
+    return qBound(0, integer("Network/SilenceSeconds", 0), longestWait);
 }
 
 int SystemConfig::idleConnectionSeconds()
 {
-    return qMax(0, integer("Network/IdleConnectionSeconds", 60));
+    return qBound(0, integer("Network/IdleConnectionSeconds", 60), longestWait);
 }
 
 qreal SystemConfig::scaleSetting()
