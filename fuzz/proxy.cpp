@@ -1,8 +1,7 @@
 #include "fuzz.h"
-#include "network/proxyaddress.h"
 #include "network/systemconfig.h"
 
-#include <QFile>
+#include <QString>
 
 #include <sys/mman.h>
 #include <unistd.h>

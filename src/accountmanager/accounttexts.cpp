@@ -1,10 +1,10 @@
 #include "accountmanager/accounttexts.h"
 
-#include <QVector>
+#include "base/texttable.h"
 
 namespace {
 
-const QVector<const char *> mAccountString = {
+const TextTable mAccountString = {
     "No account is stored on this device yet. Choose New to add one.",
     "This account is not stored any more. Please choose another one.",
     "This account could not be signed in. Please try again, or choose another one.",
@@ -20,7 +20,5 @@ const QVector<const char *> mAccountString = {
 
 QString AccountTexts::text(int index)
 {
-    if (index < 0 || index >= mAccountString.size())
-        return QStringLiteral("Unknown");
-    return QString::fromLatin1(mAccountString.at(index));
+    return textAt(&mAccountString, index);
 }

@@ -23,8 +23,6 @@ const QString kStyle = QStringLiteral(
     "QLabel#title {font-size: 28px;}"
     "QLabel#hint {color: #d5dfe6; margin-top: 12px;}"
     "QLabel#message {color: #ffd27a; font-size: 20px;}"
-    "AccountItem {border-image: url(:/res/Button_Normal.png) 6; border-width: 6px;}"
-    "AccountItem:focus {border-image: url(:/res/Button_Focus.png) 6; border-width: 6px;}"
     "QPushButton {border-image: url(:/res/Button_Normal.png) 6; border-width: 6px;"
     " outline-width: 0px; color: white; font-size: 22px;}"
     "QPushButton:focus {border-image: url(:/res/Button_Focus.png) 6; border-width: 6px;}"
@@ -39,7 +37,7 @@ QLabel *makeLabel(QWidget *parent, const char *name, const QString &text)
     label->setObjectName(QLatin1String(name));
     label->setTextFormat(Qt::PlainText);
     label->setWordWrap(true);
-    label->setIndent(0);
+    label->setIndent(0); // all in line, whatever their styles
     label->setText(text);
     return label;
 }
@@ -71,8 +69,8 @@ LoginPage::LoginPage(QWidget *parent)
     , mMessage(makeLabel(this, "message", QString()))
 {
     buildLayout();
-    connect(mAccounts, &AccountsWidget::selectItem, this, &LoginPage::handleSelectIndex);
-    connect(mAccounts, &AccountsWidget::clickedDelBut, this, &LoginPage::popupConfirmDialog);
+    connect(mAccounts, &AccountsWidget::accountChosen, this, &LoginPage::handleSelectIndex);
+    connect(mAccounts, &AccountsWidget::deletionChosen, this, &LoginPage::popupConfirmDialog);
     reload();
 }
 
@@ -96,7 +94,6 @@ void LoginPage::buildLayout()
     row->addWidget(mHint, 1, Qt::AlignTop);
     row->addLayout(buttons);
 
-    mHint->setIndent(0); // in line with the title
     mMessage->setFixedHeight(48);
     mMessage->setAlignment(Qt::AlignLeft | Qt::AlignVCenter);
     auto *column = new QVBoxLayout(this);

@@ -76,8 +76,7 @@ const TextTable mLoginString = {
     "Orvala Login",
     "Account manager",
     "Account Manager can simplify your login process to Orvala. Please enter your local login ID "
-    "and "
-    "protection code.",
+    "and protection code.",
     "Login ID",
     "Up to 8 characters",
     "Protection code",
