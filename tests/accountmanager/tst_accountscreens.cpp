@@ -5,7 +5,7 @@
 #include "accountmanager/accountswidget.h"
 #include "accountmanager/accounttexts.h"
 #include "accountmanager/loginpage.h"
-#include "common/ui/remotekeys.h"
+#include "common/keyrobot.h"
 #include "oauth/signinplugin.h"
 #include "res/resources.h"
 #include "support/logcapture.h"
@@ -23,10 +23,8 @@ namespace {
 
 void press(const Keys &keys)
 {
-    for (int key : keys) {
-        QKeyEvent event(QEvent::KeyPress, key, Qt::NoModifier);
-        QApplication::sendEvent(QApplication::focusWidget(), &event);
-    }
+    for (int key : keys)
+        pressKey(QApplication::focusWidget(), key);
 }
 
 // What has the focus: an account's address, with a dash behind it for its button, or the text of

@@ -2,7 +2,7 @@
 #include "data/photomanager.h"
 #include "heldanswers.h"
 #include "support/logcapture.h"
-#include "testconfig.h"
+#include "support/testconfig.h"
 #include "testpictures.h"
 
 #include <QtTest>

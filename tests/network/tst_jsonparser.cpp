@@ -115,19 +115,10 @@ private slots:
             QString("{\"s\":\"t\",\"n\":null,\"b\":true,\"o\":{},\"numbers\":0,\"i\":100000,"
                     "\"id\":5613423423423423,\"f\":0.1,\"m\":-2.5,\"h\":1e21,\"z\":-0}"));
         QVERIFY(!JsonParser::value(tree, "absent").isValid());
-        const QHash<QString, QString> texts = {{"s", "t"},
-                                               {"n", ""},
-                                               {"b", "true"},
-                                               {"o", ""},
-                                               {"absent", ""},
-                                               {"i", "100000"},
-                                               {"f", "0.1"},
-                                               {"m", "-2.5"},
-                                               {"h", "1e+21"},
-                                               {"z", "0"},
-                                               {"id", "5613423423423423"}};
-        for (auto it = texts.begin(); it != texts.end(); ++it)
-            QCOMPARE(JsonParser::string(tree, it.key()), it.value());
+        QStringList texts;
+        for (const char *key : {"s", "n", "b", "o", "absent", "i", "id", "f", "m", "h", "z"})
+            texts << JsonParser::string(tree, key);
+        QCOMPARE(texts.join(' '), "t  true   100000 5613423423423423 0.1 -2.5 1e+21 0");
     }
 };
 

@@ -36,16 +36,11 @@ int note(char *name, _NETWORK_EVENT_T event)
     return 0;
 }
 
-QList<Call> calls()
-{
-    const std::lock_guard<std::mutex> lock(callsMutex);
-    return allCalls;
-}
-
 QList<bool> carriersOf(const QString &name)
 {
+    const std::lock_guard<std::mutex> lock(callsMutex);
     QList<bool> carriers;
-    for (const Call &call : calls()) {
+    for (const Call &call : qAsConst(allCalls)) {
         if (call.name == name)
             carriers.append(call.carrier);
     }
@@ -152,7 +147,7 @@ private slots:
     {
         gateClosed = true;
         ip("link set second down\n");
-        QTRY_VERIFY(!calls().isEmpty());
+        QTRY_VERIFY(!carriersOf("second").isEmpty());
         // The thread stands still: more notices than its socket can hold, the last ones count.
         const bool isDone =
             ip(QString("link set first mtu 1400\nlink set first mtu 1401\n").repeated(1500) +
