@@ -24,7 +24,6 @@ public:
     {
     }
 
-    QKeyBoard *keyboard() const { return mKeyboard; }
     QPlainTextEdit *box() const { return mBox; }
     int presses() const { return mPresses; }
 

@@ -34,7 +34,7 @@ private slots:
         const KeyMap device = KeyMap::fromConfiguration();
         QCOMPARE(device.translate(press(DEVICE_RETURN_KEY)), int(DEVICE_RETURN_KEY));
         QCOMPARE(device.translate(press(Qt::Key_Back)), int(DEVICE_RETURN_KEY));
-        QVERIFY(!log.anyStartsWith("KeyMap"));
+        QVERIFY(LogCapture::lines().filter("KeyMap").isEmpty());
         SystemConfig::setConfigFile("/nowhere/config.ini");
         QVERIFY(KeyMap::fromConfiguration().isEmpty());
     }
@@ -60,13 +60,10 @@ private slots:
     void onlyTheKeyChanges()
     {
         const KeyMap map({{"P", "Play"}});
-        const QKeyEvent event(QEvent::KeyRelease, Qt::Key_P, Qt::ShiftModifier, 33, 44, 55, "P",
-                              true, 2);
+        const QKeyEvent event(QEvent::KeyRelease, Qt::Key_P, Qt::ShiftModifier, "P", true, 2);
         const QKeyEvent mapped = map.translated(event);
-        QCOMPARE(mapped.key(), int(DEVICE_PLAY_KEY));
-        QCOMPARE(mapped.type(), QEvent::KeyRelease);
-        QCOMPARE(mapped.text(), "P");
-        QVERIFY(mapped.isAutoRepeat());
+        QVERIFY(mapped.key() == DEVICE_PLAY_KEY && mapped.type() == QEvent::KeyRelease);
+        QVERIFY(mapped.text() == "P" && mapped.isAutoRepeat());
         QCOMPARE(map.translate(press(Qt::Key_P, {}, 0, Qt::ControlModifier)), int(Qt::Key_P));
         QWindow window;
         QVERIFY(KeyMap::isFromPlatform(&window, &event));

@@ -1,13 +1,12 @@
 #include "common/ui/picture.h"
 #include "common/ui/scale.h"
-#include "network/systemconfig.h"
 #include "res/resources.h"
+#include "support/testconfig.h"
 
 #include <QDirIterator>
 #include <QGuiApplication>
 #include <QRegularExpression>
 #include <QScreen>
-#include <QTemporaryFile>
 #include <QTest>
 
 // The pictures and the scale at which they are shown.
@@ -47,11 +46,7 @@ private slots:
         SystemConfig::setConfigFile("/nowhere/config.ini");
         applyScale();
         QCOMPARE(qGuiApp->primaryScreen()->size(), plain);
-        QTemporaryFile file;
-        QVERIFY(file.open());
-        file.write("[Layout]\nScale=1.5\n");
-        file.close();
-        SystemConfig::setConfigFile(file.fileName());
+        const TestConfig config("[Layout]\nScale=1.5\n");
         applyScale();
         QCOMPARE(qGuiApp->primaryScreen()->size(), (QSizeF(plain) / 1.5).toSize());
         QCOMPARE(SystemConfig::scale(), 1.5);

@@ -16,11 +16,6 @@ void callback(QString &url, ErrorCode code)
     calls << url.section('/', -1) + ' ' + QString::number(code);
 }
 
-void otherCallback(QString &, ErrorCode)
-{
-    calls << "other";
-}
-
 void clearingCallback(QString &url, ErrorCode code)
 {
     callback(url, code);
@@ -66,7 +61,8 @@ private slots:
             mServer->on("/" + QByteArray::number(i), mHeld.hold());
             QVERIFY(download(QString::number(i)));
         }
-        QVERIFY(download("7") && PhotoManager::downloadPhoto(mServer->url("/7"), &otherCallback));
+        const auto other = [](QString &, ErrorCode) { calls << "other"; };
+        QVERIFY(download("7") && PhotoManager::downloadPhoto(mServer->url("/7"), other));
         QTRY_COMPARE(mHeld.count(), 5);
         QCOMPARE(mServer->requests().size(), 5);
         mHeld.answerFirst(MisbehavingServer::answer(png(4, 4)));

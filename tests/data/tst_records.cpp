@@ -62,7 +62,7 @@ class TestRecords : public QObject
 private slots:
     void init() { mConfig.write(""); }
 
-    void readsPhoto()
+    void readsPhotoAndTags()
     {
         const QByteArray total = json("'openSearch$totalResults':{'$t':'321'}");
         const OwnedPackage package = packageOf(FEATURED_PHOTOS_LIST, feed(photoEntry, total));
@@ -79,6 +79,9 @@ private slots:
         QCOMPARE(photo->published(), QDateTime(QDate(2012, 3, 1), QTime(10, 20, 30)));
         QCOMPARE(photo->photoId(), QString("5555555555555555555"));
         QCOMPARE(photo->commentCount(), 7);
+        const QByteArray tags = feed(json("{'title':{'$t':'x, y, '}}"));
+        QCOMPARE(packageOf(PHOTO_TAGS_LIST, tags)->record<PhotoTagList>(0)->tagList(),
+                 QStringList({"x", "y"}));
     }
 
     void asksForDisplayWidth()
@@ -134,13 +137,6 @@ private slots:
         QCOMPARE(comment->createdTime(), QDateTime(QDate(2012, 3, 1), QTime(18, 0), Qt::UTC));
         QCOMPARE(comment->userId() + comment->nickname() + comment->content(), QString("unhi"));
         QCOMPARE(comment->commentId() + comment->photoId(), QString("cp"));
-    }
-
-    void readsTags()
-    {
-        const OwnedPackage package =
-            packageOf(PHOTO_TAGS_LIST, feed(json("{'title':{'$t':'x, y, '}}")));
-        QCOMPARE(package->record<PhotoTagList>(0)->tagList(), QStringList({"x", "y"}));
     }
 
     // Whatever stands where something else is expected: one record for each entry, with defaults.

@@ -90,20 +90,14 @@ private slots:
 
     void boundsTheDepth()
     {
-        for (const QByteArray &open :
-             {QByteArray("["), QByteArray("{\"a\":"), QByteArray("[[],{\"a\":")}) {
-            const int levels = open.count('[') + open.count('{') - open.count(']');
-            const QByteArray close = open.startsWith("[[")  ? "}]"
-                                     : open.startsWith('[') ? "]"
-                                                            : "}";
-            for (const char *core : {"1", "[]", "{}", "[-0]", "[\"\\ud83d\"]"}) {
-                const int inner = core[0] == '1' ? 0 : 1;
-                const int deepest = (1000 - inner) / levels;
-                const auto nested = [&](int n) {
-                    return open.repeated(n) + core + close.repeated(n);
-                };
-                QVERIFY(outcomeOf(nested(deepest)) != "refused");
-                QCOMPARE(outcomeOf(nested(deepest + 1)), QString("refused"));
+        const QPair<QByteArray, QByteArray> rows[] = {{"[", "]"}, {"{\"a\":", "}"}};
+        for (const auto &[open, close] : rows) {
+            for (const QByteArray core : {"1", "[]", "{}", "[-0]", "[\"\\ud83d\"]"}) {
+                const int deepest = core == "1" ? 1000 : 999;
+                QVERIFY(outcomeOf(open.repeated(deepest) + core + close.repeated(deepest)) !=
+                        "refused");
+                QCOMPARE(outcomeOf(open.repeated(deepest + 1) + core + close.repeated(deepest + 1)),
+                         "refused");
             }
         }
         QVERIFY(JsonParser::parse(QByteArray("[").repeated(1000000)).isEmpty());

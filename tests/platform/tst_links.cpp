@@ -14,15 +14,9 @@
 
 namespace {
 
-struct Call
-{
-    QString name;
-    bool carrier;
-};
-
 std::mutex callsMutex;
-QList<Call> allCalls;
-QSemaphore gate; // taken by each call while it is closed
+QList<QPair<QString, bool>> allCalls; // name and carrier
+QSemaphore gate;                      // taken by each call while it is closed
 std::atomic<bool> gateClosed{false};
 
 int note(char *name, _NETWORK_EVENT_T event)
@@ -40,9 +34,9 @@ QList<bool> carriersOf(const QString &name)
 {
     const std::lock_guard<std::mutex> lock(callsMutex);
     QList<bool> carriers;
-    for (const Call &call : qAsConst(allCalls)) {
-        if (call.name == name)
-            carriers.append(call.carrier);
+    for (const auto &[called, carrier] : qAsConst(allCalls)) {
+        if (called == name)
+            carriers.append(carrier);
     }
     return carriers;
 }

@@ -6,6 +6,7 @@
 #include <QSignalSpy>
 #include <QTest>
 #include <QUdpSocket>
+#include <QtEndian>
 
 namespace {
 
@@ -22,8 +23,7 @@ int noteClock(const time_t *seconds)
 QByteArray reply(quint32 seconds, int size = 48)
 {
     QByteArray datagram(size, '\xFF');
-    for (int i = 0; i < 4; ++i)
-        datagram[size - 8 + i] = char(seconds >> (24 - 8 * i));
+    qToBigEndian(seconds, datagram.data() + size - 8);
     return datagram;
 }
 
