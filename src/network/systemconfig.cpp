@@ -60,7 +60,7 @@ QString SystemConfig::value(const QString &key, const QString &fallback)
 QStringList SystemConfig::keysOf(const QString &group)
 {
     settings().beginGroup(group);
-    const QStringList keys = settings().childKeys();
+    QStringList keys = settings().childKeys();
     settings().endGroup();
     return keys;
 }
