@@ -225,7 +225,7 @@ ErrorCode PostHelper::read(Connection &connection, const LogTexts &texts, QStrin
 
 ErrorCode PostHelper::postNewPhoto(const QString &userId, const QString &albumId,
                                    const QString &title, const QString &summary, QString mimeType,
-                                   QByteArray image, qint64 imageSize)
+                                   const QByteArray &image, qint64 imageSize)
 {
     const QString url = urlOf(POST_NEW_PHOTO_URL.arg(encoded(userId), encoded(albumId), token()));
     // Escaped like the notes: the title may be a file's name, and "&" alone is no XML.

@@ -87,8 +87,8 @@ private slots:
 
     void titles()
     {
-        const std::tuple<const char *, int, int, int> rows[] = {// closed, denied, posted
-                                                                {"Success code=", 1, 0, 1},
+        // How often the page is closed, the denial told, the code sent.
+        const std::tuple<const char *, int, int, int> rows[] = {{"Success code=", 1, 0, 1},
                                                                 {"Success code", 1, 0, 0},
                                                                 {"Denied error=x", 1, 1, 0},
                                                                 {"denied error=x", 0, 0, 0},

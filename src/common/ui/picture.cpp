@@ -12,7 +12,7 @@ QString sharpestFile(const QString &path, qreal ratio)
 {
     const int dot = path.lastIndexOf(QLatin1Char('.'));
     for (int scale = qMin(3, qCeil(ratio)); scale > 1; --scale) {
-        const QString file = path.left(dot) + QStringLiteral("@%1x").arg(scale) + path.mid(dot);
+        QString file = path.left(dot) + QStringLiteral("@%1x").arg(scale) + path.mid(dot);
         if (QFile::exists(file))
             return file;
     }
