@@ -230,6 +230,14 @@ private slots:
         QCOMPARE(hung.load(), 1);
     }
 
+    void pageThatFillsTheMemory()
+    {
+        std::atomic<int> hung{0};
+        const PageWatchdog watchdog(std::chrono::seconds(10), nullptr, [&hung] { ++hung; });
+        const QByteArray page(PageWatchdog::MOST_GROWTH + 64 * 1024 * 1024, 'x');
+        QTRY_COMPARE_WITH_TIMEOUT(hung.load(), 1, 20000);
+    }
+
     void nothingLocal()
     {
         QTemporaryFile file;

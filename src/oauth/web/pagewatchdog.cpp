@@ -4,12 +4,21 @@
 
 #include <unistd.h>
 
+#include <fstream>
 #include <system_error>
 #include <utility>
 
 namespace {
 
 constexpr int TICKS = 10; // of the patience
+
+// In bytes; 0 where the system does not tell.
+qint64 residentMemory()
+{
+    qint64 total = 0, resident = 0;
+    std::ifstream("/proc/self/statm") >> total >> resident;
+    return resident * ::sysconf(_SC_PAGESIZE);
+}
 
 } // namespace
 
@@ -46,11 +55,12 @@ PageWatchdog::~PageWatchdog()
 // that slept, has missed one.
 void PageWatchdog::watch()
 {
+    const qint64 before = residentMemory();
     std::unique_lock<std::mutex> lock(mMutex);
     int missed = 0;
     while (!mOver.wait_for(lock, mTick, [this] { return mIsOver; })) {
         missed = std::exchange(mHasBeaten, false) ? 0 : missed + 1;
-        if (missed < TICKS)
+        if (missed < TICKS && residentMemory() - before < MOST_GROWTH)
             continue;
         lock.unlock();
         mOnHung();
@@ -60,6 +70,6 @@ void PageWatchdog::watch()
 
 void PageWatchdog::endProcess()
 {
-    logLine("{PageWatchdog} a script of the sign-in page does not end: the program ends");
+    logLine("{PageWatchdog} the sign-in page holds up the program or fills its memory: it ends");
     ::_exit(EXIT_HUNG);
 }
