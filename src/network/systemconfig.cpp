@@ -100,7 +100,7 @@ int SystemConfig::pageCacheNumber()
 
 int SystemConfig::pageCacheSeconds()
 {
-    return integer("Max/PageCacheSeconds", 60);
+    return qMax(1, integer("Max/PageCacheSeconds", 60));
 }
 
 int SystemConfig::scrollAreaMaxColumn()

@@ -131,8 +131,11 @@ private slots:
     {
         PackageProperty property = albumsOf("u"), later = property;
         later.mStartIndex = 9;
-        PackageManager::addToCache(property, packageOf(property), false);
-        configure("PageCacheSeconds=0\n");
+        configure("PageCacheSeconds=0\n"); // a page is there for a moment at least
+        Package *package = packageOf(property);
+        PackageManager::addToCache(property, package, false);
+        QVERIFY(PackageManager::getPackage(property) && PackageManager::getPackage(later));
+        package->mProperty.mDownloadTime = property.mDownloadTime.addSecs(-1);
         QVERIFY(PackageManager::getPackage(later));
         QVERIFY(!PackageManager::getPackage(property) && !PackageManager::getPackage(later));
 
