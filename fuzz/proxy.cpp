@@ -1,8 +1,6 @@
 #include "fuzz.h"
 #include "network/systemconfig.h"
 
-#include <QString>
-
 #include <sys/mman.h>
 #include <unistd.h>
 

@@ -178,17 +178,11 @@ void LoginPage::keyPressEvent(QKeyEvent *event)
         break;
     case DEVICE_LEFT_KEY:
         logLine("enter DEVICE_LEFT_KEY");
-        if (mAccounts->hasDeleteFocus())
-            mAccounts->focusCurrent();
-        else if (!mAccounts->hasRowFocus())
-            mAccounts->focusDelete();
+        handleLeft();
         break;
     case DEVICE_RIGHT_KEY:
         logLine("enter DEVICE_RIGHT_KEY");
-        if (mAccounts->hasRowFocus())
-            mAccounts->focusDelete();
-        else if (mAccounts->hasDeleteFocus())
-            mNewButton->setFocus();
+        handleRight();
         break;
     case DEVICE_PAGEUP_KEY:
     case DEVICE_PAGEDOWN_KEY:
@@ -201,6 +195,22 @@ void LoginPage::keyPressEvent(QKeyEvent *event)
     default:
         event->ignore();
     }
+}
+
+void LoginPage::handleLeft()
+{
+    if (mAccounts->hasDeleteFocus())
+        mAccounts->focusCurrent();
+    else if (!mAccounts->hasRowFocus())
+        mAccounts->focusDelete();
+}
+
+void LoginPage::handleRight()
+{
+    if (mAccounts->hasRowFocus())
+        mAccounts->focusDelete();
+    else if (mAccounts->hasDeleteFocus())
+        mNewButton->setFocus();
 }
 
 void LoginPage::handleUpOrDown(int rows)

@@ -4,7 +4,6 @@
 #include "paths.h"
 
 #include <QSettings>
-#include <QStringList>
 #include <QtMath>
 
 #include <memory>
