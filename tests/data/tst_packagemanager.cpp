@@ -89,13 +89,10 @@ private slots:
         QVERIFY(answers.isEmpty() && secondAnswers.first().property.mDownloadTime.isValid());
         QCOMPARE(mServer->requests().size(), 1);
         QCOMPARE(PackageManager::getPackage(property)->count(), 3);
-    }
 
-    // Lists whose addresses are the same although their keys differ do not disturb each other.
-    void keepsListsOfOneAddressApart()
-    {
+        // Lists whose addresses are the same although their keys differ do not disturb each other.
         mServer->on("/data/feed/api/user/u", MisbehavingServer::answer(feedOf(3)));
-        PackageProperty first = albumsOf("u"), second = first;
+        PackageProperty first = property, second = property;
         second.mAlbumId = "left over";
         QVERIFY(PackageManager::downloadPage(first, &store));
         QVERIFY(PackageManager::downloadPage(second, &store));

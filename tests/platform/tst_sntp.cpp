@@ -51,12 +51,7 @@ private slots:
     void buildsTheRequest()
     {
         const QDateTime local(QDate(2024, 2, 29), QTime(12, 30, 15), Qt::OffsetFromUTC, -5 * 3600);
-        QByteArray expected(48, '\0');
-        expected[0] = 0x1B;
-        expected[2] = 4;
-        expected[3] = char(250);
-        expected[5] = 1;
-        expected[9] = 1;
+        QByteArray expected = QByteArray::fromHex("1b0004fa000100000001").leftJustified(48, '\0');
         // 1709209815 is the same reading of the clock in UTC.
         expected.replace(40, 4, reply(1709209815u + 2208988800u).mid(40, 4));
         QCOMPARE(sntpRequest(local), expected);
