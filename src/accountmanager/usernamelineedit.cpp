@@ -1,6 +1,5 @@
 #include "accountmanager/usernamelineedit.h"
 
-#include "accountmanager/pinlineedit.h"
 #include "common/ui/keymap.h"
 #include "common/ui/remotekeys.h"
 
@@ -15,11 +14,9 @@ constexpr int kLongest = 8;
 } // namespace
 
 UserNameLineEdit::UserNameLineEdit(QWidget *parent)
-    : QLineEdit(parent)
+    : AccountField(parent)
 {
     setMaxLength(kLongest);
-    setStyleSheet(accountFieldStyle());
-    setContextMenuPolicy(Qt::NoContextMenu);
     KeyMap::setTakesText(this);
     connect(this, &QLineEdit::textEdited, this, [this] { mIsTyped = true; });
 }
@@ -48,12 +45,12 @@ void UserNameLineEdit::keyPressEvent(QKeyEvent *event)
         clear();
         setMaxLength(kLongest);
     }
-    QLineEdit::keyPressEvent(event);
+    AccountField::keyPressEvent(event);
 }
 
 void UserNameLineEdit::focusOutEvent(QFocusEvent *event)
 {
-    QLineEdit::focusOutEvent(event);
+    AccountField::focusOutEvent(event);
     if (std::exchange(mIsTyped, false))
         emit typed();
 }

@@ -1,10 +1,10 @@
 #pragma once
 
-#include <QLineEdit>
+#include "accountmanager/accountfield.h"
 
 // The field for the login ID of the account form. It leaves Select to the form. Digits and letters
 // may also be typed straight into it.
-class UserNameLineEdit : public QLineEdit
+class UserNameLineEdit : public AccountField
 {
     Q_OBJECT
 
