@@ -229,6 +229,7 @@ TEST(AccessLog, cutsSecretsOut)
         {"/user/1?kind=tag&access_token=abc&alt=json",
          "/user/1?kind=tag&access_token=***&alt=json"},
         {"/a?acc%65ss_token=abc", "/a?acc%65ss_token=***"},
+        {"/a?%u0061ccess_token=abc", "/a?%u0061ccess_token=***"},
         {"/a?code=x&&q=1?", "/a?code=***&&q=1?"},
         {"/photos/kEy-1/s336/Sea.jpg?password=x", "/photos/***/s336/Sea.jpg?password=***"},
         {"/photos/kEy-1", "/photos/***"},
