@@ -4,6 +4,7 @@
 #include "common/ui/qprogressindicator.h"
 #include "common/ui/stretchedpicture.h"
 #include "common/ui/textfit.h"
+#include "ui/zoom.h"
 
 #include <QPainter>
 
@@ -14,14 +15,6 @@ constexpr int kMark = 3;
 constexpr int kIndicatorDelay = 600; // milliseconds
 constexpr int kMessageHeight = 20;   // pixels of the font
 constexpr QSize kArrow(48, 96);
-
-// Proportions that differ no more than rounding explains.
-bool areAlike(const QSize &a, const QSize &b)
-{
-    const qreal ratio =
-        qreal(a.width()) * b.height() / qMax(qreal(1), qreal(a.height()) * b.width());
-    return ratio > 0.95 && ratio < 1.05;
-}
 
 // The nearest place at which a picture's pixels fall on the screen's.
 QPointF onPixels(const QPainter &painter, const QPointF &point)
@@ -126,7 +119,7 @@ QRect DetailStage::pictureArea() const
     const QSize room = size() - QSize(2 * kFrame, 2 * kFrame);
     QSize shown = (QSizeF(mPicture.size()) / mPicture.devicePixelRatioF()).toSize();
     if (mIsPreview) {
-        const bool useRecord = !mPhotoSize.isEmpty() && areAlike(mPhotoSize, mPicture.size());
+        const bool useRecord = zoom::areAlike(mPhotoSize, mPicture.size());
         shown = (useRecord ? mPhotoSize : mPicture.size()).scaled(room, Qt::KeepAspectRatio);
     }
     shown = shown.expandedTo(QSize(1, 1));

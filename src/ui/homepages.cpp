@@ -15,8 +15,9 @@ namespace {
 // Milliseconds after which a page that has not come counts as failed; 0: never.
 int pagePatience()
 {
-    return SystemConfig::value(QStringLiteral("Network/PageSeconds"), QStringLiteral("0")).toInt() *
-           1000;
+    constexpr int kMostSeconds = 24 * 60 * 60;
+    const int seconds = SystemConfig::value(QStringLiteral("Network/PageSeconds")).toInt();
+    return qBound(0, seconds, kMostSeconds) * 1000;
 }
 
 // A page with the search bar in its middle. The bar's size is the screen's business: it is wider

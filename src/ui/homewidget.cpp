@@ -143,10 +143,12 @@ void HomeWidget::pushPackageData()
         logLine("Error: pushPackageData package is NULL");
 }
 
-// After the cache may have let go of it.
+// After the cache may have let go of it, or the photo screen has gone on to further search results,
+// which are a list of their own.
 void HomeWidget::holdPackage()
 {
-    if (!mCurrentPackageData)
+    const int type = mState.mCurrentProperty.mType;
+    if (!mCurrentPackageData || mCurrentPackageData->mProperty.mType != type)
         mCurrentPackageData = mLoader->held();
 }
 

@@ -8,6 +8,7 @@
 #include "ui/homepages.h"
 #include "ui/homestate.h"
 #include "ui/homewidget.h"
+#include "ui/qimageslide.h"
 #include "ui/screentexts.h"
 
 ListLoader::ListLoader(HomeState *state, HomePages *pages, AccountQuestions *questions,
@@ -48,11 +49,14 @@ void ListLoader::finished(PackageProperty &property, ErrorCode code)
         showFailure(code);
 }
 
-// A page refused, or a sign-in that has expired, may need another sign-in.
+// A page refused, or a sign-in that has expired, may need another sign-in. Nobody is asked below the
+// slide show: whoever leaves it has the page asked for again.
 void ListLoader::showFailure(ErrorCode code)
 {
     const bool isExpired = code == NET_FAILED && PackageManager::isSignInRefused();
     mPages->showFailure(isExpired ? NET_NOT_PERMITTED : code);
+    if (QImageSlide::mIsShowing)
+        return;
     if (isExpired)
         mQuestions->askAfterRefusal(ScreenTexts::question(ScreenTexts::SignInExpired));
     else if (code == NET_CONTENT_ERROR)

@@ -14,6 +14,8 @@
 #include "ui/screentexts.h"
 #include "ui/sendingnotice.h"
 
+#include <QLocale>
+
 #include <algorithm>
 
 namespace {
@@ -29,7 +31,8 @@ bool isOwn(const Comment &comment, const PackageProperty &photo, bool isSelfPhot
 QString headingOf(const Comment &comment)
 {
     const QString name = comment.nickname().isEmpty() ? comment.userId() : comment.nickname();
-    const QString when = comment.createdTime().toString(QStringLiteral("d MMM yyyy, hh:mm"));
+    const QString when =
+        QLocale::c().toString(comment.createdTime(), QStringLiteral("d MMM yyyy, hh:mm"));
     const QString who = shownText(name).simplified();
     return when.isEmpty() ? who : who + QStringLiteral("   ") + when;
 }
