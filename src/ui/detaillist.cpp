@@ -7,15 +7,6 @@
 
 #include <algorithm>
 
-namespace {
-
-bool isSearch(int type)
-{
-    return type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
-}
-
-} // namespace
-
 void DetailList::open(Package *package, int firstNumber)
 {
     mPackage = package;
@@ -61,7 +52,7 @@ const OrvalaPhoto *DetailList::photo(int number)
 int DetailList::total()
 {
     if (const Package *held = package()) {
-        const bool isWhole = type() != TYPE_FEATURED_PHOTOS && !isSearch(type());
+        const bool isWhole = type() != TYPE_FEATURED_PHOTOS && !paging::isSearch(type());
         mTotal = isWhole ? held->count() : std::max(held->mTotalCount, heldEnd());
     }
     return mEnd > 0 ? std::min(mEnd, mTotal) : mTotal;
@@ -86,7 +77,7 @@ PackageProperty DetailList::requestFor(int number)
     request.mStartIndex = 1;
     if (type() == TYPE_FEATURED_PHOTOS) {
         request.mStartIndex = heldEnd() + 1;
-    } else if (isSearch(type())) {
+    } else if (paging::isSearch(type())) {
         const int block = paging::blockStart((number - 1) / paging::blockSize);
         if (block == 1 && type() == TYPE_SEARCH_PHOTOS)
             return request;
@@ -106,7 +97,7 @@ bool DetailList::take(const PackageProperty &arrived)
     }
     const Package *now = package();
     const bool isNew = now && (now != mPackageAtRequest || heldEnd() != mEndAtRequest);
-    const bool isShortBlock = isSearch(type()) && now && now->count() < paging::blockSize;
+    const bool isShortBlock = paging::isSearch(type()) && now && now->count() < paging::blockSize;
     if (!isNew || isShortBlock)
         mEnd = heldEnd(); // the service has less than it says
     return isNew;

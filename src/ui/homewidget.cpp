@@ -6,6 +6,7 @@
 #include "ui/accountquestions.h"
 #include "ui/formscrollarea.h"
 #include "ui/listloader.h"
+#include "ui/paging.h"
 #include "ui/photopopups.h"
 #include "ui/picturedetailwidget.h"
 #include "ui/searchflow.h"
@@ -157,7 +158,7 @@ void HomeWidget::handleUpWidgetEnter(PackageProperty &property)
     logLine("enter HomeWidget::handleUpWidgetEnter()");
     const PackageProperty wanted = property; // may be the state's own, which changes
     const int type = wanted.mType;
-    const bool isSearch = type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
+    const bool isSearch = paging::isSearch(type);
     if (!isSearch && type != TYPE_FEATURED_PHOTOS && type != TYPE_ALBUM_LIST &&
         type != TYPE_FAVORITE_PEOPLE) {
         logLine("Wrong can not go here HomeWidget::handleUpWidgetEnter");

@@ -15,8 +15,8 @@ class SlideSetting;
 // stepped by the remote or played by a timer, in the order that the settings ask for. As the end of
 // the records comes near it asks for the next page, whose records join the show.
 //
-//   timer, keys --> update(): position, next page, arrows --> showCurrent() --> SlidePhotos -->
-//   label
+//   timer, keys --> update(): position, next page, arrows
+//                     --> showCurrent() --> SlidePhotos --> label
 class QImageSlide : public QWidget
 {
     Q_OBJECT
