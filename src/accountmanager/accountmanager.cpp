@@ -9,6 +9,7 @@
 #include "accountmanager/waitwidget.h"
 #include "base/i18n.h"
 #include "base/log.h"
+#include "common/ui/closelater.h"
 #include "common/ui/remotekeys.h"
 #include "common/ui/screenbackground.h"
 #include "common/ui/shortcutbar.h"
@@ -241,12 +242,8 @@ void AccountManager::showForm(const QString &account)
 
 void AccountManager::closeForm()
 {
-    if (!mForm)
-        return;
-    mForm->hide();
-    mForm->deleteLater();
-    mForm.clear();
-    mLoginPage->show();
+    if (closeLater(mForm))
+        mLoginPage->show();
 }
 
 // Later: it is a key or an answer of its own that ends it.

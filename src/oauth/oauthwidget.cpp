@@ -3,6 +3,7 @@
 #include "accountmanager/accountmanagerhelper.h"
 #include "base/i18n.h"
 #include "base/log.h"
+#include "common/ui/closelater.h"
 #include "common/ui/qpopupform.h"
 #include "common/ui/qprogressindicator.h"
 #include "common/ui/remotekeys.h"
@@ -232,12 +233,8 @@ void OAuthWidget::showInputDialog()
 
 void OAuthWidget::closeInputDialog()
 {
-    if (!mInputForm)
-        return;
-    mInputForm->hide();
-    mInputForm->deleteLater();
-    mInputForm.clear();
-    takeFocus();
+    if (closeLater(mInputForm))
+        takeFocus();
 }
 
 void OAuthWidget::getInput(const QString &contents)
