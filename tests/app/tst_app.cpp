@@ -99,21 +99,16 @@ void TestApp::routesKeysToTheDialog()
 
 void TestApp::leavesOnlyForTheShell()
 {
-    disconnect(mMain.get(), &MainWidget::signalResponseParent, nullptr, nullptr);
     QSignalSpy answers(mMain.get(), &MainWidget::signalResponseParent);
-    QEventLoop loop;
     bool stayed = false;
-    QTimer::singleShot(0, mMain.get(), [&] {
-        mMain->exitOrvala(false, true);
-        QTimer::singleShot(0, mMain.get(), [&] {
-            stayed = true;
-            mMain->exitOrvala(true, false);
-        });
+    QTimer::singleShot(0, mMain.get(), [&] { mMain->exitOrvala(false, true); });
+    QTimer::singleShot(1, mMain.get(), [&] {
+        stayed = answers.isEmpty();
+        mMain->exitOrvala(true, false);
     });
-    QCOMPARE(loop.exec(), 0);
+    QCOMPARE(QApplication::exec(), 0);
     QVERIFY(stayed);
-    QCOMPARE(answers.size(), 1);
-    QCOMPARE(answers.first().first().toInt(), 2);
+    QCOMPARE(answers.value(0), QVariantList({2}));
 }
 
 void TestApp::tellsOfTheCable()
@@ -145,14 +140,8 @@ void TestApp::replacesTheStatusDialog()
     QCOMPARE(dialogs().size(), 1);
     QVERIFY(shows(QStringLiteral("Notification")));
     QVERIFY(dialogs().first()->isVisible());
-
-    KeyWidget below(mMain.get());
-    press(&below, DEVICE_LEFT_KEY);
-    QCOMPARE(dialogs().size(), 1);
-    press(&below, DEVICE_SELECT_KEY);
+    press(mMain.get(), DEVICE_SELECT_KEY);
     QVERIFY(dialogs().isEmpty());
-    press(&below, DEVICE_RIGHT_KEY);
-    QCOMPARE(below.keys, QList<int>({DEVICE_RIGHT_KEY}));
 }
 
 int main(int argc, char *argv[])

@@ -29,9 +29,7 @@ class TestGridFocus : public QObject
 private slots:
     void aKeyLeadsToAStep_data();
     void aKeyLeadsToAStep();
-    void aHiddenCellGivesItsFocusAway_data();
     void aHiddenCellGivesItsFocusAway();
-    void theFocusedRowScrollsIntoView_data();
     void theFocusedRowScrollsIntoView();
 };
 
@@ -92,53 +90,31 @@ void TestGridFocus::aKeyLeadsToAStep()
     QTEST(int(step.otherwise), "otherwise");
 }
 
-void TestGridFocus::aHiddenCellGivesItsFocusAway_data()
-{
-    QTest::addColumn<int>("index");
-    QTest::addColumn<int>("columns");
-    QTest::addColumn<int>("firstHidden"); // of 8 cells
-    QTest::addColumn<int>("expected");
-
-    QTest::newRow("shown") << 5 << 4 << 6 << 5;
-    QTest::newRow("moves a row up") << 6 << 4 << 4 << 2;
-    QTest::newRow("hidden there too") << 7 << 4 << 3 << 0;
-    QTest::newRow("in the first row") << 2 << 4 << 1 << 0;
-    QTest::newRow("no columns yet") << 2 << -1 << 1 << 0;
-    QTest::newRow("beyond the list") << 9 << 4 << 8 << 5;
-}
-
 void TestGridFocus::aHiddenCellGivesItsFocusAway()
 {
-    QFETCH(int, index);
-    QFETCH(int, columns);
-    QFETCH(int, firstHidden);
-    const auto isHidden = [firstHidden](int cell) { return cell >= firstHidden; };
-    QTEST(gridfocus::repaired(index, 8, columns, isHidden), "expected");
-}
-
-void TestGridFocus::theFocusedRowScrollsIntoView_data()
-{
-    QTest::addColumn<int>("row");
-    QTest::addColumn<int>("top");
-    QTest::addColumn<int>("up");
-    QTest::addColumn<int>("down");
-    QTest::addColumn<int>("into");
-
-    // Rows of 200 in a viewport of 500.
-    QTest::newRow("first row, not scrolled") << 0 << 0 << 0 << 0 << -1;
-    QTest::newRow("inside") << 1 << -100 << -1 << -1 << -1;
-    QTest::newRow("below the edge") << 2 << 0 << 400 << 104 << 104;
-    QTest::newRow("above the edge") << 1 << -300 << 200 << 0 << 200;
+    const auto repaired = [](int index, int columns, int firstHidden) {
+        const auto isHidden = [firstHidden](int cell) { return cell >= firstHidden; };
+        return gridfocus::repaired(index, 8, columns, isHidden);
+    };
+    QCOMPARE(repaired(5, 4, 6), 5);
+    QCOMPARE(repaired(6, 4, 4), 2);  // a row up
+    QCOMPARE(repaired(7, 4, 3), 0);  // hidden there too
+    QCOMPARE(repaired(2, 4, 1), 0);  // in the first row
+    QCOMPARE(repaired(2, -1, 1), 0); // no columns yet
+    QCOMPARE(repaired(9, 4, 8), 5);  // beyond the list
 }
 
 void TestGridFocus::theFocusedRowScrollsIntoView()
 {
-    QFETCH(int, row);
-    QFETCH(int, top);
-    const gridfocus::Rows rows{200, top, 500};
-    QTEST(gridfocus::scrollUp(row, rows), "up");
-    QTEST(gridfocus::scrollDown(row, rows), "down");
-    QTEST(gridfocus::scrollInto(row, rows), "into");
+    const auto positions = [](int row, int contentTop) {
+        const gridfocus::Rows rows{200, contentTop, 500};
+        return QVector<int>{gridfocus::scrollUp(row, rows), gridfocus::scrollDown(row, rows),
+                            gridfocus::scrollInto(row, rows)};
+    };
+    QCOMPARE(positions(0, 0), QVector<int>({0, 0, -1}));
+    QCOMPARE(positions(1, -100), QVector<int>({-1, -1, -1}));  // inside
+    QCOMPARE(positions(2, 0), QVector<int>({400, 104, 104}));  // below the edge
+    QCOMPARE(positions(1, -300), QVector<int>({200, 0, 200})); // above it
 }
 
 QTEST_APPLESS_MAIN(TestGridFocus)

@@ -11,8 +11,6 @@
 #include "ui/slidesetting.h"
 #include "ui/widget.h"
 
-#include <QTcpSocket>
-
 namespace {
 
 const char *const kFeatured = "/data/feed/api/featured";
@@ -70,7 +68,6 @@ private:
     QImageSlide *player() const { return mPage->player(); }
     SlideLabel *label() const { return player()->label(); }
     SlideMarks *marks() const { return player()->findChild<SlideMarks *>(); }
-    int requestsOf(int number) const;
     bool showsPhoto() const { return label()->placeholder().isEmpty(); }
 
     std::unique_ptr<Widget> mPage;
@@ -96,14 +93,9 @@ void TestImageSlide::cleanup()
 // Featured photos 1 to total, as many a page as asked for; their thumbnails do not exist.
 void TestImageSlide::serve(int total)
 {
-    mServer->on(kFeatured, [this, total](QTcpSocket *socket, const MisbehavingServer::Request &r) {
-        const int at = r.path.indexOf("start-index=") + 12;
-        const int first = r.path.mid(at, r.path.indexOf('&', at) - at).toInt();
-        QJsonArray photos;
-        for (int i = first; i <= qMin(first + 7, total); ++i)
-            photos << sample::photo("Photo", mServer->url(QString("/p%1.png").arg(i)));
-        MisbehavingServer::answer(sample::feed(photos, total))(socket, r);
-    });
+    mServer->on(kFeatured, pages(total, total, [this](int number) {
+        return sample::photo("Photo", mServer->url(QString("/p%1.png").arg(number)));
+    }));
     answerPhotos(1, total, MisbehavingServer::answer(encoded(plain(32, 18), "PNG")));
 }
 
@@ -122,13 +114,6 @@ void TestImageSlide::open(const QByteArray &slideShow)
     ScreenCase::show(mPage.get());
     QTRY_VERIFY(!mPage->homeScreen()->isLoading());
     mReports = std::make_unique<QSignalSpy>(player(), &QImageSlide::signalUpdatePlaybackinfo);
-}
-
-int TestImageSlide::requestsOf(int number) const
-{
-    const auto &all = mServer->requests();
-    return std::count_if(all.begin(), all.end(),
-                         [&](const auto &request) { return request.path == pathOf(number); });
 }
 
 void TestImageSlide::keysStepAndPause()
@@ -170,14 +155,14 @@ void TestImageSlide::aPhotoIsThereBeforeItsTurn()
     QTRY_VERIFY(photos->isPrepared(next));
     QTRY_VERIFY(showsPhoto());
     QCOMPARE(label()->slide().photo.size(), QSize(1280, 720));
-    QCOMPARE(requestsOf(3), 0);
+    QCOMPARE(requestsFor(pathOf(3)), 0);
     PhotoManager::clearAll(); // prepared is prepared
     press({DEVICE_RIGHT_KEY});
     QVERIFY(showsPhoto());
     QTRY_VERIFY(photos->isPrepared(mServer->url(pathOf(3))));
     press({DEVICE_LEFT_KEY});
     QVERIFY(showsPhoto());
-    QCOMPARE(requestsOf(2), 1);
+    QCOMPARE(requestsFor(pathOf(2)), 1);
 }
 
 void TestImageSlide::thumbnailsStandIn()

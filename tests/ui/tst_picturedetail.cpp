@@ -12,45 +12,10 @@
 #include "ui/screencase.h"
 #include "ui/zoomview.h"
 
-#include <QUrlQuery>
-
 namespace {
 
 constexpr const char *kFeatured = "/data/feed/api/featured";
 constexpr const char *kAlbum = "/data/feed/api/user/anna/albumid/a1";
-
-QJsonObject record(const MisbehavingServer &server, int number)
-{
-    const QString name = QString::number(number);
-    QJsonObject entry = sample::photo("Photo " + name, server.url("/small" + name));
-    entry["content"] = QJsonObject{{"src", server.url("/p/" + name)}};
-    entry["gphoto$id"] = sample::text(name);
-    entry["gphoto$albumid"] = sample::text("a1");
-    entry["gphoto$width"] = sample::text(4000);
-    entry["gphoto$height"] = sample::text(3000);
-    entry["author"] = QJsonArray{
-        QJsonObject{{"gphoto$user", sample::text("anna")}, {"gphoto$nickname", sample::text("A")}}};
-    return entry;
-}
-
-QByteArray records(const MisbehavingServer &server, int first, int last, int total)
-{
-    QJsonArray entries;
-    for (int i = first; i <= last; ++i)
-        entries << record(server, i);
-    return sample::feed(entries, total, "anna");
-}
-
-// A feed cut into pieces as asked for, which says to have `total` photos and has `real`.
-MisbehavingServer::Behaviour pages(const MisbehavingServer &server, int total, int real)
-{
-    return [&server, total, real](QTcpSocket *socket, const MisbehavingServer::Request &request) {
-        const QUrlQuery query(QUrl(QString::fromLatin1(request.path)));
-        const int start = qMax(1, query.queryItemValue("start-index").toInt());
-        const int last = qMin(real, start - 1 + query.queryItemValue("max-results").toInt());
-        MisbehavingServer::answer(records(server, start, last, total))(socket, request);
-    };
-}
 
 } // namespace
 
@@ -80,7 +45,13 @@ private:
     // Opens a list as the home screen does.
     void open(int type, int index, bool isSelf = false);
     void stayHere() { QTRY_COMPARE(mSettled->count(), 1); }
-    int requestsFor(const QByteArray &start) const;
+    QJsonObject record(int number) const;
+    QByteArray records(int first, int last) const;
+    // Featured photos, of which the service has less than it says.
+    void serveFeatured(int last, int total)
+    {
+        mServer->on(kFeatured, pages(last, total, [this](int number) { return record(number); }));
+    }
     DetailStage *stage() { return mDetail->findChild<DetailStage *>(); }
     // All texts, without the breaks of their lines.
     QString information()
@@ -108,7 +79,7 @@ void TestPictureDetail::init()
         mServer->on("/small" + number, MisbehavingServer::answer(mSmallPicture));
         mServer->on("/p/s1180/" + number, MisbehavingServer::answer(mLargePicture));
     }
-    mServer->on(kAlbum, MisbehavingServer::answer(records(*mServer, 1, 12, 0)));
+    mServer->on(kAlbum, MisbehavingServer::answer(records(1, 12)));
     mDetail = std::make_unique<PictureDetailWidget>();
     mDetail->resize(1152, 520);
     mDetail->show();
@@ -141,12 +112,26 @@ void TestPictureDetail::open(int type, int index, bool isSelf)
     QCOMPARE(mDetail->number(), index + 1);
 }
 
-int TestPictureDetail::requestsFor(const QByteArray &start) const
+QJsonObject TestPictureDetail::record(int number) const
 {
-    int count = 0;
-    for (const MisbehavingServer::Request &request : mServer->requests())
-        count += request.path.startsWith(start) ? 1 : 0;
-    return count;
+    const QString name = QString::number(number);
+    QJsonObject entry = sample::photo("Photo " + name, mServer->url("/small" + name));
+    entry["content"] = QJsonObject{{"src", mServer->url("/p/" + name)}};
+    entry["gphoto$id"] = sample::text(name);
+    entry["gphoto$albumid"] = sample::text("a1");
+    entry["gphoto$width"] = sample::text(4000);
+    entry["gphoto$height"] = sample::text(3000);
+    entry["author"] = QJsonArray{
+        QJsonObject{{"gphoto$user", sample::text("anna")}, {"gphoto$nickname", sample::text("A")}}};
+    return entry;
+}
+
+QByteArray TestPictureDetail::records(int first, int last) const
+{
+    QJsonArray entries;
+    for (int i = first; i <= last; ++i)
+        entries << record(i);
+    return sample::feed(entries, 0, "anna");
 }
 
 void TestPictureDetail::thumbnailComesFirst()
@@ -205,7 +190,7 @@ void TestPictureDetail::keys()
 
 void TestPictureDetail::theFeedEndsEarly()
 {
-    mServer->on(kFeatured, pages(*mServer, 100, 11));
+    serveFeatured(11, 100);
     open(FEATURED_PHOTOS_LIST, 7);
     for (int number : {9, 10, 11}) {
         press(DEVICE_RIGHT_KEY);
@@ -222,7 +207,7 @@ void TestPictureDetail::theFeedEndsEarly()
 
 void TestPictureDetail::aPageFails()
 {
-    mServer->on(kFeatured, pages(*mServer, 20, 20));
+    serveFeatured(20, 20);
     open(FEATURED_PHOTOS_LIST, 7);
     mServer->on(kFeatured, MisbehavingServer::reset());
     PackageManager::clearAll(); // the page fetched ahead among them
@@ -230,7 +215,7 @@ void TestPictureDetail::aPageFails()
     QTRY_COMPARE(stage()->message(), DetailTexts::text(DetailTexts::PageFailed));
     QCOMPARE(mDetail->number(), 8);
     QCOMPARE(mDetail->photo().title, QString("Photo 8"));
-    mServer->on(kFeatured, pages(*mServer, 20, 20));
+    serveFeatured(20, 20);
     press(DEVICE_RIGHT_KEY);
     QTRY_COMPARE(mDetail->photo().title, QString("Photo 9"));
     QVERIFY(stage()->message().isEmpty());
@@ -254,7 +239,7 @@ void TestPictureDetail::aPhotoIsDeleted()
 {
     open(ALBUM_PHOTOS_LIST, 4);
     PackageManager::removeCache(mList);
-    mServer->on(kAlbum, MisbehavingServer::answer(records(*mServer, 4, 12, 0)));
+    mServer->on(kAlbum, MisbehavingServer::answer(records(4, 12)));
     press(DEVICE_RIGHT_KEY);
     QTRY_COMPARE(mDetail->photo().title, QString("Photo 6"));
     QCOMPARE(mDetail->number(), 3);
@@ -377,7 +362,7 @@ void TestPictureDetail::oddTexts()
                              ""};
     QJsonArray entries{QJsonObject()};
     for (const QString &title : titles) {
-        QJsonObject entry = record(*mServer, entries.size());
+        QJsonObject entry = record(entries.size());
         entry["title"] = entry["summary"] = sample::text(title);
         entries << entry;
     }
