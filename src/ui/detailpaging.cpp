@@ -9,7 +9,8 @@ namespace detailpaging {
 int pageStart(int packageType, int number)
 {
     const int index = number - 1;
-    const int block = paging::isSearch(packageType) ? index / paging::blockSize * paging::blockSize : 0;
+    const int block =
+        paging::isSearch(packageType) ? index / paging::blockSize * paging::blockSize : 0;
     return block + (index - block) / paging::pageSize * paging::pageSize + 1;
 }
 

@@ -34,12 +34,14 @@ Step right(const Situation &at)
 {
     if (at.index == at.count - 1)
         return {Move::PageDown, 0};
-    return {Move::Focus, at.index + 1, paging::isSearch(at.packageType) ? Move::NextBlock : Move::Drop};
+    return {Move::Focus, at.index + 1,
+            paging::isSearch(at.packageType) ? Move::NextBlock : Move::Drop};
 }
 
 Step pageDown(const Situation &at)
 {
-    if (paging::isSearch(at.packageType) && at.startIndex % paging::blockSize + paging::pageSize > at.records)
+    if (paging::isSearch(at.packageType) &&
+        at.startIndex % paging::blockSize + paging::pageSize > at.records)
         return {Move::NextBlock};
     return {Move::PageDown, 0};
 }

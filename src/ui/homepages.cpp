@@ -1,5 +1,7 @@
 #include "ui/homepages.h"
 
+#include "base/log.h"
+#include "common/ui/popupoverlay.h"
 #include "network/systemconfig.h"
 #include "ui/contentpages.h"
 #include "ui/formscrollarea.h"
@@ -104,8 +106,15 @@ void HomePages::showFailure(ErrorCode code)
 
 void HomePages::takeFocus()
 {
-    if (!QImageSlide::mIsShowing) // whose keys they are
+    if (mayFocus())
         focusPage();
+}
+
+bool HomePages::mayFocus()
+{
+    if (QImageSlide::mIsShowing)
+        logLine("Do not focus on current widget casue QImageSlide is showing");
+    return !QImageSlide::mIsShowing && !PopupOverlay::holdsFocus();
 }
 
 void HomePages::focusPage()

@@ -132,7 +132,7 @@ void HomeWidget::tryToShowCurrentPackage(PackageProperty &property)
         return;
     allPhotoNum = mState.total(mCurrentPackageData);
     pushPackageData();
-    if (mState.takeFirstCellWish() && mView.isShown(HomePages::Grid) && HomeView::mayFocus())
+    if (mState.takeFirstCellWish() && mView.isShown(HomePages::Grid) && HomePages::mayFocus())
         mView.grid()->updateFocus();
 }
 
@@ -189,6 +189,15 @@ void HomeWidget::showEvent(QShowEvent *event)
     QWidget::showEvent(event);
     if (!mView.menu()->hasFocus())
         mView.focusContent();
+}
+
+// From a pop-up, below which another page than before is shown.
+void HomeWidget::focusInEvent(QFocusEvent *event)
+{
+    QWidget::focusInEvent(event);
+    mView.focusContent();
+    if (hasFocus())
+        mView.menu()->setFocus();
 }
 
 void HomeWidget::paintEvent(QPaintEvent *event)

@@ -49,8 +49,8 @@ void ListLoader::finished(PackageProperty &property, ErrorCode code)
         showFailure(code);
 }
 
-// A page refused, or a sign-in that has expired, may need another sign-in. Nobody is asked below the
-// slide show: whoever leaves it has the page asked for again.
+// A page refused, or a sign-in that has expired, may need another sign-in. Nobody is asked below
+// the slide show: whoever leaves it has the page asked for again.
 void ListLoader::showFailure(ErrorCode code)
 {
     const bool isExpired = code == NET_FAILED && PackageManager::isSignInRefused();

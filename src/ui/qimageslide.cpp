@@ -133,8 +133,7 @@ void QImageSlide::update(bool isUpdateIndex)
 // this one has been played, again at each turn: the network may come back.
 bool QImageSlide::waitsForList(bool isUpdateIndex)
 {
-    const bool isOver =
-        mIsPlay && isUpdateIndex && sliderecords::count() > 0 && mWalk.isLast();
+    const bool isOver = mIsPlay && isUpdateIndex && sliderecords::count() > 0 && mWalk.isLast();
     if (isOver && mOptions.wholeList && mBlockWanted == 0)
         mBlockWanted = sliderecords::nextBlock(mOptions.loop);
     if (mBlockWanted > 0) {
@@ -171,8 +170,7 @@ bool QImageSlide::holdsOn()
 {
     if (!mOptions.waitForPhoto || mIsHolding)
         return false;
-    const bool isPageAwaited =
-        mWalk.isLast() && mOptions.wholeList && sliderecords::isMoreToCome();
+    const bool isPageAwaited = mWalk.isLast() && mOptions.wholeList && sliderecords::isMoreToCome();
     const QString next = mWalk.url(1);
     mIsHolding = isPageAwaited || !(next.isEmpty() || mPhotos->isSettled(next));
     if (mIsHolding)
@@ -190,9 +188,8 @@ void QImageSlide::takeTurnHeld(const QString &url)
 
 void QImageSlide::advance()
 {
-    mWalk.advance([this](const QString &url) {
-        return mOptions.skipUnreadable && mPhotos->hasFailed(url);
-    });
+    mWalk.advance(
+        [this](const QString &url) { return mOptions.skipUnreadable && mPhotos->hasFailed(url); });
 }
 
 void QImageSlide::refreshDatas()

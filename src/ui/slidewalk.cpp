@@ -73,9 +73,8 @@ bool SlideWalk::isLast() const
 bool SlideWalk::isPageWanted() const
 {
     const int ahead = mIndex + paging::pageSize;
-    const bool isMoreToCome = mOptions.wholeList
-                                  ? sliderecords::isMoreToCome()
-                                  : ahead < sliderecords::total() - paging::pageSize;
+    const bool isMoreToCome = mOptions.wholeList ? sliderecords::isMoreToCome()
+                                                 : ahead < sliderecords::total() - paging::pageSize;
     return mIndex >= paging::pageSize && ahead >= sliderecords::count() && isMoreToCome;
 }
 

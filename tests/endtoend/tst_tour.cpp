@@ -3,6 +3,7 @@
 #include "common/ui/qpopupdialog.h"
 #include "common/ui/qpopupform.h"
 #include "common/ui/remotekeys.h"
+#include "data/download.h"
 #include "data/mediauploader.h"
 #include "data/packagemanager.h"
 #include "endtoend/remotecase.h"
@@ -271,23 +272,28 @@ void TestTour::search()
         mTv->press(DEVICE_PAGEDOWN_KEY);
         QTRY_VERIFY(isListed(QStringLiteral("%1/100").arg(page * 8 - 7), page < 13 ? 8 : 4));
     }
-    mTv->press(DEVICE_PAGEDOWN_KEY);
-    QTRY_VERIFY(isListed("1/4", 4));
 }
 
-// From the second hundred results to the first on the photo screen, and back to the words.
+// From the first hundred results to the second on the photo screen, to the slide show and back, in
+// the list, and back to the words.
 void TestTour::crossBlocks()
 {
-    const QString first = mTv->focus();
-    mTv->press(DEVICE_SELECT_KEY);
+    mTv->press({DEVICE_RIGHT_KEY, DEVICE_RIGHT_KEY, DEVICE_RIGHT_KEY});
+    const QString last = mTv->focus();
+    mTv->press({DEVICE_SELECT_KEY, DEVICE_RIGHT_KEY});
     QTRY_VERIFY(isPhotoShown(101));
-    QCOMPARE(detail()->photo().title, first);
+    const QString url = detail()->photo().imageUrl;
+    mTv->press(DEVICE_SELECT_KEY);
+    QCOMPARE(Download::mCurrentSlideShowImageUrl, url);
+    mTv->press(DEVICE_RETURN_KEY);
+    QTRY_VERIFY(isPhotoShown(101));
     mTv->press(DEVICE_LEFT_KEY);
     QTRY_VERIFY(isPhotoShown(100));
-    const QString title = detail()->photo().title;
     mTv->press(DEVICE_RETURN_KEY);
     QTRY_VERIFY(isListed("100/100", 4));
-    QCOMPARE(mTv->focus(), title);
+    QCOMPARE(mTv->focus(), last);
+    mTv->press(DEVICE_PAGEDOWN_KEY);
+    QTRY_VERIFY(isListed("1/4", 4));
     mTv->press(DEVICE_RETURN_KEY);
     QTRY_VERIFY(mTv->shown<SearchWidget>());
     QCOMPARE(mTv->focus(), QStringLiteral("SearchWidget"));

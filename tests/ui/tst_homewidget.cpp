@@ -1,4 +1,5 @@
 #include "accountmanager/accountmanagerhelper.h"
+#include "common/ui/qconfirm.h"
 #include "common/ui/qpopupdialog.h"
 #include "common/ui/qprogressindicator.h"
 #include "data/download.h"
@@ -34,7 +35,7 @@ private slots:
     void init();
     void cleanup();
     void anEmptyListLeavesTheMenu();
-    void aStaleAnswerIsIgnored();
+    void lateAnswers();
     void keysWhileLoadingAreDropped();
     void theCacheMayLetGo();
     void thumbnailsAreShownUndistorted();
@@ -113,20 +114,33 @@ void TestHomeWidget::anEmptyListLeavesTheMenu()
     QVERIFY(menu()->hasFocus());
 }
 
-void TestHomeWidget::aStaleAnswerIsIgnored()
+// After the patience is over: shown when it is wanted still, but without the focus, which a
+// question has meanwhile; and not shown when it is not wanted.
+void TestHomeWidget::lateAnswers()
 {
     HeldAnswers held;
     mServer->on(kPeople, held.hold());
     open("[Network]\nPageSeconds=1\n");
-    enterMenu(UpWidget::FavoritesEntry);
-    QTRY_VERIFY(failure()->isVisible());
-    press({DEVICE_RETURN_KEY});
-    QVERIFY(menu()->hasFocus());
-    enterMenu(UpWidget::MyPhotosEntry);
-    QTRY_COMPARE(captions().size(), 8);
-    held.answerFirst(answer(sample::people(3)));
-    QTRY_VERIFY(LogCapture::lines().filter("try to show CurrentPackage").size() >= 3);
-    QCOMPARE(captions().first(), QString("Album 1\n1 photo"));
+    for (bool isWanted : {true, false}) {
+        enterMenu(UpWidget::FavoritesEntry);
+        QTRY_VERIFY(failure()->isVisible());
+        press({DEVICE_RETURN_KEY});
+        QVERIFY(menu()->hasFocus());
+        if (isWanted) {
+            press({DEVICE_RETURN_KEY});
+        } else {
+            enterMenu(UpWidget::MyPhotosEntry);
+            QTRY_COMPARE(captions().size(), 8);
+        }
+        const int before = LogCapture::lines().filter("try to show CurrentPackage").size();
+        held.answerFirst(answer(sample::people(3)));
+        QTRY_VERIFY(LogCapture::lines().filter("try to show CurrentPackage").size() > before);
+        QCOMPARE(captions().size(), isWanted ? 3 : 8);
+        if (isWanted)
+            press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY}); // no
+        QVERIFY(!mHome->findChild<QConfirm *>() || !mHome->findChild<QConfirm *>()->isVisible());
+        PackageManager::clearAll();
+    }
 }
 
 void TestHomeWidget::keysWhileLoadingAreDropped()

@@ -1,5 +1,7 @@
+#include "common/ui/qpopupdialog.h"
 #include "data/download.h"
 #include "platform/devicestate.h"
+#include "ui/contentpages.h"
 #include "ui/formscrollarea.h"
 #include "ui/formscrollwidget.h"
 #include "ui/homewidget.h"
@@ -59,6 +61,8 @@ private:
     void silentPhotos();
     void unreadablePhotos();
     void lostList();
+    void refusedList();
+    void loseList(const MisbehavingServer::Behaviour &behaviour);
 
     void serve(int total);
     void answerPhotos(int first, int last, const MisbehavingServer::Behaviour &behaviour);
@@ -94,8 +98,8 @@ void TestImageSlide::cleanup()
 void TestImageSlide::serve(int total)
 {
     mServer->on(kFeatured, pages(total, total, [this](int number) {
-        return sample::photo("Photo", mServer->url(QString("/p%1.png").arg(number)));
-    }));
+                    return sample::photo("Photo", mServer->url(QString("/p%1.png").arg(number)));
+                }));
     answerPhotos(1, total, MisbehavingServer::answer(encoded(plain(32, 18), "PNG")));
 }
 
@@ -348,17 +352,28 @@ void TestImageSlide::unreadablePhotos()
     }
 }
 
-// With the settings opened and cancelled while the list is on its way.
 void TestImageSlide::lostList()
+{
+    loseList(MisbehavingServer::silence());
+    QTRY_VERIFY(mPage->homeScreen()->isLoading());
+}
+
+void TestImageSlide::refusedList()
+{
+    loseList(MisbehavingServer::answer("", 401));
+    QTRY_VERIFY(!mPage->findChild<FailurePage *>()->reason().isEmpty());
+}
+
+// With the settings opened and cancelled while the list is on its way.
+void TestImageSlide::loseList(const MisbehavingServer::Behaviour &behaviour)
 {
     serve(12);
     open("KeysWhileLoading=true\n");
     QTRY_COMPARE(HomeWidget::mCurrentPackageData->count(), 12);
     play(9);
-    mServer->on(kFeatured, MisbehavingServer::silence());
+    mServer->on(kFeatured, behaviour);
     PackageManager::clearAll();
     player()->update();
-    QTRY_VERIFY(mPage->homeScreen()->isLoading());
     press({DEVICE_SETTING_KEY, DEVICE_RETURN_KEY, DEVICE_LEFT_KEY});
 }
 
@@ -372,9 +387,11 @@ void TestImageSlide::anythingCanBeLeft_data()
     QTest::newRow("photos that never arrive") << &TestImageSlide::silentPhotos;
     QTest::newRow("all unreadable") << &TestImageSlide::unreadablePhotos;
     QTest::newRow("a list that is lost") << &TestImageSlide::lostList;
+    QTest::newRow("a list that is refused") << &TestImageSlide::refusedList;
 }
 
-// Keys answer, Return leaves, and the platform hears that the play has stopped.
+// Keys answer, Return leaves, the platform hears that the play has stopped, and a question that
+// there is on the home screen can be answered.
 void TestImageSlide::anythingCanBeLeft()
 {
     QFETCH(Trouble, trouble);
@@ -390,6 +407,9 @@ void TestImageSlide::anythingCanBeLeft()
     press({DEVICE_RETURN_KEY});
     QVERIFY(!QImageSlide::mIsShowing && mPage->homeScreen()->isVisible());
     QCOMPARE(mReports->last(), kStopped);
+    if (trouble == &TestImageSlide::refusedList)
+        QTRY_VERIFY(mPage->findChild<QPopupDialog *>() &&
+                    mPage->findChild<QPopupDialog *>()->hasFocus());
 }
 
 void TestImageSlide::settingsAreKept()
