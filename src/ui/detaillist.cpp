@@ -1,6 +1,7 @@
 #include "ui/detaillist.h"
 
 #include "data/packagemanager.h"
+#include "ui/cachedlist.h"
 #include "ui/detailpaging.h"
 #include "ui/detailphoto.h"
 #include "ui/paging.h"
@@ -24,17 +25,12 @@ Package *DetailList::package()
     return mPackage;
 }
 
-// The list from its beginning. One that begins later is dropped: only a page fetched ahead had come
-// when the pages before it had grown stale.
+// The list from its beginning.
 Package *DetailList::cachedPackage() const
 {
     PackageProperty first = mProperty;
     first.mStartIndex = 1;
-    Package *package = PackageManager::getPackage(first);
-    if (!package || package->mProperty.mStartIndex <= 1)
-        return package;
-    PackageManager::removeCache(first);
-    return nullptr;
+    return cachedList(first);
 }
 
 int DetailList::heldEnd()

@@ -25,12 +25,13 @@ void ListLoader::request()
     CellFiller::cancelThumbnails();
     emit started();
     mPages->showLoading();
-    tryToDownload(mState->mCurrentProperty);
+    tryToDownload();
 }
 
-void ListLoader::tryToDownload(PackageProperty property)
+void ListLoader::tryToDownload()
 {
-    if (PackageManager::getPackage(property)) {
+    PackageProperty property = mState->mCurrentProperty; // which changes when it has arrived
+    if (held()) {
         logLine("enter NULL != package");
         emit arrived(property);
         return;
@@ -73,7 +74,7 @@ bool ListLoader::complete(const Package *held, const PackageProperty &arrivedPag
     }
     // Another page of the list may have come, without the one wanted.
     if (held || isOtherPage)
-        tryToDownload(wanted);
+        tryToDownload();
     else
         fetchAnew();
     return false;
@@ -87,7 +88,7 @@ void ListLoader::fetchAnew()
         PackageManager::removeCache(mState->mCurrentProperty);
         mState->restart();
         if (isBelow)
-            tryToDownload(mState->mCurrentProperty);
+            tryToDownload();
         else
             request();
     } else if (!isBelow) {
@@ -95,16 +96,7 @@ void ListLoader::fetchAnew()
     }
 }
 
-// One that begins later than the page wanted is dropped: only a page fetched ahead had come when
-// the pages before it had grown stale.
 Package *ListLoader::held()
 {
-    PackageProperty &wanted = mState->mCurrentProperty;
-    Package *package = cachedList(wanted);
-    const bool beginsLater = package && wanted.mType == TYPE_FEATURED_PHOTOS &&
-                             package->mProperty.mStartIndex > wanted.mStartIndex;
-    if (!beginsLater)
-        return package;
-    PackageManager::removeCache(wanted);
-    return nullptr;
+    return cachedList(mState->mCurrentProperty);
 }

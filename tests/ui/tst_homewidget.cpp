@@ -38,6 +38,8 @@ private slots:
     void lateAnswers();
     void keysWhileLoadingAreDropped();
     void theCacheMayLetGo();
+    void aBrokenPageAheadIsForgotten();
+    void aPageAheadComesAlone();
     void thumbnailsAreShownUndistorted();
     void hostileTextsStayPlain();
     void anExpiredSignInLeadsToTheAccounts();
@@ -177,6 +179,44 @@ void TestHomeWidget::theCacheMayLetGo()
     }
     press({DEVICE_PAGEDOWN_KEY});
     QCOMPARE(captions().first(), QString("Album 9\n9 photos"));
+}
+
+void TestHomeWidget::aBrokenPageAheadIsForgotten()
+{
+    int asked = 0;
+    mServer->on(kFeatured, [&](QTcpSocket *socket, const MisbehavingServer::Request &request) {
+        const bool isAhead = asked++ == 1;
+        (isAhead ? MisbehavingServer::html() : answer(sample::photos("Photo", 1, 8, 16)))(socket,
+                                                                                          request);
+    });
+    open();
+    QTRY_VERIFY(!HomeWidget::mCurrentPackageData->mIsFeed);
+    press({DEVICE_RED_KEY});
+    QTRY_COMPARE(asked, 4); // anew, and again ahead
+    QTRY_COMPARE(captions().size(), 8);
+    QVERIFY(grid()->content()->cell(0)->hasFocus());
+}
+
+// Which the request for a list that is out of date has joined.
+void TestHomeWidget::aPageAheadComesAlone()
+{
+    const auto photos =
+        pages(40, 40, [](int number) { return sample::photo("P" + QString::number(number)); });
+    mServer->on(kFeatured, photos);
+    open();
+    QTRY_COMPARE(HomeWidget::mCurrentPackageData->count(), 16);
+    HeldAnswers held;
+    mServer->on(kFeatured, held.hold());
+    press({DEVICE_PAGEDOWN_KEY});
+    QTRY_COMPARE(held.count(), 1);
+    PackageProperty list = mHome->state().mCurrentProperty;
+    PackageManager::removeCache(list);
+    press({DEVICE_RED_KEY});
+    mServer->on(kFeatured, photos);
+    held.answerFirst(answer(sample::photos("P", 17, 24, 40)));
+    QTRY_COMPARE(captions().value(0), QString("P1"));
+    QTRY_COMPARE(HomeWidget::mCurrentPackageData->count(), 16);
+    QCOMPARE(requestsFor(kFeatured), 5);
 }
 
 void TestHomeWidget::thumbnailsAreShownUndistorted()
