@@ -19,7 +19,7 @@ constexpr QSize kArrow(48, 96);
 // The nearest place at which a picture's pixels fall on the screen's.
 QPointF onPixels(const QPainter &painter, const QPointF &point)
 {
-    const QTransform toDevice = painter.deviceTransform();
+    const QTransform &toDevice = painter.deviceTransform();
     return toDevice.inverted().map(QPointF(toDevice.map(point).toPoint()));
 }
 

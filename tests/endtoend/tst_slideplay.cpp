@@ -1,23 +1,17 @@
-#include "app/mainapplication.h"
 #include "common/ui/qpopupform.h"
 #include "common/ui/remotekeys.h"
 #include "data/download.h"
-#include "endtoend/albumservice.h"
-#include "endtoend/television.h"
+#include "endtoend/remotecase.h"
 #include "platform/ipc.h"
-#include "res/resources.h"
 #include "ui/homewidget.h"
 #include "ui/qimageslide.h"
 #include "ui/slidesetting.h"
 #include "ui/upwidget.h"
 
-#include <QTest>
-
 #include <algorithm>
 
 namespace {
 
-const QString anna = "anna@orvala.example";
 constexpr int waves = 105, trees = 5;
 enum class From { Featured, Album, Search };
 
@@ -27,84 +21,61 @@ Q_DECLARE_METATYPE(From)
 
 // Somebody who plays photos of a real album service, with the shell listening. A turn's end is the
 // timer's slot being called, unless the test waits for the timer itself.
-class TestSlidePlay : public QObject
+class TestSlidePlay : public RemoteCase
 {
     Q_OBJECT
 
 private slots:
     void initTestCase();
     void init();
-    void cleanup();
+    void cleanup() { switchOff(); }
     void playsToTheEnd_data();
     void playsToTheEnd();
     void turnsByItselfAtTheSpeedChosen();
     void leavesWhenTheServiceHasGone();
 
 private:
-    void signIn();
-    void enter(int entry); // of the menu
-    void open(From origin, const QString &words);
+    void play(From origin, const QString &words);
     QStringList playOut(int inPages);
     QImageSlide *player() const { return mTv->window()->findChild<QImageSlide *>(); }
     bool showsPhoto() const { return player()->label()->placeholder().isEmpty(); }
     void expectReport(int status);
-
-    AlbumService mService;
-    std::unique_ptr<Television> mTv;
 };
 
 void TestSlidePlay::initTestCase()
 {
-    initResources();
-    for (int i = 1; i <= waves; ++i)
-        QVERIFY(mService.addPhoto(QString("anna/Sea/Wave %1.jpg").arg(i), Qt::blue, {48, 32}));
-    for (int i = 1; i <= trees; ++i)
-        QVERIFY(mService.addPhoto(QString("anna/Forest/Tree %1.jpg").arg(i), Qt::green, {20, 60}));
-    QVERIFY(mService.addUser(anna, "Anna", "anna"));
+    addPhotos("anna/Sea", "Wave", waves);
+    addPhotos("anna/Forest", "Tree", trees);
+    addPeople();
 }
 
 void TestSlidePlay::init()
 {
     SlideSetting::SlideMode = 0;
     SlideSetting::SlideSpeed = 3600; // no turn ends by itself
-    QVERIFY(mService.start());
-    QVERIFY(mService.waitForPhotos(waves + trees));
-    mTv = std::make_unique<Television>();
+    switchOn();
 }
 
-void TestSlidePlay::cleanup()
+// Signs in, goes to the list and plays it.
+void TestSlidePlay::play(From origin, const QString &words)
 {
-    mTv.reset();
-    mService.kill();
-}
-
-void TestSlidePlay::signIn()
-{
-    mTv->useService(mService.url());
-    QVERIFY(mTv->addAccount(anna, "Anna", mService.tokens(anna)));
-    QVERIFY(mTv->switchOn());
-    QTRY_COMPARE(mTv->focus(), anna);
-    mTv->press(DEVICE_SELECT_KEY);
-    QTRY_COMPARE(mTv->captions().size(), 8);
-}
-
-void TestSlidePlay::open(From origin, const QString &words)
-{
+    signIn(mService.url());
     if (origin == From::Album) {
-        QVERIFY(mTv->enter(UpWidget::MyPhotosEntry));
+        enter(UpWidget::MyPhotosEntry);
         QTRY_COMPARE(mTv->captions().size(), 2);
-        mTv->press(DEVICE_DOWN_KEY);
-        if (!mTv->focus().startsWith(words))
-            mTv->press(DEVICE_RIGHT_KEY);
+        walkTo(words);
         mTv->press(DEVICE_SELECT_KEY);
     } else if (origin == From::Search) {
-        QVERIFY(mTv->enter(UpWidget::SearchEntry));
-        mTv->press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY});
-        mTv->window()->findChild<QPopUpForm *>()->handleInput(words);
-        QTRY_VERIFY(!mTv->window()->findChild<QPopUpForm *>());
+        enter(UpWidget::SearchEntry);
+        mTv->press(DEVICE_SELECT_KEY);
+        type(words);
+        QTRY_VERIFY(!mTv->shown<QPopUpForm>());
         mTv->press({DEVICE_RIGHT_KEY, DEVICE_SELECT_KEY});
     }
     QTRY_VERIFY(mTv->position().startsWith("1/"));
+    mTv->press(DEVICE_PLAY_KEY);
+    QVERIFY(player()->isVisible());
+    expectReport(0);
 }
 
 void TestSlidePlay::expectReport(int status)
@@ -155,9 +126,9 @@ void TestSlidePlay::playsToTheEnd_data()
     QTest::newRow("featured") << From::Featured << QString() << 0 << false << 104;
     QTest::newRow("featured, shuffled, whole")
         << From::Featured << QString() << 2 << true << waves + trees;
-    QTest::newRow("search") << From::Search << "Tree" << 0 << false << trees;
-    QTest::newRow("search, one block") << From::Search << "Wave" << 1 << false << 100;
-    QTest::newRow("search, whole, shuffled") << From::Search << "Wave" << 2 << true << waves;
+    QTest::newRow("search") << From::Search << "tree" << 0 << false << trees;
+    QTest::newRow("search, one block") << From::Search << "wave" << 1 << false << 100;
+    QTest::newRow("search, whole, shuffled") << From::Search << "wave" << 2 << true << waves;
 }
 
 void TestSlidePlay::playsToTheEnd()
@@ -165,16 +136,12 @@ void TestSlidePlay::playsToTheEnd()
     QFETCH(int, mode);
     QFETCH(bool, isWhole);
     mTv->set("SlideShow/WholeList", isWhole ? "true" : "false");
-    signIn();
-    if (QTest::currentTestFailed())
-        return;
+    SlideSetting::SlideMode = mode;
     QFETCH(From, origin);
     QFETCH(QString, words);
-    open(origin, words);
-    SlideSetting::SlideMode = mode;
-    mTv->press(DEVICE_PLAY_KEY);
-    QVERIFY(player()->isVisible());
-    expectReport(0);
+    play(origin, words);
+    if (QTest::currentTestFailed())
+        return;
 
     QFETCH(int, count);
     const QStringList shown = playOut(origin == From::Featured ? count : 0);
@@ -193,12 +160,9 @@ void TestSlidePlay::playsToTheEnd()
 void TestSlidePlay::turnsByItselfAtTheSpeedChosen()
 {
     SlideSetting::SlideSpeed = 1;
-    signIn();
-    open(From::Album, "Forest");
+    play(From::Album, "Forest");
     if (QTest::currentTestFailed())
         return;
-    mTv->press(DEVICE_PLAY_KEY);
-    expectReport(0);
     QTRY_COMPARE(player()->position(), 1);
     // Setting, up to the speed, one second more, down to OK.
     mTv->press({DEVICE_SETTING_KEY, DEVICE_UP_KEY, DEVICE_SELECT_KEY, DEVICE_DOWN_KEY,
@@ -215,12 +179,9 @@ void TestSlidePlay::turnsByItselfAtTheSpeedChosen()
 void TestSlidePlay::leavesWhenTheServiceHasGone()
 {
     mTv->set("SlideShow/WholeList", "true");
-    signIn();
-    open(From::Search, "Wave");
+    play(From::Search, "wave");
     if (QTest::currentTestFailed())
         return;
-    mTv->press(DEVICE_PLAY_KEY);
-    expectReport(0);
     mService.kill();
     for (int turn = 0; turn < waves; ++turn) // into the block that cannot be had
         player()->update();
@@ -237,8 +198,7 @@ void TestSlidePlay::leavesWhenTheServiceHasGone()
 
 int main(int argc, char *argv[])
 {
-    MainApplication application(argc, argv);
     TestSlidePlay test;
-    return QTest::qExec(&test, argc, argv);
+    return RemoteCase::run(test, argc, argv);
 }
 #include "tst_slideplay.moc"
