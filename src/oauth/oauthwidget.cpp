@@ -203,8 +203,10 @@ void OAuthWidget::showPage(QWidget *page)
 
 void OAuthWidget::takeFocus()
 {
-    if (mInputForm)
-        return; // it takes the focus by itself and gives it back
+    // A keyboard takes the focus by itself and gives it back; a page that comes when the user has
+    // left must not have it at all.
+    if (mInputForm || !isVisible())
+        return;
     const bool isPage = mStack->currentWidget() == mPage->widget();
     (isPage ? mPage->widget() : this)->setFocus();
 }
