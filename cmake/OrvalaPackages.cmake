@@ -65,7 +65,7 @@ set(CPACK_COMPONENT_ORVALA_DESCRIPTION
 set(CPACK_DEBIAN_ORVALA_PACKAGE_DEPENDS
     "adduser, ca-certificates, fonts-inter, init-system-helpers, libqt5sql5-sqlite, tzdata")
 set(CPACK_DEBIAN_ORVALA_PACKAGE_RECOMMENDS
-    "fonts-droid-fallback, fonts-noto-color-emoji, fonts-noto-core")
+    "fonts-droid-fallback, fonts-nanum, fonts-noto-color-emoji, fonts-noto-core")
 
 set(CPACK_DEBIAN_ORVALA-SERVICE_PACKAGE_NAME orvala-service)
 set(CPACK_DEBIAN_ORVALA-SERVICE_PACKAGE_SECTION web)

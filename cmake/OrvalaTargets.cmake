@@ -96,11 +96,14 @@ function(orvala_gtest name)
   set_tests_properties(${name} PROPERTIES TIMEOUT 120)
 endfunction()
 
-# orvala_bench(<name> SOURCES <files> LINKS <targets>): a benchmark program; it prints rows for the
-# table of bench/run (see bench/support/bench.h) and is no test.
+# orvala_bench(<name> SOURCES <files> LINKS <targets> [QT]): a benchmark program; it prints rows for
+# the table of bench/run (see bench/support/bench.h) and is no test.
 function(orvala_bench name)
-  cmake_parse_arguments(arg "" "" "SOURCES;LINKS" ${ARGN})
-  orvala_program(${name} QT SOURCES ${arg_SOURCES} LINKS ${arg_LINKS})
+  cmake_parse_arguments(arg "QT" "" "SOURCES;LINKS" ${ARGN})
+  if(arg_QT)
+    set(qt QT)
+  endif()
+  orvala_program(${name} ${qt} SOURCES ${arg_SOURCES} LINKS ${arg_LINKS})
   target_include_directories(${name} PRIVATE ${CMAKE_SOURCE_DIR}/bench)
   set_target_properties(${name} PROPERTIES RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bench)
 endfunction()

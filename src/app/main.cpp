@@ -1,5 +1,5 @@
 #include "app/exitdeadline.h"
-#include "app/fontwarmup.h"
+#include "app/fontsetup.h"
 #include "app/mainapplication.h"
 #include "app/mainwidget.h"
 #include "base/log.h"
@@ -128,8 +128,9 @@ void sayGoodbye()
 int main(int argc, char *argv[])
 {
     prepareProcess();
-    const FontWarmUp fonts;
+    FontSetup fonts;
     MainApplication application(argc, argv);
+    fonts.finish();
     hidePointer();
     applyScale();
     readScreenSize();

@@ -1,5 +1,6 @@
 #include "common/ui/remotekeys.h"
 #include "oauth/web/oauthview.h"
+#include "oauth/web/pagewatchdog.h"
 #include "oauth/web/scripttext.h"
 #include "support/logcapture.h"
 #include "support/misbehavingserver.h"
@@ -8,6 +9,8 @@
 #include <QNetworkReply>
 #include <QWebFrame>
 #include <QtTest>
+
+#include <atomic>
 
 namespace {
 
@@ -216,6 +219,28 @@ private slots:
         mView->load(QUrl(server.url("/next")));
         QTRY_COMPARE(finished.size(), 2);
         QVERIFY(finished.value(1).value(0).toBool());
+    }
+
+    // A busy loop stands for a page's script: both keep the event loop from turning.
+    void scriptWithoutEnd()
+    {
+        std::atomic<int> hung{0};
+        const PageWatchdog watchdog(std::chrono::milliseconds(500), nullptr, [&hung] { ++hung; });
+        QTest::qWait(1000);
+        QCOMPARE(hung.load(), 0);
+        QElapsedTimer time;
+        time.start();
+        while (hung == 0 && time.elapsed() < 20000) {
+        }
+        QCOMPARE(hung.load(), 1);
+    }
+
+    void pageThatFillsTheMemory()
+    {
+        std::atomic<int> hung{0};
+        const PageWatchdog watchdog(std::chrono::seconds(10), nullptr, [&hung] { ++hung; });
+        const QByteArray page(PageWatchdog::MOST_GROWTH + 64 * 1024 * 1024, 'x');
+        QTRY_COMPARE_WITH_TIMEOUT(hung.load(), 1, 20000);
     }
 
     void nothingLocal()

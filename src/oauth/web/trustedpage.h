@@ -4,8 +4,8 @@
 
 // A web page that shows nothing but the service's pages: http and https only, no local files, no
 // plug-ins, no Java, no windows or dialogs of its own, nothing beyond PageLimits, nothing kept when
-// it is gone. The engine has no security support any more, and a script that never ends holds up
-// the program: load only addresses that are trusted.
+// it is gone. The engine has no security support any more, and a script that never ends can only be
+// ended together with the program (PageWatchdog): load only addresses that are trusted.
 class TrustedPage : public QWebPage
 {
     Q_OBJECT

@@ -5,7 +5,15 @@
 #include <QWebPage>
 #include <QWebSettings>
 
+namespace {
+
+// The largest page that is taken is laid out in a small part of this, even on a slow device.
+constexpr std::chrono::seconds kPatience(15);
+
+} // namespace
+
 WebSignInView::WebSignInView(const SignInViewFactory::Addresses &addresses)
+    : mWatchdog(kPatience)
 {
     OAuthView::AuthorizeUrl = addresses.authorize;
     OAuthView::LoginUrl = addresses.login;

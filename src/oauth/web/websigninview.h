@@ -1,6 +1,7 @@
 #pragma once
 
 #include "oauth/signinview.h"
+#include "oauth/web/pagewatchdog.h"
 
 #include <QPointer>
 
@@ -25,6 +26,7 @@ public:
     void setEditedText(const QString &text) override;
 
 private:
+    PageWatchdog mWatchdog;
     QPointer<OAuthView> mView; // the widget that it is put into may end it first
 };
 
