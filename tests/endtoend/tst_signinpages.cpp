@@ -40,7 +40,6 @@ private slots:
     void aHouseholdSignsInAndOut();
     void aCodeGuardsAnAccount();
     void whoDeniesLeaves();
-    void manySignInsLoseNone();
 
 private:
     void signIn(const Person &person);
@@ -224,18 +223,6 @@ void TestSignInPages::whoDeniesLeaves()
     mTv->press(DEVICE_SELECT_KEY);
     const auto request = mTv->shell().next();
     QVERIFY(request && request->type == netcommon::MSG_REQUEST_EXIT);
-}
-
-void TestSignInPages::manySignInsLoseNone()
-{
-    for (int i = 0; i < 10 && !QTest::currentTestFailed(); ++i) {
-        const Person &person = i % 2 ? anna : ben;
-        mTv->press({DEVICE_RIGHT_KEY, DEVICE_RIGHT_KEY});
-        signIn(person);
-        arriveAtHome(person);
-        signOut();
-    }
-    QCOMPARE(mTv->accounts(), QStringList({anna.mail, ben.mail}));
 }
 
 int main(int argc, char *argv[])
