@@ -123,12 +123,7 @@ private slots:
 
     void whoDeniesLeaves()
     {
-        SignInVisit visit(mTv.get());
-        QVERIFY(visit.open());
-        QVERIFY(visit.fill(anna.mail, anna.password));
-        QVERIFY(visit.submit());
-        QVERIFY(visit.isAtConsent());
-        QVERIFY(visit.answer(false));
+        signIn(anna, false);
         QTRY_COMPARE(mTv->focus(), QString("ErrorDialog"));
         QVERIFY(mTv->accounts().isEmpty());
         mTv->press(DEVICE_SELECT_KEY);
@@ -137,15 +132,15 @@ private slots:
     }
 
 private:
-    // From New to the home screen.
-    void signIn(const Person &person)
+    // From New to the answer on the consent page.
+    void signIn(const Person &person, bool allows = true)
     {
         SignInVisit visit(mTv.get());
         QVERIFY(visit.open());
         QVERIFY(visit.fill(person.mail, person.password));
         QVERIFY(visit.submit());
         QVERIFY(visit.isAtConsent());
-        QVERIFY(visit.answer(true));
+        QVERIFY(visit.answer(allows));
     }
 
     // Three times, then digits have to be read from a picture as well.
