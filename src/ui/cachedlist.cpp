@@ -9,8 +9,8 @@ Package *cachedList(PackageProperty &property)
     const Package *package = PackageManager::cached(property);
     if (!package)
         return nullptr;
-    const bool beginsLater = property.mType == TYPE_FEATURED_PHOTOS &&
-                             package->mProperty.mStartIndex > property.mStartIndex;
+    const bool beginsLater =
+        property.mType == TYPE_FEATURED_PHOTOS && package->mProperty.mStartIndex > 1;
     if (package->mIsFeed && !beginsLater)
         return PackageManager::getPackage(property);
     PackageManager::removeCache(property);

@@ -103,7 +103,7 @@ void PopupOverlay::giveFocusBack()
     const bool isOurs = focus == this || isAncestorOf(focus);
     if (isOurs && mFocusBefore && mFocusBefore->isVisible())
         mFocusBefore->setFocus();
-    else if (isOurs && mFocusBefore && parentWidget()->isVisible())
+    else if (isOurs && mFocusBefore && parentWidget() && parentWidget()->isVisible())
         parentWidget()->setFocus();
     mFocusBefore = nullptr;
 }

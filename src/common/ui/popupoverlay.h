@@ -6,8 +6,8 @@
 // A child that lies over the whole of its parent, dims it and shows one panel in its middle; give
 // it a parent that fills the screen. While it is shown no key passes to what lies below. It takes
 // the focus when it is shown and gives it back to where it was when it goes, or to its parent when
-// that is not seen any longer; with the focus policy
-// Qt::NoFocus it leaves the focus alone, for a dialog that is handed its keys.
+// that is not seen any longer; with the focus policy Qt::NoFocus it leaves the focus alone, for a
+// dialog that is handed its keys.
 //
 // An overlay inside an overlay covers that one, neither dims it again nor takes the focus by
 // itself. In a parent whose layout holds it, it keeps the place that the layout gives.
