@@ -80,7 +80,7 @@ CHAPTERS = [
         ("down", ""),
         ("select", "consent"),
     ]),
-    Chapter("accounts", accounts=[BEN, LONG, ANNA], opening="accounts", steps=[
+    Chapter("accounts", accounts=[BEN, (*LONG, "4711"), ANNA], opening="accounts", steps=[
         ("right", "account-delete-button"),
         ("select", "account-delete"),
         ("return", ""),
@@ -90,6 +90,10 @@ CHAPTERS = [
         ("select", "account-form-input"),
         ("type:anna", ""),
         ("select", "account-form-code"),
+        *[("type:" + digit, "") for digit in "1234"],
+        ("select", "account-form-tip"),
+        ("up right select", "account-list"),
+        ("return", ""),
         ("return", ""),
         ("up", ""),
         ("stop-service select", "sign-in-no-service"),

@@ -50,7 +50,7 @@ std::string digitPicture(const std::string &digits)
     const int width = 6 + static_cast<int>(digits.size()) * advance;
     std::string svg = "<svg xmlns=\"http://www.w3.org/2000/svg\" viewBox=\"0 0 " +
                       std::to_string(width) + " " + std::to_string(height) +
-                      "\" fill=\"none\" stroke=\"#f4f1ea\" stroke-width=\"3\">";
+                      "\" fill=\"none\" stroke=\"#f2f6f9\" stroke-width=\"3\">";
     for (std::size_t i = 0; i < digits.size(); ++i)
         svg += drawn(digits[i], static_cast<int>(i));
     for (int line = 0; line < 3; ++line)

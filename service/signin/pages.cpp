@@ -10,7 +10,7 @@ const char frame[] = R"html(<!DOCTYPE html>
 <html lang="en"><head><meta charset="utf-8"><title>{title}</title>
 <style>
 html { font-size: 28px; font-size: 3.9vh; }
-body { margin: 0; padding: 15vh 8% 0; background: #14181f; color: #f4f1ea;
+body { margin: 0; padding: 15vh 8% 0; background: #0e161d; color: #f2f6f9;
   font-family: Inter, "DejaVu Sans", sans-serif; font-size: 1rem; line-height: 1.35;
   overflow: hidden; text-align: center; }
 h1 { margin: 0 0 .7em; font-size: 1.5em; font-weight: bold; }
@@ -20,18 +20,20 @@ form { width: 25em; margin: 0 auto; }
 .row span, .row div { display: table-cell; vertical-align: middle; text-align: left; }
 .row span { width: 7em; }
 input { width: 100%; height: 2.2em; box-sizing: border-box; padding: 0 .6em; font: inherit;
-  color: #14181f; background: #e9e5dc; border: 3px solid #8a8f99; border-radius: 6px; }
-button { min-width: 9em; height: 2.3em; margin: .4em .5em 0; padding: 0 1.2em; font: inherit;
-  font-weight: bold; color: #f4f1ea; background: #2f3a4d; border: 3px solid #8a8f99;
+  color: #f2f6f9; background: #0a0f14; border: 2px solid #75848f; border-radius: 6px; }
+button { min-width: 9em; height: 2.2em; margin: .4em .3em 0; padding: 0 1.2em; font: inherit;
+  color: #f2f6f9; background: #2c3843; border: 2px solid #64737f; border-radius: 6px; }
+.row button { margin-left: 0; }
+input:focus, button:focus { border-color: #f2f6f9; box-shadow: 0 0 0 .14em #f2f6f9;
+  outline-offset: -2px; }
+input:focus { background: #0f3d61; }
+button:focus { background: #1969a5; }
+::selection { background: transparent; }
+button:disabled { color: #75848f; }
+.message { display: inline-block; padding: .3em 1em; color: #14181f; background: #ffd27a;
   border-radius: 6px; }
-input:focus, button:focus { border-color: #ffc94a; box-shadow: 0 0 0 .22em #ffc94a; }
-input:focus { background: #f8f4ea; }
-button:focus { color: #14181f; background: #ffc94a; }
-button:disabled { color: #8a8f99; }
-.message { display: inline-block; padding: .3em 1em; color: #14181f; background: #ffc94a;
-  border-radius: 6px; font-weight: bold; }
 .name { margin: 1.5em 0 .2em; max-height: 2.7em; overflow: hidden; word-wrap: break-word;
-  font-size: 1.3em; color: #ffc94a; font-weight: bold; }
+  font-size: 1.3em; color: #a2bbc9; font-weight: bold; }
 svg { display: block; width: 9.4em; height: 2.9em; }
 </style></head>
 <body>{{body}}</body></html>
@@ -45,7 +47,7 @@ const char signIn[] = R"html(<h1>Sign in to your photos</h1>
 {{panel}}
 <label class="row"><span>E-mail</span><div><input type="email" name="mail" value="{mail}"></div></label>
 <label class="row"><span>Password</span><div><input type="password" name="password"></div></label>
-<button type="submit">Sign in</button>
+<div class="row"><span></span><div><button type="submit">Sign in</button></div></div>
 </form>)html";
 
 const char message[] = R"html(<p class="message">{message}</p>)html";

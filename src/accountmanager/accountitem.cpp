@@ -122,7 +122,8 @@ void AccountItem::paintTexts(QPainter *painter) const
     }
     drawLine(painter, row.adjusted(0, 11, 0, -height() / 2 + 2), fontOf(this, kNameHeight),
              Qt::ElideRight, mName.left(kLongest));
-    painter->setPen(QColor(0xd5, 0xdf, 0xe6));
+    if (!hasFocus())
+        painter->setPen(QColor(0xd5, 0xdf, 0xe6));
     drawLine(painter, row.adjusted(0, height() / 2 + 2, 0, -7), fontOf(this, kMailHeight),
              Qt::ElideMiddle, mail);
 }

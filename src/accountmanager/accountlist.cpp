@@ -2,25 +2,57 @@
 
 #include "base/i18n.h"
 #include "common/ui/dialogpanel.h"
+#include "common/ui/frames.h"
 #include "common/ui/remotekeys.h"
+#include "common/ui/scrollbarstyle.h"
+#include "common/ui/stretchedpicture.h"
 
 #include <QKeyEvent>
 #include <QLabel>
 #include <QListView>
+#include <QPainter>
 #include <QStringListModel>
+#include <QStyledItemDelegate>
 #include <QVBoxLayout>
 
 namespace {
 
 constexpr int kWidth = 620;
-constexpr int kHeight = 360;
+constexpr int kMostRows = 6; // in view
+constexpr int kMargin = 12;
+constexpr int kRowHeight = 52;
+constexpr int kPadding = 20;
 
-const QString kStyle = QStringLiteral(
-    "QListView {border-image: url(:/res/PopUpMenu_Content_Bg.png); border: 0px; padding: 12px;"
-    " color: #f2f6f9; font-size: 22px; outline: 0px;}"
-    "QListView::item {min-height: 52px; padding: 0px 14px;}"
-    "QListView::item:selected {border-image: url(:/res/Button_Focus.png) 6; border-width: 6px;"
-    " color: white;}");
+const QString kStyle =
+    QStringLiteral("QListView {background: transparent; border: 0px; font-size: 22px;}");
+
+// A style sheet would blur the picture behind the selected row on a dense screen.
+class RowDelegate : public QStyledItemDelegate
+{
+public:
+    using QStyledItemDelegate::QStyledItemDelegate;
+
+    QSize sizeHint(const QStyleOptionViewItem &, const QModelIndex &) const override
+    {
+        return {0, kRowHeight};
+    }
+
+    void paint(QPainter *painter, const QStyleOptionViewItem &option,
+               const QModelIndex &index) const override
+    {
+        if (option.state & QStyle::State_Selected)
+            painter->drawPixmap(option.rect.topLeft(),
+                                stretchedPicture(QStringLiteral(":/res/Button_Focus.png"),
+                                                 option.rect.size(), kPictureBorder,
+                                                 option.widget));
+        const QRect room = option.rect.adjusted(kPadding, 0, -kPadding, 0);
+        painter->setFont(option.font);
+        painter->setPen(QColor(0xf2, 0xf6, 0xf9));
+        painter->drawText(
+            room, Qt::AlignLeft | Qt::AlignVCenter,
+            option.fontMetrics.elidedText(index.data().toString(), Qt::ElideMiddle, room.width()));
+    }
+};
 
 } // namespace
 
@@ -28,23 +60,28 @@ AccountList::AccountList(const QStringList &accounts, QWidget *parent)
     : PopupOverlay(parent)
 {
     auto *panel = new QWidget(this);
-    panel->setFixedSize(kWidth, kHeight);
+    panel->setFixedWidth(kWidth);
     QLabel *title = makePopupTitle(panel);
     title->setText(I18n::prompt(3));
-    mList = new QListView(panel);
+    auto *content = new QContentFrame(panel);
+    mList = new QListView(content);
     mList->setFocusPolicy(Qt::NoFocus); // the keys come here
     mList->setEditTriggers(QAbstractItemView::NoEditTriggers);
-    mList->setTextElideMode(Qt::ElideMiddle);
     mList->setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
     mList->setUniformItemSizes(true);
-    mList->setStyleSheet(kStyle);
+    mList->setStyleSheet(kStyle + scrollBarStyle());
+    mList->setItemDelegate(new RowDelegate(mList));
+    mList->setFixedHeight(qMin(accounts.size(), kMostRows) * kRowHeight);
     mList->setModel(new QStringListModel(accounts, mList));
     mList->setCurrentIndex(mList->model()->index(0, 0));
     auto *rows = new QVBoxLayout(panel);
     rows->setContentsMargins(0, 0, 0, 0);
     rows->setSpacing(0);
     rows->addWidget(title);
-    rows->addWidget(mList, 1);
+    rows->addWidget(content, 1);
+    auto *inner = new QVBoxLayout(content);
+    inner->setContentsMargins(kMargin, kMargin, kMargin, kMargin);
+    inner->addWidget(mList);
     setPanel(panel);
 }
 

@@ -10,6 +10,7 @@
 #include "base/i18n.h"
 #include "base/log.h"
 #include "common/ui/closelater.h"
+#include "common/ui/picture.h"
 #include "common/ui/remotekeys.h"
 #include "common/ui/screenbackground.h"
 #include "common/ui/shortcutbar.h"
@@ -29,7 +30,9 @@
 namespace {
 
 constexpr int kSideSpace = 180;
-constexpr int kLogoHeight = 46;
+constexpr int kSpaceAbove = 28; // of what is below the title
+constexpr int kHintsHeight = 32;
+constexpr QSize kLogo(170, 46);
 
 // The sign-in page goes through the program's proxy. Setting it drops every open connection.
 void applyProxy()
@@ -51,7 +54,9 @@ AccountManager::AccountManager(QWidget *parent)
     , mMiddle(new QHBoxLayout)
     , mShortcutBar(new ShortcutBar(this))
 {
+    mShortcutBar->addEntry(DEVICE_SELECT_KEY, I18n::shortCut(6));
     mShortcutBar->addEntry(DEVICE_RETURN_KEY, I18n::shortCut(2));
+    mShortcutBar->setFixedHeight(kHintsHeight);
     mMiddle->setSpacing(0);
     mMiddle->addSpacing(kSideSpace);
     mMiddle->addWidget(mLoginPage);
@@ -60,9 +65,11 @@ AccountManager::AccountManager(QWidget *parent)
     auto *column = new QVBoxLayout(this);
     column->setContentsMargins(SystemConfig::borderLeft(), SystemConfig::borderTop(),
                                SystemConfig::borderRight(), SystemConfig::borderBottom());
-    column->addWidget(makeTitle(), 1);
-    column->addLayout(mMiddle, 8);
-    column->addWidget(mShortcutBar, 2, Qt::AlignBottom);
+    column->setSpacing(0);
+    column->addWidget(makeTitle());
+    column->addSpacing(kSpaceAbove);
+    column->addLayout(mMiddle, 1);
+    column->addWidget(mShortcutBar);
 
     connect(mLoginPage, &LoginPage::oauthStarted, this, &AccountManager::startAuthorize);
     connect(mLoginPage, &LoginPage::loginSucessed, this, &AccountManager::startLoading);
@@ -82,11 +89,7 @@ QWidget *AccountManager::makeTitle()
 {
     auto *title = new QWidget(this);
     auto *logo = new QLabel(title);
-    const QPixmap picture(QStringLiteral(":/res/orvala_icon_big.png"));
-    logo->setPixmap(picture);
-    logo->setScaledContents(true);
-    logo->setFixedSize(
-        picture.size().scaled(QSize(kLogoHeight * 4, kLogoHeight), Qt::KeepAspectRatio));
+    logo->setPixmap(loadPicture(QStringLiteral(":/res/orvala_icon_big.png"), kLogo));
     auto *text = new QLabel(title);
     text->setTextFormat(Qt::PlainText);
     text->setText(I18n::login(0));

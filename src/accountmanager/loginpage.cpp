@@ -10,6 +10,7 @@
 #include "common/ui/closelater.h"
 #include "common/ui/qconfirm.h"
 #include "common/ui/remotekeys.h"
+#include "common/ui/scrollbarstyle.h"
 
 #include <QHBoxLayout>
 #include <QKeyEvent>
@@ -29,10 +30,7 @@ const QString kStyle = QStringLiteral(
     "QPushButton {border-image: url(:/res/Button_Normal.png) 6; border-width: 6px;"
     " outline-width: 0px; color: white; font-size: 22px;}"
     "QPushButton:focus {border-image: url(:/res/Button_Focus.png) 6; border-width: 6px;}"
-    "QScrollArea, QWidget#rows {background: transparent;}"
-    "QScrollBar:vertical {width: 10px; background: #1c2730; border-radius: 5px;}"
-    "QScrollBar::handle:vertical {min-height: 40px; background: #c9d5dd; border-radius: 5px;}"
-    "QScrollBar::add-line, QScrollBar::sub-line {height: 0px;}");
+    "QScrollArea, QWidget#rows {background: transparent;}");
 
 QLabel *makeLabel(QWidget *parent, const char *name, const QString &text)
 {
@@ -158,7 +156,7 @@ void LoginPage::showEvent(QShowEvent *event)
     QWidget::showEvent(event);
     // Not before: a style sheet that sets a text size keeps the family that was the program's then.
     if (styleSheet().isEmpty())
-        setStyleSheet(kStyle);
+        setStyleSheet(kStyle + scrollBarStyle());
     // Where it was before, also when another page or window has it at the moment.
     if (QWidget *last = focusWidget())
         last->setFocus();

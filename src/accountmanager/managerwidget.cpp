@@ -26,7 +26,7 @@ constexpr int kListWidth = 180;
 const QString kStyle = QStringLiteral(
     "QLabel {color: white; font-size: 22px;}"
     "QLabel#title {font-size: 28px;}"
-    "QLineEdit {color: #f2f6f9; font-size: 24px; padding: 0px 8px;}"
+    "QLineEdit {font-size: 24px;}"
     "QPushButton {border-image: url(:/res/Button_Normal.png) 6; border-width: 6px;"
     " outline-width: 0px; color: white; font-size: 22px;}"
     "QPushButton:focus {border-image: url(:/res/Button_Focus.png) 6; border-width: 6px;}"

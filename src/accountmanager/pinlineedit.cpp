@@ -7,22 +7,12 @@
 #include <QRegularExpressionValidator>
 #include <QTimer>
 
-QString accountFieldStyle()
-{
-    return QStringLiteral("QLineEdit {border-image: url(:/res/InputBox_Normal.png); "
-                          "outline-width: 0px; border-width: 6px;}"
-                          "QLineEdit:focus {border-image: url(:/res/InputBox_Focus.png); "
-                          "outline-width: 0px; border-width: 6px;}");
-}
-
 PinLineEdit::PinLineEdit(int mapKey, QWidget *parent)
-    : QLineEdit(parent)
+    : AccountField(parent)
     , mMapKey(mapKey)
 {
     setMaxLength(1);
     setAlignment(Qt::AlignCenter);
-    setStyleSheet(accountFieldStyle());
-    setContextMenuPolicy(Qt::NoContextMenu);
     setValidator(
         new QRegularExpressionValidator(QRegularExpression(QStringLiteral("[0-9*]?")), this));
 }
@@ -68,6 +58,6 @@ void PinLineEdit::keyPressEvent(QKeyEvent *event)
         logLine("Clear is press!!");
         clearDigit();
     } else {
-        QLineEdit::keyPressEvent(event);
+        AccountField::keyPressEvent(event);
     }
 }

@@ -1,13 +1,14 @@
 #pragma once
 
-#include <QLineEdit>
+#include "accountmanager/accountfield.h"
+
 #include <QPointer>
 
 class QTimer;
 
 // A box for one digit of a PIN. The digit shows for a moment, then turns into "*", and the focus
 // may move on. Select emits returnPressed(), Clear empties the box.
-class PinLineEdit : public QLineEdit
+class PinLineEdit : public AccountField
 {
     Q_OBJECT
 
@@ -36,6 +37,3 @@ private:
     QString mDigit;
     QPointer<QTimer> mTimer; // while the digit is shown
 };
-
-// The look of the account form's fields.
-QString accountFieldStyle();

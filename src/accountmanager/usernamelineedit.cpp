@@ -1,6 +1,5 @@
 #include "accountmanager/usernamelineedit.h"
 
-#include "accountmanager/pinlineedit.h"
 #include "common/ui/remotekeys.h"
 
 #include <QKeyEvent>
@@ -12,11 +11,9 @@ constexpr int kLongest = 8;
 } // namespace
 
 UserNameLineEdit::UserNameLineEdit(QWidget *parent)
-    : QLineEdit(parent)
+    : AccountField(parent)
 {
     setMaxLength(kLongest);
-    setStyleSheet(accountFieldStyle());
-    setContextMenuPolicy(Qt::NoContextMenu);
 }
 
 void UserNameLineEdit::setInput(const QString &text)
@@ -43,5 +40,5 @@ void UserNameLineEdit::keyPressEvent(QKeyEvent *event)
         clear();
         setMaxLength(kLongest);
     }
-    QLineEdit::keyPressEvent(event);
+    AccountField::keyPressEvent(event);
 }

@@ -1,9 +1,9 @@
 #pragma once
 
-#include <QLineEdit>
+#include "accountmanager/accountfield.h"
 
 // The field for the login ID of the account form. It leaves Select to the form.
-class UserNameLineEdit : public QLineEdit
+class UserNameLineEdit : public AccountField
 {
     Q_OBJECT
 

@@ -27,7 +27,8 @@ constexpr int kSecondsToLoad = 30;
 constexpr int kMostSecondsToLoad = 3600;
 // A load that failed may be one that the page itself broke off to begin the next.
 constexpr int kSecondsAfterFailure = 3;
-constexpr int kBusySize = 36;
+constexpr int kBusySize = 32;
+constexpr int kLightestGround = 48; // of 255, behind the hints
 
 int loadingMilliseconds()
 {
@@ -184,6 +185,8 @@ void OAuthWidget::handleLoadFinished(bool finished)
     // Whatever page came, the user must see it.
     if (mStack->currentWidget() == mLoadingPage)
         showWebView();
+    else
+        takePageColour();
 }
 
 void OAuthWidget::showWebView()
@@ -192,10 +195,28 @@ void OAuthWidget::showWebView()
     stopAnimation();
     mPage->widget()->show(); // it has been closed if this is the second time
     showPage(mPage->widget());
+    takePageColour();
+}
+
+// The page lies in the middle of the screen; the edges take its colour, if it is as dark as the
+// hints below it need.
+void OAuthWidget::takePageColour()
+{
+    if (mStack->currentWidget() != mPage->widget())
+        return;
+    const QImage corner = mPage->widget()->grab(QRect(0, 0, 1, 1)).toImage();
+    const QColor colour = corner.pixelColor(0, 0);
+    if (qGray(colour.rgb()) > kLightestGround)
+        return;
+    QPalette ground = palette();
+    ground.setBrush(QPalette::Window, colour);
+    setPalette(ground);
 }
 
 void OAuthWidget::showPage(QWidget *page)
 {
+    if (page != mPage->widget())
+        setScreenBackground(this);
     mStack->setCurrentWidget(page);
     mHints->setShown(DEVICE_SELECT_KEY, page == mPage->widget());
     takeFocus();
@@ -293,4 +314,5 @@ void OAuthWidget::keyPressEvent(QKeyEvent *event)
 void OAuthWidget::resizeEvent(QResizeEvent *)
 {
     setScreenBackground(this);
+    takePageColour();
 }

@@ -70,6 +70,7 @@ private:
     void handleLoadStarted();
     void handleLoadFinished(bool finished);
     void showPage(QWidget *page);
+    void takePageColour();
     void takeFocus();
 
     std::unique_ptr<SignInView> mPage;

@@ -1,5 +1,6 @@
 #include "ui/backdrop.h"
 
+#include "common/ui/screenbackground.h"
 #include "common/ui/stretchedpicture.h"
 
 #include <QPainter>
@@ -19,12 +20,9 @@ void Backdrop::paint(QPainter &painter, const QRegion &region, const QSize &scre
 
 void Backdrop::render(const QSize &screen, qreal ratio)
 {
-    mPixels = QPixmap((QSizeF(screen) * ratio).toSize());
-    mPixels.fill(Qt::black);
+    mPixels = screenBackground((QSizeF(screen) * ratio).toSize());
     QPainter painter(&mPixels);
     painter.setRenderHint(QPainter::SmoothPixmapTransform);
     painter.scale(ratio, ratio);
-    painter.drawPixmap(QRect(QPoint(0, 0), screen),
-                       QPixmap(QStringLiteral(":/res/orvala_background.png")));
     painter.drawPixmap(mFrame, QPixmap(QStringLiteral(":/res/Content_Bg.png")));
 }

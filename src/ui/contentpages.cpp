@@ -22,6 +22,13 @@ QVBoxLayout *makeColumn(QWidget *page)
     return column;
 }
 
+void addPicture(QVBoxLayout *column, const QString &resource)
+{
+    auto *picture = new QLabel(column->parentWidget());
+    picture->setPixmap(loadPicture(resource));
+    column->addWidget(picture, 0, Qt::AlignCenter);
+}
+
 QLabel *addLine(QVBoxLayout *column, const QString &text, int pixels, const QString &colour)
 {
     auto *label = new QLabel(column->parentWidget());
@@ -78,6 +85,7 @@ NoPhotoAvailableWidget::NoPhotoAvailableWidget(QWidget *parent)
     : QWidget(parent)
 {
     QVBoxLayout *column = makeColumn(this);
+    addPicture(column, QStringLiteral(":/res/icon_photo.png"));
     addLine(column, I18n::prompt(15), 28, QStringLiteral("#e6edf2"));
     column->addStretch();
     setFocusPolicy(Qt::NoFocus);
@@ -87,10 +95,7 @@ FailurePage::FailurePage(QWidget *parent)
     : QWidget(parent)
 {
     QVBoxLayout *column = makeColumn(this);
-    auto *picture = new QLabel(this);
-    // Much larger than it is drawn for: from its largest file.
-    picture->setPixmap(loadPicture(QStringLiteral(":/res/icon_offline@3x.png"), QSize(72, 72)));
-    column->addWidget(picture, 0, Qt::AlignCenter);
+    addPicture(column, QStringLiteral(":/res/icon_offline.png"));
     mReason = addLine(column, QString(), 28, QStringLiteral("#e6edf2"));
     addLine(column, ScreenTexts::failure(ScreenTexts::HowToGoOn), 22, QStringLiteral("#a2bbc9"));
     column->addStretch();

@@ -11,8 +11,8 @@
 
 namespace {
 
-constexpr QSize kCell(92, 76);
-constexpr int kGap = 4;
+constexpr QSize kCell(96, 76);
+constexpr int kGap = 2;
 constexpr int kPicture = 28;
 constexpr int kTextHeight = 16; // pixels of the font
 constexpr int kFocusBorder = 2;
@@ -115,7 +115,7 @@ void DetailActions::paintEvent(QPaintEvent *)
         painter.drawPixmap(area.left() + (area.width() - kPicture) / 2, area.top() + 5,
                            loadPicture(QString::fromLatin1(face.picture)));
         painter.setPen(isMarked ? QColor(0xff, 0xff, 0xff) : QColor(0xc5, 0xd2, 0xdb));
-        painter.drawText(area.adjusted(0, 5 + kPicture, 0, -3), Qt::AlignCenter | Qt::TextWordWrap,
-                         face.text);
+        painter.drawText(area.adjusted(0, 7 + kPicture, 0, 0),
+                         Qt::AlignHCenter | Qt::AlignTop | Qt::TextWordWrap, face.text);
     }
 }

@@ -15,6 +15,7 @@ constexpr int kMark = 3;
 constexpr int kIndicatorDelay = 600; // milliseconds
 constexpr int kMessageHeight = 20;   // pixels of the font
 constexpr QSize kArrow(48, 96);
+constexpr int kArrowInset = 24; // where no usual photo has its edge
 
 // The nearest place at which a picture's pixels fall on the screen's.
 QPointF onPixels(const QPainter &painter, const QPointF &point)
@@ -150,9 +151,9 @@ void DetailStage::paintArrows(QPainter &painter) const
 {
     const int top = (height() - kArrow.height()) / 2;
     if (mHasPrevious)
-        painter.drawPixmap(kFrame, top, loadPicture(QStringLiteral(":/res/left_arrow.png")));
+        painter.drawPixmap(kArrowInset, top, loadPicture(QStringLiteral(":/res/left_arrow.png")));
     if (mHasNext)
-        painter.drawPixmap(width() - kArrow.width() - kFrame, top,
+        painter.drawPixmap(width() - kArrow.width() - kArrowInset, top,
                            loadPicture(QStringLiteral(":/res/right_arrow.png")));
 }
 
@@ -163,7 +164,8 @@ void DetailStage::paintMessage(QPainter &painter) const
     const QString text = fitText(mMessage, font(), box);
     const QRect needed = fontMetrics().boundingRect(QRect(QPoint(), box), Qt::AlignLeft, text);
     QRect area(QPoint(), needed.size() + QSize(32, 20));
-    area.moveCenter(QPoint(width() / 2, height() - area.height() / 2 - 16));
+    const int bottom = mHasFailed && !mPicture.isNull() ? pictureArea().bottom() : height();
+    area.moveCenter(QPoint(width() / 2, bottom - area.height() / 2 - 16));
     painter.setRenderHint(QPainter::Antialiasing);
     painter.setPen(Qt::NoPen);
     painter.setBrush(QColor(0x0b, 0x10, 0x16, 0xdd));

@@ -46,11 +46,15 @@ public:
         mPicture = cutToCell(picture, mStrip->devicePixelRatioF());
         mStrip->update();
     }
-    // A place without a picture is drawn dark; small as it is, it says no more.
-    void setPlaceholder(const QString &) override { mStrip->update(); }
+    void setPlaceholder(const QString &resource) override
+    {
+        mPlaceholder = cutToCell(QPixmap(resource), mStrip->devicePixelRatioF());
+        mStrip->update();
+    }
 
     QString mUrl;
     QPixmap mPicture;
+    QPixmap mPlaceholder; // instead of a picture that cannot be shown
     bool mIsCurrent = false;
 
 private:
@@ -115,10 +119,11 @@ void DetailStrip::paintEvent(QPaintEvent *)
     QPainter painter(this);
     QRect area(QPoint(kMark, kMark), kCell);
     for (const auto &cell : mCells) {
-        if (cell->mPicture.isNull())
+        const QPixmap &shown = cell->mPicture.isNull() ? cell->mPlaceholder : cell->mPicture;
+        if (shown.isNull())
             painter.fillRect(area, QColor(0x18, 0x22, 0x2b));
         else
-            painter.drawPixmap(area.topLeft(), cell->mPicture);
+            painter.drawPixmap(area.topLeft(), shown);
         if (cell->mIsCurrent) {
             painter.setPen(QPen(QColor(0xf2, 0xf6, 0xf9), kMark));
             painter.drawRect(area.adjusted(-1, -1, 1, 1));

@@ -85,6 +85,22 @@ FormScrollArea::FormScrollArea(QWidget *parent)
     verticalScrollBar()->setStyleSheet(QString::fromLatin1(kScrollBarStyle));
 }
 
+void FormScrollArea::resizeEvent(QResizeEvent *event)
+{
+    centreRows();
+    QScrollArea::resizeEvent(event);
+}
+
+void FormScrollArea::centreRows()
+{
+    const QFrame *first = content() ? content()->cell(0) : nullptr;
+    const int columns = first ? content()->column() : 0;
+    if (columns < 1)
+        return;
+    const int rows = (content()->count() + columns - 1) / columns;
+    setViewportMargins(0, qMax(0, (height() - rows * first->minimumHeight()) / 2), 0, 0);
+}
+
 FormScrollWidget *FormScrollArea::content() const
 {
     return qobject_cast<FormScrollWidget *>(widget());

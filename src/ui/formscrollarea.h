@@ -24,6 +24,10 @@ public:
     // Gives the focus to the first cell.
     void updateFocus();
 
+    // A page's rows in the middle of the area, if they leave room, however many are shown. Call it
+    // when the cells have changed their size.
+    void centreRows();
+
     bool eventFilter(QObject *watched, QEvent *event) override;
 
 signals:
@@ -33,6 +37,7 @@ signals:
 protected:
     void keyPressEvent(QKeyEvent *event) override;
     void focusInEvent(QFocusEvent *event) override;
+    void resizeEvent(QResizeEvent *event) override;
 
 private:
     GridOwner *owner() const;

@@ -58,7 +58,7 @@ HomeBars::Hints HomeBars::usefulKeys(const HomeState &state, HomePages::Page pag
         hints = gridHints(state, package);
     else if (page == HomePages::Failure)
         hints << qMakePair(int(DEVICE_SELECT_KEY), ScreenTexts::hint(ScreenTexts::RetryHint));
-    if (state.back() != HomeState::Back::SignOut)
+    if (page == HomePages::Failure || state.back() != HomeState::Back::SignOut)
         hints << qMakePair(int(DEVICE_RETURN_KEY), I18n::shortCut(2));
     hints << qMakePair(int(DEVICE_RED_KEY), I18n::shortCut(10));
     return hints;

@@ -69,6 +69,7 @@ void HomeView::showList(const Package &package)
 {
     const bool toContent = !mTitleWidget->hasFocus();
     const int shown = mCells->fill(package, mState->recordIndex(0));
+    grid()->centreRows();
     mState->mCanPlay = true;
     if (isShown(HomePages::Detail))
         return; // the list stays below it

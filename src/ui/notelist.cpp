@@ -2,6 +2,7 @@
 
 #include "base/i18n.h"
 #include "common/ui/remotekeys.h"
+#include "common/ui/scrollbarstyle.h"
 #include "common/ui/textfit.h"
 #include "network/systemconfig.h"
 
@@ -107,9 +108,12 @@ private:
         const int kind = index.data(KindRole).toInt();
         painter->setFont(textFont());
         painter->setPen(kind == MessageRow ? kDimmed : kText);
+        const QString text = index.data(TextRole).toString();
         const int alignment = kind == MessageRow ? Qt::AlignHCenter : Qt::AlignLeft;
-        painter->drawText(area, alignment | Qt::AlignTop | Qt::TextDontClip,
-                          index.data(TextRole).toString());
+        if (index.data(DeleteRole).toBool())
+            area.setRight(area.right() - kDeleteWidth - kPadding);
+        painter->setLayoutDirection(text.isRightToLeft() ? Qt::RightToLeft : Qt::LeftToRight);
+        painter->drawText(area, alignment | Qt::AlignTop | Qt::TextDontClip, text);
     }
 };
 
@@ -147,11 +151,8 @@ NoteList::NoteList(const QString &addText, QWidget *parent)
     mRows->setFrameShape(QFrame::NoFrame);
     mRows->setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
     mRows->setVerticalScrollMode(QAbstractItemView::ScrollPerPixel);
-    mRows->setStyleSheet(QStringLiteral(
-        "QListWidget{background:transparent;border:0px;}"
-        "QScrollBar:vertical{width:10px;background:#1c2730;border-radius:5px;}"
-        "QScrollBar::handle:vertical{min-height:40px;background:#c9d5dd;border-radius:5px;}"
-        "QScrollBar::add-line,QScrollBar::sub-line{height:0px;}"));
+    mRows->setStyleSheet(QStringLiteral("QListWidget {background: transparent; border: 0px;}") +
+                         scrollBarStyle());
     fill(QString());
 }
 

@@ -167,12 +167,14 @@ QList<QPair<int, QString>> PictureDetailWidget::keyHints() const
 {
     if (mZoom->isVisible())
         return {}; // it shows its own
-    const QString select =
-        mZone == Zone::Photo ? DetailTexts::text(DetailTexts::FullScreen) : I18n::shortCut(6);
-    return {{DEVICE_SELECT_KEY, select},
-            {DEVICE_DOWN_KEY, DetailTexts::text(DetailTexts::Actions)},
-            {DEVICE_PLAY_KEY, I18n::shortCut(9)},
-            {DEVICE_RETURN_KEY, I18n::shortCut(2)}};
+    QList<QPair<int, QString>> hints;
+    if (mZone == Zone::Photo)
+        hints = {{DEVICE_SELECT_KEY, DetailTexts::text(DetailTexts::FullScreen)},
+                 {DEVICE_DOWN_KEY, DetailTexts::text(DetailTexts::Actions)}};
+    else
+        hints = {{DEVICE_SELECT_KEY, I18n::shortCut(6)}};
+    return hints << qMakePair(int(DEVICE_PLAY_KEY), I18n::shortCut(9))
+                 << qMakePair(int(DEVICE_RETURN_KEY), I18n::shortCut(2));
 }
 
 void PictureDetailWidget::keyPressEvent(QKeyEvent *event)

@@ -1,5 +1,6 @@
 #include "ui/searchwidget.h"
 
+#include "base/i18n.h"
 #include "base/log.h"
 #include "common/ui/picture.h"
 #include "common/ui/remotekeys.h"
@@ -57,6 +58,10 @@ SearchWidget::SearchWidget(QWidget *parent)
     mField->setFocusPolicy(Qt::NoFocus);
     mField->setFixedSize(SystemConfig::mScreen_Width - 800, kHeight);
     mField->setTextMargins(12, 0, 12, 0);
+    mField->setPlaceholderText(I18n::label(9));
+    QPalette colours = mField->palette();
+    colours.setColor(QPalette::PlaceholderText, QColor(0x52, 0x5d, 0x66));
+    mField->setPalette(colours);
     QFont font = mField->font();
     font.setPixelSize(26);
     mField->setFont(font);

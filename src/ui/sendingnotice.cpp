@@ -13,7 +13,7 @@
 SendingNotice::SendingNotice(QWidget *screen)
     : PopupOverlay(screen)
 {
-    auto *panel = new QContentFrame(this);
+    auto *panel = new QContentFrame(this, QContentFrame::Place::Alone);
     auto *row = new QHBoxLayout(panel);
     row->setContentsMargins(48, 32, 48, 32);
     row->setSpacing(24);

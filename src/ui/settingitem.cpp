@@ -18,18 +18,20 @@ namespace {
 constexpr int kSmallestNumber = 5;
 constexpr int kValueWidth = 150;
 constexpr int kRowHeight = 48;
+constexpr int kMargin = 12;
 constexpr qreal kFrame = 2.5; // of the focused row
+const QColor kTextColour(0xf2, 0xf6, 0xf9);
 
-QLabel *makeText(Qt::Alignment alignment, QWidget *parent)
+template <class Label>
+Label *dress(Label *label, Qt::Alignment alignment)
 {
-    auto *label = new QLabel(parent);
     label->setTextFormat(Qt::PlainText);
     label->setAlignment(alignment);
     QFont font = label->font();
     font.setPointSize(SystemConfig::messageFont());
     label->setFont(font);
     QPalette palette = label->palette();
-    palette.setColor(QPalette::WindowText, QColor(0xf2, 0xf6, 0xf9));
+    palette.setColor(QPalette::WindowText, kTextColour);
     label->setPalette(palette);
     return label;
 }
@@ -44,17 +46,37 @@ QLabel *makeArrow(const QString &picture, QWidget *parent)
 
 } // namespace
 
+// Its style sheet would blur the box around a value that is edited, on a dense screen.
+class ValueLabel : public SelfPainted<QLabel>
+{
+public:
+    using SelfPainted::SelfPainted;
+
+    bool mIsBoxed = false;
+
+protected:
+    void paintEvent(QPaintEvent *) override
+    {
+        QPainter painter(this);
+        if (mIsBoxed)
+            painter.drawPixmap(0, 0,
+                               stretchedPicture(QStringLiteral(":/res/InputBox_Normal.png"), size(),
+                                                kPictureBorder, this));
+        painter.setPen(kTextColour);
+        painter.drawText(rect(), Qt::AlignCenter, text());
+    }
+};
+
 SettingItem::SettingItem(const QString &caption, QWidget *parent)
-    : QFrame(parent)
-    , mCaption(makeText(Qt::AlignRight | Qt::AlignVCenter, this))
-    , mValueLabel(makeText(Qt::AlignCenter, this))
+    : SelfPainted(parent)
+    , mCaption(dress(new QLabel(this), Qt::AlignRight | Qt::AlignVCenter))
+    , mValueLabel(dress(new ValueLabel(this), Qt::AlignCenter))
 {
     setFocusPolicy(Qt::StrongFocus);
     setFixedHeight(kRowHeight);
     mCaption->setText(unescapeHtml(caption));
     mValueLabel->setFixedWidth(kValueWidth);
     auto *row = new QHBoxLayout(this);
-    row->setContentsMargins(12, 0, 12, 0);
     row->setSpacing(12);
     row->addWidget(mCaption, 1);
     auto *value = new QHBoxLayout;
@@ -122,6 +144,7 @@ void SettingItem::decrease()
 void SettingItem::setEditing(bool isEditing)
 {
     mIsEditing = isEditing;
+    mValueLabel->mIsBoxed = isEditing;
     mValueLabel->setStyleSheet(
         isEditing
             ? QStringLiteral("border-image: url(:/res/InputBox_Normal.png); border-width: 6px;")
@@ -163,6 +186,9 @@ void SettingItem::paintEvent(QPaintEvent *)
 
 void SettingItem::showFocus(bool hasFocus)
 {
+    // The sheet's border takes its room from the row, whose parts must not move.
+    const int margin = hasFocus ? kMargin - kPictureBorder : kMargin;
+    layout()->setContentsMargins(margin, 0, margin, 0);
     setStyleSheet(hasFocus ? QStringLiteral("SettingItem { border-image: url(%1); outline-width: "
                                             "0px; border-width: 6px;}")
                                  .arg(QStringLiteral(":/res/Button_Normal.png"))

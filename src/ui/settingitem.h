@@ -1,14 +1,17 @@
 #pragma once
 
+#include "common/ui/selfpainted.h"
+
 #include <QFrame>
 #include <QStringList>
 
 class QLabel;
+class ValueLabel;
 
 // A row of the settings panel: a caption and a value between two arrows. Select begins and ends the
 // editing of the value, which Down increases and Up decreases; all other keys are left to the
 // panel.
-class SettingItem : public QFrame
+class SettingItem : public SelfPainted<QFrame>
 {
     Q_OBJECT
 
@@ -42,7 +45,7 @@ private:
     void redraw();
 
     QLabel *mCaption;
-    QLabel *mValueLabel;
+    ValueLabel *mValueLabel;
     QStringList mChoices;
     QString mSuffix;
     int mKind = Number;

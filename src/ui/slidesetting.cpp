@@ -1,6 +1,7 @@
 #include "ui/slidesetting.h"
 
 #include "base/i18n.h"
+#include "common/ui/dialogpanel.h"
 #include "common/ui/frames.h"
 #include "common/ui/picturebutton.h"
 #include "common/ui/remotekeys.h"
@@ -30,22 +31,7 @@ enum LabelText {
 enum ButtonText { CancelText = 4, OkText = 6 };
 
 constexpr QSize kButtonSize(120, 40);
-constexpr int kTitleHeight = 52;
 const QColor kVeil(115, 115, 115, 200);
-
-QLabel *makeTitle(QWidget *parent)
-{
-    auto *title = new QLabel(I18n::label(SettingTitle), parent);
-    title->setTextFormat(Qt::PlainText);
-    title->setAlignment(Qt::AlignCenter);
-    title->setFixedHeight(kTitleHeight);
-    QFont font = title->font();
-    font.setPointSize(SystemConfig::menuFont());
-    title->setFont(font);
-    title->setStyleSheet(QStringLiteral("QLabel {border-image: url(%1); color: white;}")
-                             .arg(QStringLiteral(":/res/PopUpMenu_Title_Bg.png")));
-    return title;
-}
 
 } // namespace
 
@@ -63,7 +49,9 @@ SlideSetting::SlideSetting(QWidget *parent)
     auto *column = new QVBoxLayout(frame);
     column->setContentsMargins(0, 0, 0, 0);
     column->setSpacing(0);
-    column->addWidget(makeTitle(frame));
+    QLabel *title = makePopupTitle(frame);
+    title->setText(I18n::label(SettingTitle));
+    column->addWidget(title);
     column->addWidget(content, 1);
     buildRows(content);
 }

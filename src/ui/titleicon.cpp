@@ -45,13 +45,14 @@ const QColor kGreen(0, 128, 0); // a style sheet's "green"
 const QColor kBlue(100, 149, 237);
 const QColor kLight(0xf4, 0xf8, 0xfa);
 constexpr qreal kTitleRadius = 10;
+constexpr qreal kSignOutRadius = 5; // of its picture
 constexpr qreal kFocusFrame = 3;
 
 void paintBox(QPainter &painter, const QRect &area, const QPen &pen, const QBrush &brush,
               qreal radius)
 {
     const qreal inset = pen.widthF() / 2;
-    painter.setRenderHint(QPainter::Antialiasing, radius > 0);
+    painter.setRenderHint(QPainter::Antialiasing);
     painter.setPen(pen);
     painter.setBrush(brush);
     painter.drawRoundedRect(QRectF(area).adjusted(inset, inset, -inset, -inset), radius, radius);
@@ -72,7 +73,7 @@ QFont entryFont(QFont font, bool signOut)
 } // namespace
 
 TitleIcon::TitleIcon(const QString &text, bool signOut, QWidget *parent)
-    : QLabel(parent)
+    : SelfPainted(parent)
     , isSignOut(signOut)
 {
     setTextFormat(Qt::PlainText);
@@ -106,14 +107,13 @@ void TitleIcon::paintGround(QPainter &painter) const
     const auto picture = [&](const char *name, int border) {
         painter.drawPixmap(0, 0, stretchedPicture(QLatin1String(name), size(), border, this));
     };
-    const QPen focus(kGreen, kFocusFrame, Qt::SolidLine, Qt::FlatCap, Qt::MiterJoin);
+    const QPen focus(kGreen, kFocusFrame);
     if (isSignOut && mLook == Look::Normal)
-        picture(":/res/SignOut_Bg.png", 2);
+        picture(":/res/SignOut_Bg.png", kPictureBorder);
     else if (isSignOut && mLook == Look::Selected)
-        paintBox(painter, rect(), QPen(kBlue, 2, Qt::SolidLine, Qt::FlatCap, Qt::MiterJoin),
-                 Qt::NoBrush, 0);
+        paintBox(painter, rect(), QPen(kBlue, 2), Qt::NoBrush, kSignOutRadius);
     else if (isSignOut)
-        paintBox(painter, rect(), focus, kLight, 0);
+        paintBox(painter, rect(), focus, kLight, kSignOutRadius);
     else if (mLook == Look::Focused)
         paintBox(painter, rect(), focus, kLight, kTitleRadius);
     else if (mLook == Look::Selected)

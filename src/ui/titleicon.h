@@ -1,9 +1,11 @@
 #pragma once
 
+#include "common/ui/selfpainted.h"
+
 #include <QLabel>
 
 // One entry of the top menu. Which of its looks it has is decided by the bar.
-class TitleIcon : public QLabel
+class TitleIcon : public SelfPainted<QLabel>
 {
     Q_OBJECT
 

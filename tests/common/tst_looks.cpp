@@ -1,5 +1,6 @@
 #include "common/ui/picture.h"
 #include "common/ui/scale.h"
+#include "common/ui/screenbackground.h"
 #include "network/systemconfig.h"
 #include "res/resources.h"
 
@@ -31,6 +32,31 @@ private slots:
             auto found = name.globalMatch(QString::fromUtf8(file.readAll()));
             while (found.hasNext())
                 QVERIFY2(!QImage(found.next().captured()).isNull(), qPrintable(file.fileName()));
+        }
+    }
+
+    void backgroundAtAnySize_data()
+    {
+        QTest::addColumn<QSize>("size");
+        QTest::newRow("dot") << QSize(1, 1);
+        QTest::newRow("smaller") << QSize(70, 41);
+        QTest::newRow("screen") << QSize(1281, 719);
+    }
+
+    void backgroundAtAnySize()
+    {
+        QFETCH(QSize, size);
+        const QImage shown = screenBackground(size).toImage();
+        QCOMPARE(shown.size(), size);
+        const QImage expected =
+            QImage(":/res/orvala_background.png").scaled(size, Qt::IgnoreAspectRatio);
+        for (int y = 0; y < size.height(); ++y) {
+            for (int x = 0; x < size.width(); ++x) {
+                const QColor found = shown.pixelColor(x, y), wanted = expected.pixelColor(x, y);
+                QVERIFY(qAbs(found.red() - wanted.red()) < 3);
+                QVERIFY(qAbs(found.green() - wanted.green()) < 3);
+                QVERIFY(qAbs(found.blue() - wanted.blue()) < 3);
+            }
         }
     }
 

@@ -3,18 +3,21 @@
 #include "common/ui/frames.h"
 #include "common/ui/picturebutton.h"
 #include "common/ui/popupoverlay.h"
+#include "common/ui/selfpainted.h"
 #include "common/ui/stretchedpicture.h"
 #include "common/ui/textfit.h"
 #include "network/systemconfig.h"
 
 #include <QHBoxLayout>
 #include <QLabel>
+#include <QPainter>
 
 namespace {
 
 constexpr QSize kButtonSize(120, 40);
 constexpr int kButtonGap = 32;
 constexpr int kMargin = 32;
+const char *const kTitleGround = ":/res/PopUpMenu_Title_Bg.png";
 
 int panelWidth()
 {
@@ -26,25 +29,40 @@ QSize messageBox()
     return {panelWidth() - 2 * kMargin, SystemConfig::mScreen_Height * 2 / 5};
 }
 
-QLabel *makeLabel(QWidget *parent, int points)
+void dress(QLabel *label, int points)
 {
-    auto *label = new QLabel(parent);
     label->setTextFormat(Qt::PlainText);
     label->setAlignment(Qt::AlignCenter);
     setPopupColours(label);
     QFont font = label->font();
     font.setPointSize(points);
     label->setFont(font);
-    return label;
 }
+
+// Its style sheet would paint the ground with square corners.
+class PopupTitle : public SelfPainted<QLabel>
+{
+public:
+    using SelfPainted::SelfPainted;
+
+protected:
+    void paintEvent(QPaintEvent *) override
+    {
+        QPainter painter(this);
+        paintPanel(painter, QLatin1String(kTitleGround), size(), Qt::TopEdge);
+        painter.setPen(Qt::white);
+        painter.drawText(rect(), Qt::AlignCenter, text());
+    }
+};
 
 } // namespace
 
 QLabel *makePopupTitle(QWidget *parent)
 {
-    QLabel *title = makeLabel(parent, SystemConfig::menuFont());
+    auto *title = new PopupTitle(parent);
+    dress(title, SystemConfig::menuFont());
     title->setStyleSheet(QStringLiteral("QLabel {border-image: url(%1); color: white;}")
-                             .arg(QStringLiteral(":/res/PopUpMenu_Title_Bg.png")));
+                             .arg(QLatin1String(kTitleGround)));
     title->setFixedHeight(qMax(52, title->fontMetrics().height() * 2));
     return title;
 }
@@ -56,7 +74,8 @@ DialogPanel::DialogPanel(const ButtonStyles &styles, QWidget *parent)
 {
     setFixedWidth(panelWidth());
     auto *content = new QContentFrame(this);
-    mMessage = makeLabel(content, SystemConfig::messageFont());
+    mMessage = new QLabel(content);
+    dress(mMessage, SystemConfig::messageFont());
     auto *rows = new QVBoxLayout(content);
     rows->setContentsMargins(kMargin, kMargin, kMargin, kMargin);
     rows->setSpacing(kMargin);

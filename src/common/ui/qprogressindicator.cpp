@@ -108,6 +108,5 @@ void QProgressIndicator::paintEvent(QPaintEvent *)
 
     painter.setPen(Qt::NoPen);
     painter.setBrush(mColor);
-    painter.drawPie(QRectF(radius - thickness / 2, -thickness / 2, thickness, thickness), 180 * 16,
-                    180 * 16);
+    painter.drawEllipse(QPointF(radius, 0), thickness / 2, thickness / 2);
 }

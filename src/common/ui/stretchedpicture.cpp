@@ -18,11 +18,27 @@ QString keyOf(const QString &resource, const QSize &size, int margin)
 // What a border picture is on a dense screen: the same, drawn that many times as large. Qt would
 // take a file named @3x for a style sheet as well, and cut it in the wrong places.
 constexpr int kLargeScale = 3;
+constexpr int kPanelRadius = 8;
 
 QString largeFile(const QString &resource)
 {
     QString file = resource;
     return file.insert(file.lastIndexOf(QLatin1Char('.')), QStringLiteral("-large"));
+}
+
+QPixmap stretchedColumn(const QString &resource, int height)
+{
+    const QString key = keyOf(resource, {0, height}, -1);
+    QPixmap column;
+    if (!QPixmapCache::find(key, &column)) {
+        const QPixmap source(resource);
+        if (source.isNull())
+            return source;
+        column =
+            source.scaled(source.width(), height, Qt::IgnoreAspectRatio, Qt::SmoothTransformation);
+        QPixmapCache::insert(key, column);
+    }
+    return column;
 }
 
 void drawStretched(QPainter &painter, const QString &resource, const QSize &size, int margin)
@@ -71,6 +87,24 @@ QPixmap fittedPicture(const QString &resource, const QSize &size)
     fitted = source.scaled(size, Qt::KeepAspectRatio, Qt::SmoothTransformation);
     QPixmapCache::insert(key, fitted);
     return fitted;
+}
+
+void paintPanel(QPainter &painter, const QString &resource, const QSize &size, Qt::Edges round)
+{
+    const qreal ratio = painter.device()->devicePixelRatioF();
+    QBrush ground(stretchedColumn(resource, qRound(size.height() * ratio)));
+    ground.setTransform(QTransform::fromScale(1 / ratio, 1 / ratio));
+    QRectF shape(QPointF(0, 0), size);
+    // The corners that stay square lie outside.
+    shape.adjust(0, round & Qt::TopEdge ? 0 : -kPanelRadius, 0,
+                 round & Qt::BottomEdge ? 0 : kPanelRadius);
+    painter.save();
+    painter.setClipRect(QRect(QPoint(0, 0), size), Qt::IntersectClip);
+    painter.setRenderHint(QPainter::Antialiasing);
+    painter.setPen(Qt::NoPen);
+    painter.setBrush(ground);
+    painter.drawRoundedRect(shape, kPanelRadius, kPanelRadius);
+    painter.restore();
 }
 
 void copyPixels(QPainter &painter, const QPixmap &pixels, const QRect &area, qreal ratio)

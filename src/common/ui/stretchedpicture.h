@@ -22,6 +22,10 @@ QPixmap stretchedPicture(const QString &resource, const QSize &size, int margin,
 // The picture as large as fits the size (in device pixels), with its proportions.
 QPixmap fittedPicture(const QString &resource, const QSize &size);
 
+// Paints a pop-up's ground from the painter's origin: the picture, which is the same from left to
+// right, stretched to the height, with round corners at the edges given.
+void paintPanel(QPainter &painter, const QString &resource, const QSize &size, Qt::Edges round);
+
 // Copies part of a picture that holds the screen's own pixels (with a device pixel ratio of 1): the
 // area is in layout pixels, the painter starts at the picture's corner, the ratio is the screen's.
 // Left to itself, Qt scales such a picture pixel by pixel, be it by 1.
