@@ -1,8 +1,5 @@
 #include "fuzz.h"
-#include "network/proxyaddress.h"
 #include "network/systemconfig.h"
-
-#include <QFile>
 
 #include <sys/mman.h>
 #include <unistd.h>

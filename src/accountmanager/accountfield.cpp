@@ -45,8 +45,11 @@ void AccountField::paintText(QPainter &painter, const QRect &room) const
     const int start = alignment() & Qt::AlignHCenter
                           ? room.center().x() - metrics.horizontalAdvance(text()) / 2
                           : room.left();
-    const int before = metrics.horizontalAdvance(text().left(cursorPosition()));
-    painter.fillRect(QRect(start + before - kCaretWidth - 1,
-                           room.center().y() - metrics.height() / 2, kCaretWidth, metrics.height()),
+    // Behind the letter that was typed last, and before the first.
+    const int before = cursorPosition() > 0
+                           ? metrics.horizontalAdvance(text().left(cursorPosition()))
+                           : -kCaretWidth - 1;
+    painter.fillRect(QRect(start + before, room.center().y() - metrics.height() / 2, kCaretWidth,
+                           metrics.height()),
                      kText);
 }

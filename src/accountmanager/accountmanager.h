@@ -8,7 +8,6 @@ class LoginPage;
 class ManagerWidget;
 class OAuthWidget;
 class QHBoxLayout;
-class QLabel;
 class ShortcutBar;
 class WaitWidget;
 

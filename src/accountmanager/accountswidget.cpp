@@ -57,11 +57,11 @@ void AccountsWidget::addRow(const Account &account)
     const int row = mItems.size();
     connect(item, &AccountItem::selectItem, this, [this, row] {
         mCurrent = row;
-        emit selectItem();
+        emit accountChosen();
     });
     connect(item, &AccountItem::clickedDelBut, this, [this, row] {
         mCurrent = row;
-        emit clickedDelBut();
+        emit deletionChosen();
     });
     mRows->insertWidget(row, item);
     item->show(); // at once: a hidden row takes no focus

@@ -42,9 +42,9 @@ public:
     QSize sizeHint() const override;
 
 signals:
-    // The current row, or its button, was chosen with the pointer.
-    void selectItem();
-    void clickedDelBut();
+    // The row that is now the current one, or its button, was chosen with the pointer.
+    void accountChosen();
+    void deletionChosen();
 
 protected:
     void keyPressEvent(QKeyEvent *event) override;

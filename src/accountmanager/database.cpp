@@ -192,7 +192,7 @@ QString DataBase::firstValue()
 {
     if (!execute())
         return QString();
-    const QString value = mQuery->next() ? mQuery->value(0).toString() : QString();
+    QString value = mQuery->next() ? mQuery->value(0).toString() : QString();
     mQuery->clear();
     return value;
 }

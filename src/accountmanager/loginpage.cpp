@@ -25,8 +25,6 @@ const QString kStyle = QStringLiteral(
     "QLabel#title {font-size: 28px;}"
     "QLabel#hint {color: #d5dfe6; margin-top: 12px;}"
     "QLabel#message {color: #ffd27a; font-size: 20px;}"
-    "AccountItem {border-image: url(:/res/Button_Normal.png) 6; border-width: 6px;}"
-    "AccountItem:focus {border-image: url(:/res/Button_Focus.png) 6; border-width: 6px;}"
     "QPushButton {border-image: url(:/res/Button_Normal.png) 6; border-width: 6px;"
     " outline-width: 0px; color: white; font-size: 22px;}"
     "QPushButton:focus {border-image: url(:/res/Button_Focus.png) 6; border-width: 6px;}"
@@ -38,7 +36,7 @@ QLabel *makeLabel(QWidget *parent, const char *name, const QString &text)
     label->setObjectName(QLatin1String(name));
     label->setTextFormat(Qt::PlainText);
     label->setWordWrap(true);
-    label->setIndent(0);
+    label->setIndent(0); // all in line, whatever their styles
     label->setText(text);
     return label;
 }
@@ -70,8 +68,8 @@ LoginPage::LoginPage(QWidget *parent)
     , mMessage(makeLabel(this, "message", QString()))
 {
     buildLayout();
-    connect(mAccounts, &AccountsWidget::selectItem, this, &LoginPage::handleSelectIndex);
-    connect(mAccounts, &AccountsWidget::clickedDelBut, this, &LoginPage::popupConfirmDialog);
+    connect(mAccounts, &AccountsWidget::accountChosen, this, &LoginPage::handleSelectIndex);
+    connect(mAccounts, &AccountsWidget::deletionChosen, this, &LoginPage::popupConfirmDialog);
     reload();
 }
 
@@ -95,7 +93,6 @@ void LoginPage::buildLayout()
     row->addWidget(mHint, 1, Qt::AlignTop);
     row->addLayout(buttons);
 
-    mHint->setIndent(0); // in line with the title
     mMessage->setFixedHeight(48);
     mMessage->setAlignment(Qt::AlignLeft | Qt::AlignVCenter);
     auto *column = new QVBoxLayout(this);
@@ -180,17 +177,11 @@ void LoginPage::keyPressEvent(QKeyEvent *event)
         break;
     case DEVICE_LEFT_KEY:
         logLine("enter DEVICE_LEFT_KEY");
-        if (mAccounts->hasDeleteFocus())
-            mAccounts->focusCurrent();
-        else if (!mAccounts->hasRowFocus())
-            mAccounts->focusDelete();
+        handleLeft();
         break;
     case DEVICE_RIGHT_KEY:
         logLine("enter DEVICE_RIGHT_KEY");
-        if (mAccounts->hasRowFocus())
-            mAccounts->focusDelete();
-        else if (mAccounts->hasDeleteFocus())
-            mNewButton->setFocus();
+        handleRight();
         break;
     case DEVICE_PAGEUP_KEY:
     case DEVICE_PAGEDOWN_KEY:
@@ -203,6 +194,22 @@ void LoginPage::keyPressEvent(QKeyEvent *event)
     default:
         event->ignore();
     }
+}
+
+void LoginPage::handleLeft()
+{
+    if (mAccounts->hasDeleteFocus())
+        mAccounts->focusCurrent();
+    else if (!mAccounts->hasRowFocus())
+        mAccounts->focusDelete();
+}
+
+void LoginPage::handleRight()
+{
+    if (mAccounts->hasRowFocus())
+        mAccounts->focusDelete();
+    else if (mAccounts->hasDeleteFocus())
+        mNewButton->setFocus();
 }
 
 void LoginPage::handleUpOrDown(int rows)

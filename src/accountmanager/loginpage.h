@@ -55,6 +55,8 @@ private:
     enum Outcome { SignedIn, NeedsCode, Failed };
     static Outcome signIn(const QString &mail);
     void restoreFocus();
+    void handleLeft();
+    void handleRight();
     void handleUpOrDown(int rows);
     void handleSelect();
     int focusedButton() const;

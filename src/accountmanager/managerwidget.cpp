@@ -89,9 +89,11 @@ void ManagerWidget::buildFields()
 {
     connect(mLoginId, &QLineEdit::returnPressed, this, &ManagerWidget::showInputDialog);
     connect(mLoginId, &UserNameLineEdit::editCompleted, this, &ManagerWidget::decideAccount);
+    connect(mLoginId, &UserNameLineEdit::typed, this, &ManagerWidget::judgeLoginId);
     for (const PinLineEdit *box : qAsConst(mPinBoxes)) {
         connect(box, &QLineEdit::returnPressed, this, &ManagerWidget::showInputDialog);
         connect(box, &PinLineEdit::editCompleted, this, &ManagerWidget::focusNextButton);
+        connect(box, &QLineEdit::textChanged, this, &ManagerWidget::disableNextUntilComplete);
     }
     connect(mListButton, &QAbstractButton::clicked, this, &ManagerWidget::showAccountList);
     connect(mNextButton, &QAbstractButton::clicked, this, &ManagerWidget::onNextClicked);
@@ -176,13 +178,20 @@ void ManagerWidget::onCancelClicked()
 
 void ManagerWidget::decideAccount()
 {
+    judgeLoginId();
+    if (!mLoginId->text().isEmpty())
+        focusAt(FirstPin);
+}
+
+// Whether the login ID is a stored account, whose PIN has to be proved.
+void ManagerWidget::judgeLoginId()
+{
     showTip(I18n::login(7), false);
     mMustProvePin = false;
     olduser = false;
     mPassword.clear(); // it was another account's
     if (mLoginId->text().isEmpty())
         return;
-    focusAt(FirstPin);
     const AccountManagerHelper::Session session;
     if (AccountManagerHelper::getAccounts(true).contains(mLoginId->text())) {
         updateTipMessage(AccountExists);
@@ -199,6 +208,13 @@ void ManagerWidget::focusNextButton(int pinKey)
         focusAt(pinKey + 1);
     else if (isComplete)
         focusAt(Next);
+}
+
+// A digit that is deleted makes the PIN wait again.
+void ManagerWidget::disableNextUntilComplete()
+{
+    if (pin().size() < kPinLength)
+        mNextButton->setEnabled(false);
 }
 
 void ManagerWidget::onNextClicked()
@@ -267,9 +283,9 @@ QString ManagerWidget::pin() const
 
 void ManagerWidget::clearPin()
 {
+    focusAt(FirstPin); // the button that is disabled would lose it
     for (PinLineEdit *box : qAsConst(mPinBoxes))
         box->clearDigit();
-    focusAt(FirstPin); // a disabled button would lose it
     mNextButton->setEnabled(false);
 }
 

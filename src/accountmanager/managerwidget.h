@@ -83,6 +83,8 @@ private:
     void focusAt(int index);
     void moveFocus(int step);
     bool handleArrow(int key);
+    void judgeLoginId();
+    void disableNextUntilComplete();
     QString pin() const;
     void clearPin();
     void tell(TipType type);

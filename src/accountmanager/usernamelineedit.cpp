@@ -1,8 +1,11 @@
 #include "accountmanager/usernamelineedit.h"
 
+#include "common/ui/keymap.h"
 #include "common/ui/remotekeys.h"
 
 #include <QKeyEvent>
+
+#include <utility>
 
 namespace {
 
@@ -14,6 +17,8 @@ UserNameLineEdit::UserNameLineEdit(QWidget *parent)
     : AccountField(parent)
 {
     setMaxLength(kLongest);
+    KeyMap::setTakesText(this);
+    connect(this, &QLineEdit::textEdited, this, [this] { mIsTyped = true; });
 }
 
 void UserNameLineEdit::setInput(const QString &text)
@@ -41,4 +46,11 @@ void UserNameLineEdit::keyPressEvent(QKeyEvent *event)
         setMaxLength(kLongest);
     }
     AccountField::keyPressEvent(event);
+}
+
+void UserNameLineEdit::focusOutEvent(QFocusEvent *event)
+{
+    AccountField::focusOutEvent(event);
+    if (std::exchange(mIsTyped, false))
+        emit typed();
 }

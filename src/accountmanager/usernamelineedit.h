@@ -2,7 +2,8 @@
 
 #include "accountmanager/accountfield.h"
 
-// The field for the login ID of the account form. It leaves Select to the form.
+// The field for the login ID of the account form. It leaves Select to the form. Digits and letters
+// may also be typed straight into it.
 class UserNameLineEdit : public AccountField
 {
     Q_OBJECT
@@ -16,8 +17,13 @@ public:
     void showAccount(const QString &account);
 
 signals:
-    void editCompleted();
+    void editCompleted(); // by the keyboard form
+    void typed();         // the field was left after keys had changed its text
 
 protected:
     void keyPressEvent(QKeyEvent *event) override;
+    void focusOutEvent(QFocusEvent *event) override;
+
+private:
+    bool mIsTyped = false;
 };

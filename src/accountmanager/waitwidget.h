@@ -2,8 +2,6 @@
 
 #include <QWidget>
 
-class QProgressIndicator;
-
 // Shown while a sign-in completes: "Login, please wait..." below a turning ring.
 class WaitWidget : public QWidget
 {

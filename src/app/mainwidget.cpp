@@ -211,6 +211,8 @@ void MainWidget::handleCableStatusChange(bool status)
     logLine("enter MainWidget::handleCableStatusChange");
     NetworkCableStatus = status;
     logLine("{MainWidget::handleCableStatusChange} NetworkCableStatus = ", NetworkCableStatus);
+    if (!status)
+        Connection::closeIdleSockets(); // what they lead to may not be there when the cable is back
     showStatusDialog(status);
 }
 

@@ -4,6 +4,12 @@
 
 namespace {
 
+// Longer than a line, and so apart: inside a table it would look as if a comma were missing.
+const char authorizeAgain[] = "You have do some incorrect operations, please press \"Return\" to "
+                              "authorize your account again!";
+const char aboutAccounts[] = "Account Manager can simplify your login process to Orvala. Please "
+                             "enter your local login ID and protection code.";
+
 const TextTable mTitleString = {
     "Home",       "My Photos",   "Search",        "Tags List",    "Add New Tag",
     "Delete tag", "Add Comment", "Comments List", "Logout",       "Input text",
@@ -63,8 +69,7 @@ const TextTable mPromptString = {
     "Post successfully!",
     "Sorry, failed to delete this tag! Please try again later!",
     "Congratulation! This tag has been deleted successfully!",
-    "You have do some incorrect operations, please press \"Return\" to authorize your account "
-    "again!",
+    authorizeAgain,
     "The server is not responding, please try again later.",
     "Sorry, the server does not permit this operation!",
     "The network cable was plugged out, please check it!",
@@ -75,9 +80,7 @@ const TextTable mPromptString = {
 const TextTable mLoginString = {
     "Orvala Login",
     "Account manager",
-    "Account Manager can simplify your login process to Orvala. Please enter your local login ID "
-    "and "
-    "protection code.",
+    aboutAccounts,
     "Login ID",
     "Up to 8 characters",
     "Protection code",

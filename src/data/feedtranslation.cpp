@@ -13,12 +13,6 @@ namespace {
 
 const QString kFeed = QStringLiteral("feed");
 
-bool hasTotalCount(int type)
-{
-    return type == FEATURED_PHOTOS_LIST || type == SEARCH_PHOTOS_LIST ||
-           type == SEARCH_MORE_PHOTOS_LIST;
-}
-
 void appendRecords(const DataCreator &creator, const JsonObject &document, Package *package)
 {
     const JsonObject &feed = object(document, kFeed);

@@ -33,8 +33,7 @@ public:
     explicit OrvalaPhoto(const JsonObject &entry);
     static bool isRecordOf(int packageType)
     {
-        return packageType == FEATURED_PHOTOS_LIST || packageType == ALBUM_PHOTOS_LIST ||
-               packageType == SEARCH_PHOTOS_LIST || packageType == SEARCH_MORE_PHOTOS_LIST;
+        return packageType == ALBUM_PHOTOS_LIST || hasTotalCount(packageType);
     }
 
     QString imageUrl() const { return mImageUrl; } // asks the service for the display's width

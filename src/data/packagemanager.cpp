@@ -25,12 +25,6 @@ bool isFirstPage(const PackageProperty &property)
     return property.mStartIndex < property.mItemsPerPage;
 }
 
-bool hasTotalCount(int type)
-{
-    return type == FEATURED_PHOTOS_LIST || type == SEARCH_PHOTOS_LIST ||
-           type == SEARCH_MORE_PHOTOS_LIST;
-}
-
 void release(Connection *connection)
 {
     connection->setCallback(nullptr);
@@ -184,7 +178,7 @@ void PackageManager::handleDownloadFinished(const QString &url)
     if (request.callback)
         request.callback(property, code);
     // The call-back may have cleared everything, which ends fetching ahead as well.
-    if (property.mType == FEATURED_PHOTOS_LIST && isFirstPage(property) &&
+    if (code == NET_SUCCESS && property.mType == FEATURED_PHOTOS_LIST && isFirstPage(property) &&
         mCachedPackageHash.contains(cacheKey(property)))
         prepareNextDatas(property, property.mStartIndex + property.mItemsPerPage);
 }

@@ -9,6 +9,11 @@ bool isSearch(int type)
 
 } // namespace
 
+bool hasTotalCount(int packageType)
+{
+    return packageType == FEATURED_PHOTOS_LIST || isSearch(packageType);
+}
+
 bool operator==(const PackageProperty &a, const PackageProperty &b)
 {
     if (a.mType != b.mType)

@@ -23,6 +23,9 @@ enum PackageType : int {
     TYPE_SEARCH_MORE_PHOTOS = SEARCH_MORE_PHOTOS_LIST,
 };
 
+// Whether the service tells how many records the whole list has.
+bool hasTotalCount(int packageType);
+
 // One request for a page of a list.
 struct PackageProperty
 {
@@ -34,8 +37,7 @@ struct PackageProperty
     QDateTime mDownloadTime; // when the package was last downloaded; set by the package manager
     int mStartIndex = 1;     // 1-based index of the first wanted record
     int mItemsPerPage = 8;
-    int mTotalCount =
-        0; // records of the whole feed (featured and search); set by the package manager
+    int mTotalCount = 0; // records of the whole list, if it has one; set by the package manager
 };
 
 // True when both ask for the same list; the page asked for takes no part.

@@ -70,7 +70,7 @@ QImage decode(QImageReader &reader, const QByteArray &data, const QSize &size)
 {
     const bool isPlain =
         size == reader.size() && reader.transformation() == QImageIOHandler::TransformationNone;
-    const QImage image = isJpeg(reader) && isPlain ? decodeJpeg(data) : QImage();
+    QImage image = isJpeg(reader) && isPlain ? decodeJpeg(data) : QImage();
     if (!image.isNull())
         return image;
     if (size != reader.size())

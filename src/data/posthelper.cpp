@@ -67,6 +67,12 @@ QString urlOf(const QString &path)
     return SystemConfig::feedBase() + path;
 }
 
+QString urlOfPhoto(const QString &userId, const QString &albumId, const QString &photoId)
+{
+    return urlOf(
+        PHOTO_URL_BOILERPLATE.arg(encoded(userId), encoded(albumId), encoded(photoId), token()));
+}
+
 bool isAllowedInXml(uint character)
 {
     if (character < 0x20)
@@ -106,8 +112,7 @@ QString PostHelper::escapeXml(QString text)
 ErrorCode PostHelper::addComment(const QString &userId, const QString &albumId,
                                  const QString &photoId, QString &comment)
 {
-    const QString url = urlOf(
-        PHOTO_URL_BOILERPLATE.arg(encoded(userId), encoded(albumId), encoded(photoId), token()));
+    const QString url = urlOfPhoto(userId, albumId, photoId);
     comment = escapeXml(comment);
     const QString xml = COMMENT_XML_BOILERPLATE.arg(comment);
     logLine("PostHelper::addComment url = ", url);
@@ -119,8 +124,7 @@ ErrorCode PostHelper::addComment(const QString &userId, const QString &albumId,
 ErrorCode PostHelper::addTag(const QString &userId, const QString &albumId, const QString &photoId,
                              QString &tag)
 {
-    const QString url = urlOf(
-        PHOTO_URL_BOILERPLATE.arg(encoded(userId), encoded(albumId), encoded(photoId), token()));
+    const QString url = urlOfPhoto(userId, albumId, photoId);
     tag = escapeXml(tag);
     const QString xml = TAG_XML_BOILERPLATE.arg(tag);
     logLine("PostHelper::addTag url = ", url);
@@ -221,7 +225,7 @@ ErrorCode PostHelper::read(Connection &connection, const LogTexts &texts, QStrin
 
 ErrorCode PostHelper::postNewPhoto(const QString &userId, const QString &albumId,
                                    const QString &title, const QString &summary, QString mimeType,
-                                   QByteArray image, qint64 imageSize)
+                                   const QByteArray &image, qint64 imageSize)
 {
     const QString url = urlOf(POST_NEW_PHOTO_URL.arg(encoded(userId), encoded(albumId), token()));
     // Escaped like the notes: the title may be a file's name, and "&" alone is no XML.

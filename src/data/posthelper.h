@@ -28,7 +28,7 @@ public:
                                const QString &photoId, const QString &tag);
     static ErrorCode postNewPhoto(const QString &userId, const QString &albumId,
                                   const QString &title, const QString &summary, QString mimeType,
-                                  QByteArray image, qint64 imageSize);
+                                  const QByteArray &image, qint64 imageSize);
 
     // The transport: both read the whole answer, trimmed, into the response.
     static ErrorCode postData(const QString &url, const QString &xml, QString &response);

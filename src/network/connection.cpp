@@ -135,6 +135,7 @@ ErrorCode Connection::startGet(const QUrl &url)
 {
     dropReply();
     mErrorCode = NET_SUCCESS;
+    mIsSignInRefused = false;
     if (!mManager)
         return mErrorCode = NET_FAILED;
     QNetworkRequest request = requestFor(url);

@@ -4,7 +4,6 @@
 #include "paths.h"
 
 #include <QSettings>
-#include <QStringList>
 #include <QtMath>
 
 #include <memory>
@@ -17,6 +16,8 @@ QSettings *SystemConfig::mSettings = nullptr;
 namespace {
 
 qreal scaleInForce = 1;
+
+constexpr int longestWait = 24 * 60 * 60; // seconds; timers count in milliseconds, as an int
 
 const QString serviceOrigin = QStringLiteral("https://album.orvala.example");
 
@@ -58,7 +59,7 @@ QString SystemConfig::value(const QString &key, const QString &fallback)
 QStringList SystemConfig::keysOf(const QString &group)
 {
     settings().beginGroup(group);
-    const QStringList keys = settings().childKeys();
+    QStringList keys = settings().childKeys();
     settings().endGroup();
     return keys;
 }
@@ -98,7 +99,7 @@ int SystemConfig::pageCacheNumber()
 
 int SystemConfig::pageCacheSeconds()
 {
-    return integer("Max/PageCacheSeconds", 60);
+    return qMax(1, integer("Max/PageCacheSeconds", 60));
 }
 
 int SystemConfig::scrollAreaMaxColumn()
@@ -249,12 +250,12 @@ bool SystemConfig::verifyCertificates()
 
 int SystemConfig::silenceSeconds()
 {
-    return qMax(0, integer("Network/SilenceSeconds", 0));
+    return qBound(0, integer("Network/SilenceSeconds", 0), longestWait);
 }
 
 int SystemConfig::idleConnectionSeconds()
 {
-    return qMax(0, integer("Network/IdleConnectionSeconds", 60));
+    return qBound(0, integer("Network/IdleConnectionSeconds", 60), longestWait);
 }
 
 qreal SystemConfig::scaleSetting()

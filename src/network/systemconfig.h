@@ -2,6 +2,7 @@
 
 #include <QSize>
 #include <QString>
+#include <QStringList>
 
 class QSettings;
 
@@ -22,7 +23,7 @@ public:
     static qint64 imageCacheSize();     // bytes; 0 without the key
     static int photoDownloaderNumber(); // image downloads at once
     static int pageCacheNumber();       // pages kept
-    static int pageCacheSeconds();      // lifetime of a first page
+    static int pageCacheSeconds();      // lifetime of a first page, 1 at least
     static int scrollAreaMaxColumn();   // columns of the focus grid
     static int searchPageSize();        // results of one search block, fixed: 100
 

@@ -180,7 +180,7 @@ void OAuthUtil::readResponse(QNetworkReply *reply)
         return;
     const JsonObject members = JsonParser::parse(body);
     for (auto it = members.cbegin(); it != members.cend(); ++it)
-        mResponse.insert(it.key(), it.value().toString());
+        mResponse.insert(it.key(), JsonParser::string(members, it.key()));
 }
 
 void OAuthUtil::takeTokens()

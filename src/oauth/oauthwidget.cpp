@@ -139,7 +139,7 @@ void OAuthWidget::connectPage()
     connect(page, &SignInView::loadStarted, this, &OAuthWidget::handleLoadStarted, kind);
     connect(page, &SignInView::loadFinished, this, &OAuthWidget::handleLoadFinished, kind);
     // Closed by its result: now the tokens are on their way.
-    connect(page, &SignInView::closed, this, &OAuthWidget::startLoading, kind);
+    connect(page, &SignInView::pageClosed, this, &OAuthWidget::startLoading, kind);
     disconnect(page, &SignInView::userNameFound, this, nullptr);
     connect(page, &SignInView::userNameFound, this,
             [](const QString &name) { AccountManagerHelper::setUserName(name); });

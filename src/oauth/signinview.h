@@ -32,7 +32,7 @@ signals:
     void cancelAuthorize();           // Return was pressed
     void errorOccured();              // the page has nothing that could be filled in
     void userNameFound(const QString &name);
-    void closed(); // after close()
+    void pageClosed(); // after close()
 };
 
 // What the plug-in offers.

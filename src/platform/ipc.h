@@ -22,8 +22,7 @@ enum MessageType : int32_t {
     MSG_EXIT = 1,      // params: isFromParent, isSystemError
     MSG_TIME_ZONE = 2, // params: offset from UTC in hours
     // program to shell
-    MSG_REQUEST_EXIT =
-        3, // the remote's exit key: the shell answers with MSG_EXIT; params: isSystemError
+    MSG_REQUEST_EXIT = 3,  // the exit key: answered with MSG_EXIT; params: isSystemError
     MSG_EXIT_REQUEST = 4,  // the program has gone; the last message of a run
     MSG_RESPONSE = 5,      // answer to MSG_EXIT; params: response code
     MSG_PLAYBACK_INFO = 6, // params: the four values of updatePlaybackinfo

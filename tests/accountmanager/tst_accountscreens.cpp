@@ -5,7 +5,7 @@
 #include "accountmanager/accountswidget.h"
 #include "accountmanager/accounttexts.h"
 #include "accountmanager/loginpage.h"
-#include "common/ui/remotekeys.h"
+#include "common/keyrobot.h"
 #include "oauth/signinplugin.h"
 #include "res/resources.h"
 #include "support/logcapture.h"
@@ -23,10 +23,8 @@ namespace {
 
 void press(const Keys &keys)
 {
-    for (int key : keys) {
-        QKeyEvent event(QEvent::KeyPress, key, Qt::NoModifier);
-        QApplication::sendEvent(QApplication::focusWidget(), &event);
-    }
+    for (int key : keys)
+        pressKey(QApplication::focusWidget(), key);
 }
 
 // What has the focus: an account's address, with a dash behind it for its button, or the text of
@@ -139,21 +137,19 @@ private slots:
 
     void failedSignIn_data()
     {
-        using Text = AccountTexts::Text;
         QTest::addColumn<QString>("fault");
-        QTest::addColumn<int>("text");
-        QTest::newRow("row gone") << "DELETE FROM orvala1 WHERE login='true'"
-                                  << int(Text::AccountGone);
-        QTest::newRow("no token") << "UPDATE orvala1 SET token=NULL" << int(Text::SignInFailed);
-        QTest::newRow("no refresh") << "UPDATE orvala1 SET refresh=''" << int(Text::SignInFailed);
-        QTest::newRow("locked") << "BEGIN EXCLUSIVE" << int(Text::SignInFailed);
-        QTest::newRow("no table") << "DROP TABLE orvala1" << int(Text::SignInFailed);
+        QTest::newRow("row gone") << "DELETE FROM orvala1 WHERE login='true'";
+        QTest::newRow("no token") << "UPDATE orvala1 SET token=NULL";
+        QTest::newRow("no refresh") << "UPDATE orvala1 SET refresh=''";
+        QTest::newRow("locked") << "BEGIN EXCLUSIVE";
+        QTest::newRow("no table") << "DROP TABLE orvala1";
     }
 
     void failedSignIn()
     {
         QFETCH(QString, fault);
-        QFETCH(int, text);
+        const int text =
+            fault.startsWith("DELETE") ? AccountTexts::AccountGone : AccountTexts::SignInFailed;
         show(2);
         QSignalSpy finished(mScreen.get(), &AccountManager::loginFinished);
         const OtherConnection other(mFile->path());

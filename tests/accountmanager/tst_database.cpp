@@ -1,14 +1,16 @@
 #include "accountmanager/accountfile.h"
 #include "accountmanager/accountmanagerhelper.h"
 #include "accountmanager/database.h"
-#include "accountmanager/filefaults.h"
 
 #include <QMessageBox>
 #include <QPushButton>
 #include <QTimer>
 #include <QtTest>
 
+#include <csignal>
 #include <memory>
+#include <sys/resource.h>
+#include <unistd.h>
 
 using Helper = AccountManagerHelper;
 
@@ -16,6 +18,47 @@ namespace {
 
 const AccountRecord kAnna = {"anna", "7305", "token-a", "refresh-a", "false", "Anna"};
 const AccountRecord kBen = {"ben", "1234", "token-b", "refresh-b", "false", "Ben"};
+
+// A full disk: no file of this process grows beyond the limit.
+class FullDisk
+{
+public:
+    explicit FullDisk(rlim_t bytes)
+    {
+        std::signal(SIGXFSZ, SIG_IGN);
+        getrlimit(RLIMIT_FSIZE, &mBefore);
+        const rlimit limit = {bytes, mBefore.rlim_max};
+        setrlimit(RLIMIT_FSIZE, &limit);
+    }
+    ~FullDisk() { setrlimit(RLIMIT_FSIZE, &mBefore); }
+
+private:
+    rlimit mBefore = {};
+};
+
+// A read-only file system, also for tests that run as root.
+class ReadOnly
+{
+public:
+    explicit ReadOnly(const AccountFile &file)
+        : mFolder(file.folder())
+    {
+        QFile::setPermissions(file.path(), QFile::Permissions(0x4444));
+        QFile::setPermissions(mFolder, QFile::Permissions(0x5555));
+        if (mUser == 0 && seteuid(65534) != 0)
+            qFatal("cannot change the user");
+    }
+    ~ReadOnly()
+    {
+        if (seteuid(mUser) != 0)
+            qFatal("cannot change the user back");
+        QFile::setPermissions(mFolder, QFile::Permissions(0x7700));
+    }
+
+private:
+    QString mFolder;
+    uid_t mUser = geteuid();
+};
 
 } // namespace
 

@@ -6,7 +6,6 @@
 #include <QApplication>
 #include <QKeyEvent>
 #include <QPlainTextEdit>
-#include <QQueue>
 
 inline void pressKey(QWidget *widget, int key, const QString &text = QString())
 {
@@ -25,7 +24,6 @@ public:
     {
     }
 
-    QKeyBoard *keyboard() const { return mKeyboard; }
     QPlainTextEdit *box() const { return mBox; }
     int presses() const { return mPresses; }
 
@@ -62,10 +60,12 @@ private:
             return true;
         }
         for (int turns = 0; turns < kPageCount; ++turns) {
-            const int key = keyOf(turnedPage(mKeyboard->page(), turns), character);
+            const KeyboardPage page = turnedPage(mKeyboard->page(), turns);
+            const int key = keyOf(page, character);
             if (key < 0)
                 continue;
-            turnTo(turnedPage(mKeyboard->page(), turns));
+            while (mKeyboard->page() != page)
+                press(LettersKey + int(page) / 2);
             press(key);
             return true;
         }
@@ -81,32 +81,21 @@ private:
         return -1;
     }
 
-    void turnTo(KeyboardPage page)
-    {
-        const int pageKey = LettersKey + int(page) / 2;
-        while (mKeyboard->page() != page)
-            press(pageKey);
-    }
-
     QList<int> wayTo(int target) const
     {
-        QVector<QList<int>> ways(kKeyCount);
-        QQueue<int> open;
-        QVector<bool> known(kKeyCount);
-        open.enqueue(mKeyboard->focusIndex());
-        known[mKeyboard->focusIndex()] = true;
-        while (!known.at(target)) {
-            const int from = open.dequeue();
+        QList<int> open{mKeyboard->focusIndex()};
+        QHash<int, QList<int>> ways{{open.first(), {}}};
+        while (!ways.contains(target)) {
+            const int from = open.takeFirst();
             for (int arrow : {Qt::Key_Left, Qt::Key_Right, Qt::Key_Up, Qt::Key_Down}) {
                 const int to = movedKeyFocus(from, arrow);
-                if (known.at(to))
+                if (ways.contains(to))
                     continue;
-                known[to] = true;
-                ways[to] = ways.at(from) + QList<int>{arrow};
-                open.enqueue(to);
+                ways[to] = ways.value(from) + QList<int>{arrow};
+                open << to;
             }
         }
-        return ways.at(target);
+        return ways.value(target);
     }
 
     QKeyBoard *mKeyboard;

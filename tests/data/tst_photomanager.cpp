@@ -2,7 +2,7 @@
 #include "data/photomanager.h"
 #include "heldanswers.h"
 #include "support/logcapture.h"
-#include "testconfig.h"
+#include "support/testconfig.h"
 #include "testpictures.h"
 
 #include <QtTest>
@@ -14,11 +14,6 @@ QStringList calls; // "name code" in the order of the calls
 void callback(QString &url, ErrorCode code)
 {
     calls << url.section('/', -1) + ' ' + QString::number(code);
-}
-
-void otherCallback(QString &, ErrorCode)
-{
-    calls << "other";
 }
 
 void clearingCallback(QString &url, ErrorCode code)
@@ -66,7 +61,8 @@ private slots:
             mServer->on("/" + QByteArray::number(i), mHeld.hold());
             QVERIFY(download(QString::number(i)));
         }
-        QVERIFY(download("7") && PhotoManager::downloadPhoto(mServer->url("/7"), &otherCallback));
+        const auto other = [](QString &, ErrorCode) { calls << "other"; };
+        QVERIFY(download("7") && PhotoManager::downloadPhoto(mServer->url("/7"), other));
         QTRY_COMPARE(mHeld.count(), 5);
         QCOMPARE(mServer->requests().size(), 5);
         mHeld.answerFirst(MisbehavingServer::answer(png(4, 4)));

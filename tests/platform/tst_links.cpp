@@ -14,15 +14,9 @@
 
 namespace {
 
-struct Call
-{
-    QString name;
-    bool carrier;
-};
-
 std::mutex callsMutex;
-QList<Call> allCalls;
-QSemaphore gate; // taken by each call while it is closed
+QList<QPair<QString, bool>> allCalls; // name and carrier
+QSemaphore gate;                      // taken by each call while it is closed
 std::atomic<bool> gateClosed{false};
 
 int note(char *name, _NETWORK_EVENT_T event)
@@ -36,18 +30,13 @@ int note(char *name, _NETWORK_EVENT_T event)
     return 0;
 }
 
-QList<Call> calls()
-{
-    const std::lock_guard<std::mutex> lock(callsMutex);
-    return allCalls;
-}
-
 QList<bool> carriersOf(const QString &name)
 {
+    const std::lock_guard<std::mutex> lock(callsMutex);
     QList<bool> carriers;
-    for (const Call &call : calls()) {
-        if (call.name == name)
-            carriers.append(call.carrier);
+    for (const auto &[called, carrier] : qAsConst(allCalls)) {
+        if (called == name)
+            carriers.append(carrier);
     }
     return carriers;
 }
@@ -152,7 +141,7 @@ private slots:
     {
         gateClosed = true;
         ip("link set second down\n");
-        QTRY_VERIFY(!calls().isEmpty());
+        QTRY_VERIFY(!carriersOf("second").isEmpty());
         // The thread stands still: more notices than its socket can hold, the last ones count.
         const bool isDone =
             ip(QString("link set first mtu 1400\nlink set first mtu 1401\n").repeated(1500) +

@@ -23,14 +23,6 @@ public:
         return collected;
     }
     static bool contains(const QString &line) { return lines().contains(line); }
-    static bool anyStartsWith(const QString &start)
-    {
-        for (const QString &line : lines()) {
-            if (line.startsWith(start))
-                return true;
-        }
-        return false;
-    }
 
 private:
     QtMessageHandler mPrevious;

@@ -7,8 +7,6 @@
 #include <QSslSocket>
 #include <QTimer>
 
-#include <algorithm>
-
 #include <zlib.h>
 
 namespace {

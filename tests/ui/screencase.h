@@ -4,10 +4,10 @@
 #include "data/heldanswers.h"
 #include "data/packagemanager.h"
 #include "data/photomanager.h"
-#include "data/testconfig.h"
 #include "data/testpictures.h"
 #include "support/logcapture.h"
 #include "support/misbehavingserver.h"
+#include "support/testconfig.h"
 #include "ui/samplefeeds.h"
 
 #include <QKeyEvent>

@@ -1,5 +1,5 @@
-#include "data/testconfig.h"
 #include "support/logcapture.h"
+#include "support/testconfig.h"
 #include "ui/slidelabel.h"
 #include "ui/slidemotion.h"
 #include "ui/slidepicture.h"

@@ -12,7 +12,7 @@ QString sharpestFile(const QString &path, qreal ratio)
 {
     const int dot = path.lastIndexOf(QLatin1Char('.'));
     for (int scale = qMin(3, qCeil(ratio)); scale > 1; --scale) {
-        const QString file = path.left(dot) + QStringLiteral("@%1x").arg(scale) + path.mid(dot);
+        QString file = path.left(dot) + QStringLiteral("@%1x").arg(scale) + path.mid(dot);
         if (QFile::exists(file))
             return file;
     }
@@ -38,8 +38,10 @@ QPixmap makePicture(const QString &path, const QSize &size, qreal ratio)
 QPixmap loadPicture(const QString &path, const QSize &size)
 {
     const qreal ratio = qGuiApp->devicePixelRatio();
-    const QString key =
-        QStringLiteral("%1 %2x%3 %4").arg(path).arg(size.width()).arg(size.height()).arg(ratio);
+    // Begins unlike the keys of stretchedPicture(), which shares the cache.
+    const QString key = QStringLiteral("x%1 %2x%3 %4")
+                            .arg(QString::number(ratio), QString::number(size.width()),
+                                 QString::number(size.height()), path);
     QPixmap picture;
     if (!QPixmapCache::find(key, &picture)) {
         picture = makePicture(path, size, ratio);

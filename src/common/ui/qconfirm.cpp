@@ -29,7 +29,8 @@ DialogPanel::ButtonStyles styles()
 QString tagQuestion(const QString &tag, const QFont &font)
 {
     const QString question = I18n::label(8) + QLatin1Char(' ') + tag.left(kLongestTag);
-    const int width = int(1.3 * (SystemConfig::mScreen_Width * 3 / 5));
+    const int panelWidth = SystemConfig::mScreen_Width * 3 / 5;
+    const int width = int(1.3 * panelWidth);
     return unescapeHtml(QFontMetrics(font).elidedText(question, Qt::ElideRight, width));
 }
 

@@ -26,7 +26,7 @@ QPopupDialog::QPopupDialog(QWidget *parent)
 {
 }
 
-void QPopupDialog::initDialog(QString title, QString message, QList<QString> buttons)
+void QPopupDialog::initDialog(QString title, QString message, const QList<QString> &buttons)
 {
     if (buttons.isEmpty() || buttons.size() > kMostButtons) {
         logLine("QPopupDialog::initDialog ERROR, empty or out of max(2) buttons !!");

@@ -16,7 +16,7 @@ public:
 
     // Builds the dialog; with no button, or more than two, it builds nothing and says so in the
     // log.
-    void initDialog(QString title, QString message, QList<QString> buttons);
+    void initDialog(QString title, QString message, const QList<QString> &buttons);
 
 signals:
     void accepted();

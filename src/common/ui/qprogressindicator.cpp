@@ -47,7 +47,7 @@ void QProgressIndicator::setDisplayedWhenStopped(bool displayed)
     update();
 }
 
-void QProgressIndicator::setColor(QColor color)
+void QProgressIndicator::setColor(const QColor &color)
 {
     mColor = color;
     update();

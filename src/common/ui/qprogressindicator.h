@@ -29,7 +29,7 @@ public slots:
     void stopAnimation();
     void setAnimationDelay(int milliseconds);
     void setDisplayedWhenStopped(bool displayed);
-    void setColor(QColor color);
+    void setColor(const QColor &color);
 
 protected:
     void paintEvent(QPaintEvent *event) override;

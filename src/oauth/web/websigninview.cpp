@@ -54,7 +54,7 @@ void WebSignInView::close()
 {
     mView->halt();
     mView->close();
-    emit closed();
+    emit pageClosed();
 }
 
 QWidget *WebSignInView::widget()
