@@ -2,15 +2,14 @@
 #include "app/mainwidget.h"
 #include "common/ui/qpopupdialog.h"
 #include "common/ui/remotekeys.h"
-#include "network/systemconfig.h"
 #include "platform/devicestate.h"
 #include "platform/ipc.h"
 #include "platform/ipcthread.h"
 #include "support/logcapture.h"
+#include "support/testconfig.h"
 
 #include <QKeyEvent>
 #include <QLabel>
-#include <QSettings>
 #include <QSignalSpy>
 #include <QTemporaryDir>
 #include <QTest>
@@ -47,12 +46,7 @@ class TestApp : public QObject
 private slots:
     void initTestCase()
     {
-        QSettings settings(mFolder.filePath("config.ini"), QSettings::IniFormat);
-        settings.setValue("DBPath/DBPath", mFolder.filePath("accounts.db"));
-        settings.sync();
-        SystemConfig::setConfigFile(settings.fileName());
-        SystemConfig::mScreen_Width = 1280;
-        SystemConfig::mScreen_Height = 720;
+        mConfig.write("[DBPath]\nDBPath=" + mFolder.filePath("accounts.db").toUtf8());
         netcommon::Ipc::setSocketPath(mFolder.filePath("no-shell").toStdString());
     }
 
@@ -129,6 +123,7 @@ private slots:
 private:
     QList<QPopupDialog *> dialogs() const { return mMain->findChildren<QPopupDialog *>(); }
 
+    TestConfig mConfig;
     QTemporaryDir mFolder;
     std::unique_ptr<MainWidget> mMain;
 };
