@@ -9,6 +9,7 @@
 #include "accountmanager/waitwidget.h"
 #include "base/i18n.h"
 #include "base/log.h"
+#include "common/ui/closelater.h"
 #include "common/ui/picture.h"
 #include "common/ui/remotekeys.h"
 #include "common/ui/screenbackground.h"
@@ -244,12 +245,8 @@ void AccountManager::showForm(const QString &account)
 
 void AccountManager::closeForm()
 {
-    if (!mForm)
-        return;
-    mForm->hide();
-    mForm->deleteLater();
-    mForm.clear();
-    mLoginPage->show();
+    if (closeLater(mForm))
+        mLoginPage->show();
 }
 
 // Later: it is a key or an answer of its own that ends it.

@@ -7,6 +7,7 @@
 #include "accountmanager/protectioncode.h"
 #include "base/i18n.h"
 #include "base/log.h"
+#include "common/ui/closelater.h"
 #include "common/ui/qconfirm.h"
 #include "common/ui/remotekeys.h"
 #include "common/ui/scrollbarstyle.h"
@@ -314,11 +315,7 @@ bool LoginPage::eventFilter(QObject *watched, QEvent *event)
 
 void LoginPage::handleDelCancel()
 {
-    if (!mConfirm)
-        return;
-    mConfirm->hide(); // the focus goes back to where it was
-    mConfirm->deleteLater();
-    mConfirm.clear();
+    closeLater(mConfirm); // the focus goes back to where it was
 }
 
 void LoginPage::handleDeleteAccount()

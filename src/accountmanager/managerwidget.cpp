@@ -9,6 +9,7 @@
 #include "accountmanager/usernamelineedit.h"
 #include "base/i18n.h"
 #include "base/log.h"
+#include "common/ui/closelater.h"
 #include "common/ui/qpopupform.h"
 
 #include <QGridLayout>
@@ -152,11 +153,7 @@ void ManagerWidget::showInputDialog()
 
 void ManagerWidget::closeInputDialog()
 {
-    if (!mInputForm)
-        return;
-    mInputForm->hide();
-    mInputForm->deleteLater();
-    mInputForm.clear();
+    closeLater(mInputForm);
 }
 
 void ManagerWidget::getInput(const QString &contents)
@@ -340,9 +337,5 @@ void ManagerWidget::askForCode(const QString &account)
 
 void ManagerWidget::cancelSelect()
 {
-    if (!mAccountList)
-        return;
-    mAccountList->hide();
-    mAccountList->deleteLater();
-    mAccountList.clear();
+    closeLater(mAccountList);
 }

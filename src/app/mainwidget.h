@@ -12,9 +12,9 @@ class QStackedWidget;
 class Widget;
 
 // The top-level window: a stack of pages, first the account manager, then the personal page, and
-// the account manager again after signing out. It
-// also keeps the device's state that the screens read (devicestate.h): the network cable, about
-// which it tells the user in a dialog, the time zone and the clock.
+// the account manager again after signing out. It also keeps the device's state that the screens
+// read (devicestate.h): the network cable, about which it tells the user in a dialog, the time zone
+// and the clock.
 class MainWidget : public QWidget
 {
     Q_OBJECT

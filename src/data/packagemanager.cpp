@@ -58,6 +58,11 @@ Package *PackageManager::getPackage(PackageProperty &property)
     return package;
 }
 
+const Package *PackageManager::cached(const PackageProperty &property)
+{
+    return mCachedPackageHash.value(cacheKey(property));
+}
+
 // Fetches the page behind the one that is about to be shown, unless it is there.
 void PackageManager::prepareFollowingPage(const PackageProperty &property, const Package &package)
 {

@@ -27,6 +27,8 @@ public:
     // that may evict (any download's end): never keep the pointer over the event loop without
     // asking again.
     static Package *getPackage(PackageProperty &property);
+    // What is cached of this list, whether it can serve the page or not; fetches nothing ahead.
+    static const Package *cached(const PackageProperty &property);
     // True when a request for this list is running afterwards; false calls nothing.
     static bool downloadPage(PackageProperty &property, Callback callback);
     // Whether the page that failed last was refused because the sign-in has expired; for a

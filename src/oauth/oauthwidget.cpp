@@ -3,6 +3,7 @@
 #include "accountmanager/accountmanagerhelper.h"
 #include "base/i18n.h"
 #include "base/log.h"
+#include "common/ui/closelater.h"
 #include "common/ui/qpopupform.h"
 #include "common/ui/qprogressindicator.h"
 #include "common/ui/remotekeys.h"
@@ -223,8 +224,10 @@ void OAuthWidget::showPage(QWidget *page)
 
 void OAuthWidget::takeFocus()
 {
-    if (mInputForm)
-        return; // it takes the focus by itself and gives it back
+    // A keyboard takes the focus by itself and gives it back; a page that comes when the user has
+    // left must not have it at all.
+    if (mInputForm || !isVisible())
+        return;
     const bool isPage = mStack->currentWidget() == mPage->widget();
     (isPage ? mPage->widget() : this)->setFocus();
 }
@@ -253,12 +256,8 @@ void OAuthWidget::showInputDialog()
 
 void OAuthWidget::closeInputDialog()
 {
-    if (!mInputForm)
-        return;
-    mInputForm->hide();
-    mInputForm->deleteLater();
-    mInputForm.clear();
-    takeFocus();
+    if (closeLater(mInputForm))
+        takeFocus();
 }
 
 void OAuthWidget::getInput(const QString &contents)

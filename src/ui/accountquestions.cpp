@@ -1,6 +1,7 @@
 #include "ui/accountquestions.h"
 
 #include "base/i18n.h"
+#include "common/ui/closelater.h"
 #include "common/ui/qconfirm.h"
 #include "common/ui/qpopupdialog.h"
 #include "common/ui/qpopupform.h"
@@ -44,9 +45,7 @@ void AccountQuestions::show(QWidget *question)
 
 void AccountQuestions::answer(bool confirms)
 {
-    mQuestion->hide();
-    mQuestion->deleteLater();
-    mQuestion.clear();
+    closeLater(mQuestion);
     if (confirms)
         emit confirmed();
     else

@@ -8,6 +8,7 @@
 #include "ui/formscrollwidget.h"
 #include "ui/paging.h"
 #include "ui/photoitem.h"
+#include "ui/qimageslide.h"
 
 #include <QFontMetrics>
 
@@ -101,7 +102,7 @@ void CellFiller::showThumbnail(PhotoItem *cell, QString url)
         return;
     }
     cell->setPlaceholder(QStringLiteral(":/res/image_not_download.png"));
-    if (url.isEmpty())
+    if (url.isEmpty() || QImageSlide::mIsShowing)
         return;
     Download::mHomeLabelUrlHash.insert(url, cell);
     if (!PhotoManager::downloadPhoto(url, Download::downloadHomePhotoCB))
@@ -111,5 +112,6 @@ void CellFiller::showThumbnail(PhotoItem *cell, QString url)
 void CellFiller::cancelThumbnails()
 {
     Download::mHomeLabelUrlHash.clear();
-    PhotoManager::cancelDownloadWaitingPhoto();
+    if (!QImageSlide::mIsShowing) // whose photos wait in the same line
+        PhotoManager::cancelDownloadWaitingPhoto();
 }

@@ -17,7 +17,8 @@ public:
     CellFiller(FormScrollWidget *content, QWidget *backdrop);
 
     // Shows the records from `first` on, one a cell, and hides the cells that are left over.
-    // Returns the number of cells shown.
+    // Returns the number of cells shown. Below the slide show no thumbnail is asked for: who comes
+    // back from it has the page laid out anew.
     int fill(const Package &package, int first);
 
     // No cell waits for a thumbnail any longer.

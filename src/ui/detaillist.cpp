@@ -1,20 +1,12 @@
 #include "ui/detaillist.h"
 
 #include "data/packagemanager.h"
+#include "ui/cachedlist.h"
 #include "ui/detailpaging.h"
 #include "ui/detailphoto.h"
 #include "ui/paging.h"
 
 #include <algorithm>
-
-namespace {
-
-bool isSearch(int type)
-{
-    return type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
-}
-
-} // namespace
 
 void DetailList::open(Package *package, int firstNumber)
 {
@@ -33,17 +25,12 @@ Package *DetailList::package()
     return mPackage;
 }
 
-// The list from its beginning. One that begins later is dropped: only a page fetched ahead had come
-// when the pages before it had grown stale.
+// The list from its beginning.
 Package *DetailList::cachedPackage() const
 {
     PackageProperty first = mProperty;
     first.mStartIndex = 1;
-    Package *package = PackageManager::getPackage(first);
-    if (!package || package->mProperty.mStartIndex <= 1)
-        return package;
-    PackageManager::removeCache(first);
-    return nullptr;
+    return cachedList(first);
 }
 
 int DetailList::heldEnd()
@@ -61,7 +48,7 @@ const OrvalaPhoto *DetailList::photo(int number)
 int DetailList::total()
 {
     if (const Package *held = package()) {
-        const bool isWhole = type() != TYPE_FEATURED_PHOTOS && !isSearch(type());
+        const bool isWhole = type() != TYPE_FEATURED_PHOTOS && !paging::isSearch(type());
         mTotal = isWhole ? held->count() : std::max(held->mTotalCount, heldEnd());
     }
     return mEnd > 0 ? std::min(mEnd, mTotal) : mTotal;
@@ -86,7 +73,7 @@ PackageProperty DetailList::requestFor(int number)
     request.mStartIndex = 1;
     if (type() == TYPE_FEATURED_PHOTOS) {
         request.mStartIndex = heldEnd() + 1;
-    } else if (isSearch(type())) {
+    } else if (paging::isSearch(type())) {
         const int block = paging::blockStart((number - 1) / paging::blockSize);
         if (block == 1 && type() == TYPE_SEARCH_PHOTOS)
             return request;
@@ -106,7 +93,7 @@ bool DetailList::take(const PackageProperty &arrived)
     }
     const Package *now = package();
     const bool isNew = now && (now != mPackageAtRequest || heldEnd() != mEndAtRequest);
-    const bool isShortBlock = isSearch(type()) && now && now->count() < paging::blockSize;
+    const bool isShortBlock = paging::isSearch(type()) && now && now->count() < paging::blockSize;
     if (!isNew || isShortBlock)
         mEnd = heldEnd(); // the service has less than it says
     return isNew;

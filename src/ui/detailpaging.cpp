@@ -1,6 +1,5 @@
 #include "ui/detailpaging.h"
 
-#include "data/packageproperty.h"
 #include "ui/paging.h"
 
 #include <algorithm>
@@ -9,10 +8,9 @@ namespace detailpaging {
 
 int pageStart(int packageType, int number)
 {
-    const bool isSearch =
-        packageType == TYPE_SEARCH_PHOTOS || packageType == TYPE_SEARCH_MORE_PHOTOS;
     const int index = number - 1;
-    const int block = isSearch ? index / paging::blockSize * paging::blockSize : 0;
+    const int block =
+        paging::isSearch(packageType) ? index / paging::blockSize * paging::blockSize : 0;
     return block + (index - block) / paging::pageSize * paging::pageSize + 1;
 }
 

@@ -4,6 +4,7 @@
 #include "data/imagetarget.h"
 #include "ui/detailstage.h"
 #include "ui/detailtexts.h"
+#include "ui/qimageslide.h"
 #include "ui/zoom.h"
 
 DetailPictures *DetailPictures::mInstance = nullptr;
@@ -158,5 +159,6 @@ void DetailPictures::stop()
     mSettle.stop();
     Download::mDetailLabelUrlHash.clear();
     Download::mDetailSmallLabelUrlHash.clear();
-    PhotoManager::cancelDownloadWaitingPhoto();
+    if (!QImageSlide::mIsShowing) // whose photos wait in the same line
+        PhotoManager::cancelDownloadWaitingPhoto();
 }

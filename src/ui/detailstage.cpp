@@ -4,6 +4,7 @@
 #include "common/ui/qprogressindicator.h"
 #include "common/ui/stretchedpicture.h"
 #include "common/ui/textfit.h"
+#include "ui/zoom.h"
 
 #include <QPainter>
 
@@ -16,18 +17,10 @@ constexpr int kMessageHeight = 20;   // pixels of the font
 constexpr QSize kArrow(48, 96);
 constexpr int kArrowInset = 24; // where no usual photo has its edge
 
-// Proportions that differ no more than rounding explains.
-bool areAlike(const QSize &a, const QSize &b)
-{
-    const qreal ratio =
-        qreal(a.width()) * b.height() / qMax(qreal(1), qreal(a.height()) * b.width());
-    return ratio > 0.95 && ratio < 1.05;
-}
-
 // The nearest place at which a picture's pixels fall on the screen's.
 QPointF onPixels(const QPainter &painter, const QPointF &point)
 {
-    const QTransform toDevice = painter.deviceTransform();
+    const QTransform &toDevice = painter.deviceTransform();
     return toDevice.inverted().map(QPointF(toDevice.map(point).toPoint()));
 }
 
@@ -127,7 +120,7 @@ QRect DetailStage::pictureArea() const
     const QSize room = size() - QSize(2 * kFrame, 2 * kFrame);
     QSize shown = (QSizeF(mPicture.size()) / mPicture.devicePixelRatioF()).toSize();
     if (mIsPreview) {
-        const bool useRecord = !mPhotoSize.isEmpty() && areAlike(mPhotoSize, mPicture.size());
+        const bool useRecord = zoom::areAlike(mPhotoSize, mPicture.size());
         shown = (useRecord ? mPhotoSize : mPicture.size()).scaled(room, Qt::KeepAspectRatio);
     }
     shown = shown.expandedTo(QSize(1, 1));

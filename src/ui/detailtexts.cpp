@@ -1,10 +1,10 @@
 #include "ui/detailtexts.h"
 
-#include <QVector>
+#include "base/texttable.h"
 
 namespace {
 
-const QVector<const char *> mDetailString = {
+const TextTable mDetailString = {
     "Zoom",
     "Info",
     "Full Screen",
@@ -27,7 +27,5 @@ const QVector<const char *> mDetailString = {
 
 QString DetailTexts::text(int index)
 {
-    if (index < 0 || index >= mDetailString.size())
-        return QStringLiteral("Unknown");
-    return QString::fromLatin1(mDetailString.at(index));
+    return textAt(&mDetailString, index);
 }

@@ -125,8 +125,7 @@ void FormScrollArea::updateFocus()
     if (!content() || content()->count() < 1)
         return;
     logLine("set foucs on the first photo in search page");
-    if (content()->setIndex(0))
-        content()->cell(0)->setFocus();
+    focusCell(0);
 }
 
 void FormScrollArea::focusInEvent(QFocusEvent *event)
@@ -218,9 +217,7 @@ void FormScrollArea::handleRed(GridOwner *screen, QKeyEvent *event)
     if (screen->isMainMenuHidden())
         return;
     screen->handleGridKey(event);
-    if (content()->setIndex(0))
-        content()->cell(0)->setFocus();
-    else
+    if (!focusCell(0))
         logCannotMove(DEVICE_RED_KEY);
 }
 
@@ -274,11 +271,13 @@ void FormScrollArea::moveFocus(const gridfocus::Step &step, GridOwner *screen, i
     }
 }
 
+// Where another page than the grid is shown by now, which has the focus, only the index moves.
 bool FormScrollArea::focusCell(int index)
 {
     if (!content()->setIndex(index))
         return false;
-    content()->cell(index)->setFocus();
+    if (isVisible())
+        content()->cell(index)->setFocus();
     return true;
 }
 

@@ -2,6 +2,7 @@
 
 #include "common/ui/remotekeys.h"
 #include "data/packageproperty.h"
+#include "ui/paging.h"
 
 #include <algorithm>
 
@@ -9,18 +10,10 @@ namespace gridfocus {
 
 namespace {
 
-constexpr int pageSize = 8;
-constexpr int blockSize = 100;
-
-bool isSearch(int type)
-{
-    return type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
-}
-
 bool startsLaterBlock(const Situation &at)
 {
     return at.packageType == TYPE_SEARCH_MORE_PHOTOS && at.startIndex != 1 &&
-           at.startIndex % blockSize == 1;
+           at.startIndex % paging::blockSize == 1;
 }
 
 Step pageUpTo(int target, const Situation &at)
@@ -41,12 +34,14 @@ Step right(const Situation &at)
 {
     if (at.index == at.count - 1)
         return {Move::PageDown, 0};
-    return {Move::Focus, at.index + 1, isSearch(at.packageType) ? Move::NextBlock : Move::Drop};
+    return {Move::Focus, at.index + 1,
+            paging::isSearch(at.packageType) ? Move::NextBlock : Move::Drop};
 }
 
 Step pageDown(const Situation &at)
 {
-    if (isSearch(at.packageType) && at.startIndex % blockSize + pageSize > at.records)
+    if (paging::isSearch(at.packageType) &&
+        at.startIndex % paging::blockSize + paging::pageSize > at.records)
         return {Move::NextBlock};
     return {Move::PageDown, 0};
 }
@@ -68,7 +63,7 @@ Step down(const Situation &at)
     int target = at.index + columns;
     if (target >= at.count)
         target = columns * (at.count / columns); // the first cell of the last row
-    return {Move::Focus, target, isSearch(at.packageType) ? Move::NextBlock : Move::Drop};
+    return {Move::Focus, target, paging::isSearch(at.packageType) ? Move::NextBlock : Move::Drop};
 }
 
 bool isInside(int top, const Rows &rows)

@@ -83,8 +83,3 @@ void HomeBars::showHints(const Hints &hints)
     }
     mShortcuts->showOnly(keys);
 }
-
-bool HomeBars::isKeyShown(int key) const
-{
-    return mShortcuts->isShown(key);
-}

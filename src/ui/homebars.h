@@ -27,7 +27,6 @@ public:
     void showHints(const Hints &hints);
     // The keys that lead somewhere on a page of the home screen.
     static Hints usefulKeys(const HomeState &state, HomePages::Page page, const Package *package);
-    bool isKeyShown(int key) const;
 
 private:
     InformationLine *mInformation;

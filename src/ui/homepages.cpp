@@ -1,5 +1,7 @@
 #include "ui/homepages.h"
 
+#include "base/log.h"
+#include "common/ui/popupoverlay.h"
 #include "network/systemconfig.h"
 #include "ui/contentpages.h"
 #include "ui/formscrollarea.h"
@@ -15,8 +17,9 @@ namespace {
 // Milliseconds after which a page that has not come counts as failed; 0: never.
 int pagePatience()
 {
-    return SystemConfig::value(QStringLiteral("Network/PageSeconds"), QStringLiteral("0")).toInt() *
-           1000;
+    constexpr int kMostSeconds = 24 * 60 * 60;
+    const int seconds = SystemConfig::value(QStringLiteral("Network/PageSeconds")).toInt();
+    return qBound(0, seconds, kMostSeconds) * 1000;
 }
 
 // A page with the search bar in its middle. The bar's size is the screen's business: it is wider
@@ -103,8 +106,15 @@ void HomePages::showFailure(ErrorCode code)
 
 void HomePages::takeFocus()
 {
-    if (!QImageSlide::mIsShowing) // whose keys they are
+    if (mayFocus())
         focusPage();
+}
+
+bool HomePages::mayFocus()
+{
+    if (QImageSlide::mIsShowing)
+        logLine("Do not focus on current widget casue QImageSlide is showing");
+    return !QImageSlide::mIsShowing && !PopupOverlay::holdsFocus();
 }
 
 void HomePages::focusPage()

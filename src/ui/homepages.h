@@ -31,6 +31,9 @@ public:
     // page it gives way to the failure page; without the key it stays.
     void showLoading();
     void showFailure(ErrorCode code);
+    // Whether the keys are the home screen's: not while the slide show is on the screen, nor while
+    // a pop-up waits for an answer.
+    static bool mayFocus();
     // Gives the focus to what the page shown has for it; a page without anything leaves it alone.
     void focusPage();
 

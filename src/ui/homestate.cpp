@@ -9,8 +9,7 @@ namespace {
 // Lists of which the service tells the total; the others come whole.
 bool hasFeedTotal(int type)
 {
-    return type == TYPE_FEATURED_PHOTOS || type == TYPE_SEARCH_PHOTOS ||
-           type == TYPE_SEARCH_MORE_PHOTOS;
+    return type == TYPE_FEATURED_PHOTOS || paging::isSearch(type);
 }
 
 } // namespace
@@ -161,7 +160,6 @@ bool HomeState::pageUp(int arg)
     if (!page.exists)
         return false;
     mIsPageDown = false;
-    mIndexInPage = page.indexInPage;
     mCurrentProperty.mStartIndex = page.startIndex;
     return true;
 }
@@ -175,7 +173,6 @@ bool HomeState::pageDown(int arg, const Package *package)
     if (!page.exists)
         return false;
     mIsPageDown = true;
-    mIndexInPage = page.indexInPage;
     mCurrentProperty.mStartIndex = page.startIndex;
     return true;
 }
@@ -244,8 +241,7 @@ int HomeState::firstNumber() const
 
 bool HomeState::isSearch() const
 {
-    const int type = mCurrentProperty.mType;
-    return type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
+    return paging::isSearch(mCurrentProperty.mType);
 }
 
 int HomeState::total(const Package *package) const
@@ -265,5 +261,5 @@ bool HomeState::isWholeList() const
 {
     const int type = mCurrentProperty.mType;
     return type == TYPE_ALBUM_LIST || type == TYPE_ALBUM_PHOTOS || type == TYPE_FAVORITE_PEOPLE ||
-           type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
+           isSearch();
 }

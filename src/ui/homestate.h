@@ -18,7 +18,6 @@ struct HomeState
     int mTotalPhotoNum = 0;           // the feed's total, of featured photos and searches
     int mPhotoDataCount = 0;          // the total in the information line
     int mPhotoIndexInTotal = 0;       // the number in the information line
-    int mIndexInPage = 0;             // of the record jumped to
     bool mIsPageDown = false;
     bool mIsReturnFromDetail = false;
     bool mCanPlay = false;      // a list has been shown

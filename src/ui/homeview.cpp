@@ -1,7 +1,6 @@
 #include "ui/homeview.h"
 
 #include "base/i18n.h"
-#include "base/log.h"
 #include "network/systemconfig.h"
 #include "ui/formscrollarea.h"
 #include "ui/formscrollwidget.h"
@@ -9,7 +8,6 @@
 #include "ui/homestate.h"
 #include "ui/homewidget.h"
 #include "ui/picturedetailwidget.h"
-#include "ui/qimageslide.h"
 #include "ui/upwidget.h"
 
 #include <QPaintEvent>
@@ -77,7 +75,7 @@ void HomeView::showList(const Package &package)
         return; // the list stays below it
     if (shown == 0) {
         mPages->show(HomePages::NoPhoto);
-        if (mayFocus())
+        if (HomePages::mayFocus())
             mTitleWidget->setFocus();
         return;
     }
@@ -110,16 +108,9 @@ void HomeView::scrollToTop()
     grid()->verticalScrollBar()->setValue(0);
 }
 
-bool HomeView::mayFocus()
-{
-    if (QImageSlide::mIsShowing)
-        logLine("Do not focus on current widget casue QImageSlide is showing");
-    return !QImageSlide::mIsShowing;
-}
-
 void HomeView::focusContent()
 {
-    if (!mayFocus())
+    if (!HomePages::mayFocus())
         return;
     mPages->focusPage();
     mTitleWidget->updateFocusMark();

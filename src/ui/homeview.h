@@ -41,8 +41,6 @@ public:
     void scrollToTop();
     // The content gets the focus, if anybody may have it.
     void focusContent();
-    // The keys belong to the slide show while it is on the screen.
-    static bool mayFocus();
 
     // The cell with the focus, for the information line.
     void moveTo(int cell, const Package *package);

@@ -6,6 +6,7 @@
 #include "ui/accountquestions.h"
 #include "ui/formscrollarea.h"
 #include "ui/listloader.h"
+#include "ui/paging.h"
 #include "ui/photopopups.h"
 #include "ui/picturedetailwidget.h"
 #include "ui/searchflow.h"
@@ -131,7 +132,7 @@ void HomeWidget::tryToShowCurrentPackage(PackageProperty &property)
         return;
     allPhotoNum = mState.total(mCurrentPackageData);
     pushPackageData();
-    if (mState.takeFirstCellWish() && mView.isShown(HomePages::Grid) && HomeView::mayFocus())
+    if (mState.takeFirstCellWish() && mView.isShown(HomePages::Grid) && HomePages::mayFocus())
         mView.grid()->updateFocus();
 }
 
@@ -143,10 +144,12 @@ void HomeWidget::pushPackageData()
         logLine("Error: pushPackageData package is NULL");
 }
 
-// After the cache may have let go of it.
+// After the cache may have let go of it, or the photo screen has gone on to further search results,
+// which are a list of their own.
 void HomeWidget::holdPackage()
 {
-    if (!mCurrentPackageData)
+    const int type = mState.mCurrentProperty.mType;
+    if (!mCurrentPackageData || mCurrentPackageData->mProperty.mType != type)
         mCurrentPackageData = mLoader->held();
 }
 
@@ -155,7 +158,7 @@ void HomeWidget::handleUpWidgetEnter(PackageProperty &property)
     logLine("enter HomeWidget::handleUpWidgetEnter()");
     const PackageProperty wanted = property; // may be the state's own, which changes
     const int type = wanted.mType;
-    const bool isSearch = type == TYPE_SEARCH_PHOTOS || type == TYPE_SEARCH_MORE_PHOTOS;
+    const bool isSearch = paging::isSearch(type);
     if (!isSearch && type != TYPE_FEATURED_PHOTOS && type != TYPE_ALBUM_LIST &&
         type != TYPE_FAVORITE_PEOPLE) {
         logLine("Wrong can not go here HomeWidget::handleUpWidgetEnter");
@@ -186,6 +189,15 @@ void HomeWidget::showEvent(QShowEvent *event)
     QWidget::showEvent(event);
     if (!mView.menu()->hasFocus())
         mView.focusContent();
+}
+
+// From a pop-up, below which another page than before is shown.
+void HomeWidget::focusInEvent(QFocusEvent *event)
+{
+    QWidget::focusInEvent(event);
+    mView.focusContent();
+    if (hasFocus())
+        mView.menu()->setFocus();
 }
 
 void HomeWidget::paintEvent(QPaintEvent *event)

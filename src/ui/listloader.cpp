@@ -8,6 +8,7 @@
 #include "ui/homepages.h"
 #include "ui/homestate.h"
 #include "ui/homewidget.h"
+#include "ui/qimageslide.h"
 #include "ui/screentexts.h"
 
 ListLoader::ListLoader(HomeState *state, HomePages *pages, AccountQuestions *questions,
@@ -24,12 +25,13 @@ void ListLoader::request()
     CellFiller::cancelThumbnails();
     emit started();
     mPages->showLoading();
-    tryToDownload(mState->mCurrentProperty);
+    tryToDownload();
 }
 
-void ListLoader::tryToDownload(PackageProperty property)
+void ListLoader::tryToDownload()
 {
-    if (PackageManager::getPackage(property)) {
+    PackageProperty property = mState->mCurrentProperty; // which changes when it has arrived
+    if (held()) {
         logLine("enter NULL != package");
         emit arrived(property);
         return;
@@ -48,11 +50,14 @@ void ListLoader::finished(PackageProperty &property, ErrorCode code)
         showFailure(code);
 }
 
-// A page refused, or a sign-in that has expired, may need another sign-in.
+// A page refused, or a sign-in that has expired, may need another sign-in. Nobody is asked below
+// the slide show: whoever leaves it has the page asked for again.
 void ListLoader::showFailure(ErrorCode code)
 {
     const bool isExpired = code == NET_FAILED && PackageManager::isSignInRefused();
     mPages->showFailure(isExpired ? NET_NOT_PERMITTED : code);
+    if (QImageSlide::mIsShowing)
+        return;
     if (isExpired)
         mQuestions->askAfterRefusal(ScreenTexts::question(ScreenTexts::SignInExpired));
     else if (code == NET_CONTENT_ERROR)
@@ -69,7 +74,7 @@ bool ListLoader::complete(const Package *held, const PackageProperty &arrivedPag
     }
     // Another page of the list may have come, without the one wanted.
     if (held || isOtherPage)
-        tryToDownload(wanted);
+        tryToDownload();
     else
         fetchAnew();
     return false;
@@ -83,7 +88,7 @@ void ListLoader::fetchAnew()
         PackageManager::removeCache(mState->mCurrentProperty);
         mState->restart();
         if (isBelow)
-            tryToDownload(mState->mCurrentProperty);
+            tryToDownload();
         else
             request();
     } else if (!isBelow) {
@@ -91,16 +96,7 @@ void ListLoader::fetchAnew()
     }
 }
 
-// One that begins later than the page wanted is dropped: only a page fetched ahead had come when
-// the pages before it had grown stale.
 Package *ListLoader::held()
 {
-    PackageProperty &wanted = mState->mCurrentProperty;
-    Package *package = cachedList(wanted);
-    const bool beginsLater = package && wanted.mType == TYPE_FEATURED_PHOTOS &&
-                             package->mProperty.mStartIndex > wanted.mStartIndex;
-    if (!beginsLater)
-        return package;
-    PackageManager::removeCache(wanted);
-    return nullptr;
+    return cachedList(mState->mCurrentProperty);
 }

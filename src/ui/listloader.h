@@ -41,7 +41,7 @@ signals:
     void started();
 
 private:
-    void tryToDownload(PackageProperty property);
+    void tryToDownload();
     void fetchAnew();
     void showFailure(ErrorCode code);
 

@@ -1,6 +1,7 @@
 #include "ui/noteinput.h"
 
 #include "base/i18n.h"
+#include "common/ui/closelater.h"
 #include "common/ui/qpopupform.h"
 #include "common/ui/qtoastwidget.h"
 #include "data/posthelper.h"
@@ -68,11 +69,7 @@ void NoteInput::open(int kind, const PackageProperty &photo)
 
 void NoteInput::returnFromInputDialog()
 {
-    if (!mKeyboard)
-        return;
-    mKeyboard->hide();
-    mKeyboard->deleteLater();
-    mKeyboard.clear();
+    closeLater(mKeyboard);
 }
 
 void NoteInput::returnFromInputDialogWithString(QString text)
@@ -85,14 +82,13 @@ void NoteInput::returnFromInputDialogWithString(QString text)
 
 void NoteInput::postCommentOrTag(QString text)
 {
-    auto *notice = new SendingNotice(mScreen);
+    QPointer<SendingNotice> notice(new SendingNotice(mScreen));
     notice->show();
     const QPointer<NoteInput> self(this);
     const ErrorCode code = send(text);
+    closeLater(notice);
     if (!self)
         return; // the screen went while it waited
-    notice->hide();
-    notice->deleteLater();
     if (code == NET_SUCCESS)
         returnFromInputDialog();
     if (code != NET_CANCELED)

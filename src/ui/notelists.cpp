@@ -2,6 +2,7 @@
 
 #include "accountmanager/accountmanagerhelper.h"
 #include "base/i18n.h"
+#include "common/ui/closelater.h"
 #include "common/ui/qconfirm.h"
 #include "common/ui/qpopupdialog.h"
 #include "common/ui/qpopupform.h"
@@ -13,6 +14,8 @@
 #include "ui/picturedetailwidget.h"
 #include "ui/screentexts.h"
 #include "ui/sendingnotice.h"
+
+#include <QLocale>
 
 #include <algorithm>
 
@@ -29,7 +32,8 @@ bool isOwn(const Comment &comment, const PackageProperty &photo, bool isSelfPhot
 QString headingOf(const Comment &comment)
 {
     const QString name = comment.nickname().isEmpty() ? comment.userId() : comment.nickname();
-    const QString when = comment.createdTime().toString(QStringLiteral("d MMM yyyy, hh:mm"));
+    const QString when =
+        QLocale::c().toString(comment.createdTime(), QStringLiteral("d MMM yyyy, hh:mm"));
     const QString who = shownText(name).simplified();
     return when.isEmpty() ? who : who + QStringLiteral("   ") + when;
 }
@@ -76,12 +80,8 @@ void NoteLists::open(const PackageProperty &property, bool isSelfPhoto, const QS
 
 void NoteLists::close()
 {
-    if (!mForm)
-        return;
-    mForm->hide();
-    mForm->deleteLater();
-    mForm.clear();
-    mList.clear();
+    if (closeLater(mForm))
+        mList.clear();
 }
 
 void NoteLists::returnFromTag()
@@ -173,9 +173,7 @@ void NoteLists::askToDelete(int index)
         return;
     const QString key = mKeys.at(index);
     const auto answer = [this, key](bool confirms) {
-        mQuestion->hide();
-        mQuestion->deleteLater();
-        mQuestion.clear();
+        closeLater(mQuestion);
         const int at = mKeys.indexOf(key); // the list may have changed meanwhile
         if (confirms && at >= 0)
             runDeletion(at);
@@ -200,17 +198,13 @@ void NoteLists::askToDelete(int index)
 
 void NoteLists::runDeletion(int index)
 {
-    auto *notice = new SendingNotice(mScreen);
+    QPointer<SendingNotice> notice(new SendingNotice(mScreen));
     notice->show();
-    const QPointer<NoteLists> self(this);
     if (isTagList())
         updateTagList(index);
     else
         deleteComment(index);
-    if (!self)
-        return; // the screen went while it waited
-    notice->hide();
-    notice->deleteLater();
+    closeLater(notice); // gone already, when the screen went while it waited
 }
 
 void NoteLists::updateTagList(int index)

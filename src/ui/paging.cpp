@@ -10,11 +10,15 @@ Page pageOf(int record)
 {
     if (record < 1)
         return {};
-    const int indexInPage = (record - 1) % pageSize;
-    return {true, record - indexInPage, indexInPage};
+    return {true, record - (record - 1) % pageSize};
 }
 
 } // namespace
+
+bool isSearch(int packageType)
+{
+    return packageType == TYPE_SEARCH_PHOTOS || packageType == TYPE_SEARCH_MORE_PHOTOS;
+}
 
 Page pageUp(int startIndex, int arg)
 {
@@ -22,7 +26,7 @@ Page pageUp(int startIndex, int arg)
         return pageOf(arg);
     if (startIndex <= pageSize)
         return {};
-    return {true, startIndex - pageSize, 0};
+    return {true, startIndex - pageSize};
 }
 
 Page pageDown(int startIndex, int total, int arg)
@@ -31,7 +35,7 @@ Page pageDown(int startIndex, int total, int arg)
         return pageOf(arg);
     if (startIndex + pageSize > total)
         return {};
-    return {true, startIndex + pageSize, 0};
+    return {true, startIndex + pageSize};
 }
 
 int recordIndex(int packageType, int startIndex, int cell)

@@ -7,14 +7,16 @@ namespace paging {
 constexpr int pageSize = 8;
 constexpr int blockSize = 100; // results that one search fetches
 
+// Whether lists of that PackageType are search results, which are cut into blocks.
+bool isSearch(int packageType);
+
 // Stands for one page back or on, in place of a record number.
 constexpr int onePage = -1;
 
 struct Page
 {
     bool exists = false;
-    int startIndex = 1;  // of its first record
-    int indexInPage = 0; // of the record jumped to
+    int startIndex = 1; // of its first record
 };
 
 // The page before or after the one at startIndex, or the page of a record number.

@@ -2,7 +2,6 @@
 
 #include "base/log.h"
 #include "platform/ipcthread.h"
-#include "ui/paging.h"
 #include "ui/slidemarks.h"
 #include "ui/slidephotos.h"
 #include "ui/sliderecords.h"
@@ -30,15 +29,13 @@ int turnLength(int seconds)
 QImageSlide::QImageSlide(QWidget *parent, playorder::RandomSource random)
     : QWidget(parent)
     , mOptions(SlideOptions::configured())
+    , mWalk(mOptions, std::move(random))
     , mSpeed(SlideSetting::SlideSpeed)
-    , mMode(SlideSetting::SlideMode)
-    , mPlayArray(std::move(random))
     , mLabel(new SlideLabel(mOptions, this))
     , mMarks(new SlideMarks(mOptions.marksSeconds, this))
     , mPhotos(new SlidePhotos(mLabel, mOptions, this))
 {
     setFocusPolicy(Qt::StrongFocus);
-    mPlayArray.setRound(mOptions.loop);
     connect(&mPlayTimer, &QTimer::timeout, this, [this] { update(); });
     connect(mPhotos, &SlidePhotos::arrived, this, &QImageSlide::takeTurnHeld);
     if (IpcThread *thread = IpcThread::getInstance())
@@ -68,20 +65,16 @@ void QImageSlide::startSlidePlay(int index)
 
 void QImageSlide::initParam(bool isPlay, int index)
 {
-    mPlayArray.clear();
     mPhotos->clear();
-    mIndex = index;
     mIsShowing = true;
     mIsHolding = mIsListLost = false;
     mBlockWanted = 0;
     mSpeed = SlideSetting::SlideSpeed;
-    mMode = SlideSetting::SlideMode;
     placeParts();
     setFocus();
     mMarks->wake();
     setPlaying(isPlay);
-    renewPlayArray(0);
-    mPlayArray.reorder(mMode);
+    mWalk.start(index, SlideSetting::SlideMode);
     update(false);
 }
 
@@ -112,34 +105,26 @@ void QImageSlide::updatePlayState(bool isPlay)
     emit signalUpdatePlaybackinfo(kStatusUpdate, isPlay ? Started : Stopped, 0, 0);
 }
 
-void QImageSlide::renewPlayArray(int refreshMode)
-{
-    logLine("enter QImageSlide::renewPlayArray, refreshMode = ", refreshMode);
-    const int dataCount = sliderecords::count();
-    if (mPlayArray.size() > dataCount) {
-        logLine("Warning: record array more than data count");
-        mPlayArray.shrink(dataCount, mMode);
-    }
-    mPlayArray.extend(dataCount, refreshMode ? mMode : playorder::Normal);
-}
-
 void QImageSlide::update(bool isUpdateIndex)
 {
     logLine("enter QImageSlide::update()");
     if (waitsForList(isUpdateIndex))
         return;
     if (mIsPlay && isUpdateIndex) {
-        if (mPlayArray.size() != sliderecords::count())
-            renewPlayArray(1); // what comes next is known only then
+        if (mWalk.playArray().size() != sliderecords::count())
+            mWalk.renew(1); // what comes next is known only then
         if (holdsOn())
             return;
         advance();
     }
     mIsHolding = false;
     refreshDatas();
-    if (!clampIndex())
+    if (!mWalk.clamp() && mIsPlay) {
+        leave(); // the play is over
         return;
-    renewPlayArray(1);
+    }
+    mMarks->setArrows(!mWalk.isFirst(), !mWalk.isLast());
+    mWalk.renew(1);
     showCurrent(isUpdateIndex ? SlideLabel::Change::Fade : SlideLabel::Change::Cut);
     prefetch();
 }
@@ -148,13 +133,11 @@ void QImageSlide::update(bool isUpdateIndex)
 // this one has been played, again at each turn: the network may come back.
 bool QImageSlide::waitsForList(bool isUpdateIndex)
 {
-    const int count = sliderecords::count();
-    const bool isOver = mIsPlay && isUpdateIndex && count > 0 && mIndex + 1 >= count;
+    const bool isOver = mIsPlay && isUpdateIndex && sliderecords::count() > 0 && mWalk.isLast();
     if (isOver && mOptions.wholeList && mBlockWanted == 0)
         mBlockWanted = sliderecords::nextBlock(mOptions.loop);
     if (mBlockWanted > 0) {
-        mIndex = -1; // the next turn's is its first
-        mPlayArray.clear();
+        mWalk.restart();
         emit blockWanted(mBlockWanted);
         return true;
     }
@@ -175,7 +158,7 @@ void QImageSlide::takeList()
     mIsListLost = false;
     mBlockWanted = 0;
     if (isNextTurn) {
-        renewPlayArray(1);
+        mWalk.renew(1);
         prefetch();
         restartTimer();
     }
@@ -187,9 +170,8 @@ bool QImageSlide::holdsOn()
 {
     if (!mOptions.waitForPhoto || mIsHolding)
         return false;
-    const bool isPageAwaited =
-        mIndex + 1 >= sliderecords::count() && mOptions.wholeList && sliderecords::isMoreToCome();
-    const QString next = urlAt(mIndex + 1);
+    const bool isPageAwaited = mWalk.isLast() && mOptions.wholeList && sliderecords::isMoreToCome();
+    const QString next = mWalk.url(1);
     mIsHolding = isPageAwaited || !(next.isEmpty() || mPhotos->isSettled(next));
     if (mIsHolding)
         prefetch();
@@ -198,7 +180,7 @@ bool QImageSlide::holdsOn()
 
 void QImageSlide::takeTurnHeld(const QString &url)
 {
-    if (!mIsHolding || !mIsPlay || url != urlAt(mIndex + 1))
+    if (!mIsHolding || !mIsPlay || url != mWalk.url(1))
         return;
     update(true);
     restartTimer();
@@ -206,51 +188,23 @@ void QImageSlide::takeTurnHeld(const QString &url)
 
 void QImageSlide::advance()
 {
-    const int count = mPlayArray.size();
-    ++mIndex;
-    for (int skipped = 1; skipped < count && isSkipped(mIndex); ++skipped)
-        ++mIndex;
-    if (mOptions.loop && count > 0 && mIndex >= count) {
-        mPlayArray.startOver(mMode);
-        mIndex %= count;
-    }
-}
-
-bool QImageSlide::isSkipped(int position) const
-{
-    return mOptions.skipUnreadable && mPhotos->hasFailed(urlAt(position));
+    mWalk.advance(
+        [this](const QString &url) { return mOptions.skipUnreadable && mPhotos->hasFailed(url); });
 }
 
 void QImageSlide::refreshDatas()
 {
-    const int ahead = mIndex + paging::pageSize;
-    const int total = sliderecords::total();
-    const bool isMoreToCome =
-        mOptions.wholeList ? sliderecords::isMoreToCome() : ahead < total - paging::pageSize;
-    if (mIndex < paging::pageSize || ahead < sliderecords::count() || !isMoreToCome)
+    if (!mWalk.isPageWanted())
         return;
-    logLine("QImageSlide::refreshDatas() notify to load next page datas, mIndex=", mIndex);
-    emit handleSlidePageDown(mIndex + 1);
-}
-
-// Moves the position into the list. False when the play was over and the player has left.
-bool QImageSlide::clampIndex()
-{
-    const int count = sliderecords::count();
-    const bool isOver = mIndex >= count;
-    mIndex = qMax(0, qMin(mIndex, count - 1));
-    if (isOver && mIsPlay) {
-        leave();
-        return false;
-    }
-    mMarks->setArrows(mIndex > 0, mIndex + 1 < count);
-    return true;
+    const int index = mWalk.position();
+    logLine("QImageSlide::refreshDatas() notify to load next page datas, mIndex=", index);
+    emit handleSlidePageDown(index + 1);
 }
 
 void QImageSlide::showCurrent(SlideLabel::Change change)
 {
     mMarks->setPlaying(mIsPlay);
-    const OrvalaPhoto *photo = sliderecords::photo(mPlayArray.at(mIndex));
+    const OrvalaPhoto *photo = mWalk.photo();
     if (!photo) {
         mLabel->setPlaceholder(QStringLiteral(":/res/image_not_download.png"));
         return;
@@ -261,18 +215,7 @@ void QImageSlide::showCurrent(SlideLabel::Change change)
 
 void QImageSlide::prefetch()
 {
-    QStringList urls;
-    for (int i = 1; i <= mOptions.ahead; ++i) {
-        const QString url = urlAt(mIndex + i);
-        if (!url.isEmpty() && !urls.contains(url))
-            urls << url;
-    }
-    mPhotos->want(urls);
-}
-
-QString QImageSlide::urlAt(int position) const
-{
-    return sliderecords::url(mPlayArray.at(position));
+    mPhotos->want(mWalk.urlsAhead());
 }
 
 void QImageSlide::leave()
@@ -282,7 +225,6 @@ void QImageSlide::leave()
     setPlaying(false);
     mPhotos->clear();
     hide();
-    mIndex = qMax(0, mIndex);
     if (mSetting) {
         logLine("delete mSetting");
         mSetting->hide();
@@ -291,7 +233,8 @@ void QImageSlide::leave()
     }
     if (wasPlaying)
         updatePlayState(false);
-    const int shown = mOptions.returnToPhoto ? mPlayArray.at(mIndex) : mIndex;
+    const int index = qMax(0, mWalk.position());
+    const int shown = mOptions.returnToPhoto ? mWalk.playArray().at(index) : index;
     emit returnImageSlideUpdate(qMax(0, shown) + 1);
 }
 

@@ -1,8 +1,8 @@
 #pragma once
 
-#include "ui/playorder.h"
 #include "ui/slidelabel.h"
 #include "ui/slideoptions.h"
+#include "ui/slidewalk.h"
 
 #include <QTimer>
 #include <QWidget>
@@ -15,8 +15,8 @@ class SlideSetting;
 // stepped by the remote or played by a timer, in the order that the settings ask for. As the end of
 // the records comes near it asks for the next page, whose records join the show.
 //
-//   timer, keys --> update(): position, next page, arrows --> showCurrent() --> SlidePhotos -->
-//   label
+//   timer, keys --> update(): position, next page, arrows
+//                     --> showCurrent() --> SlidePhotos --> label
 class QImageSlide : public QWidget
 {
     Q_OBJECT
@@ -33,10 +33,10 @@ public:
     void startSlideShow(int index);
     void startSlidePlay(int index);
 
-    int position() const { return mIndex; }
+    int position() const { return mWalk.position(); }
     bool isPlaying() const { return mIsPlay; }
     int interval() const { return mPlayTimer.interval(); } // milliseconds
-    const PlayArray &playArray() const { return mPlayArray; }
+    const PlayArray &playArray() const { return mWalk.playArray(); }
     SlideLabel *label() const { return mLabel; }
 
 public slots:
@@ -68,17 +68,13 @@ protected:
 private:
     void initParam(bool isPlay, int index);
     void placeParts();
-    void renewPlayArray(int refreshMode);
-    void refreshDatas();
-    bool clampIndex();
     void advance();
+    void refreshDatas();
     bool holdsOn();
     bool waitsForList(bool isUpdateIndex);
-    bool isSkipped(int position) const;
     void takeTurnHeld(const QString &url);
     void showCurrent(SlideLabel::Change change);
     void prefetch();
-    QString urlAt(int position) const;
 
     bool isKeyAnswered() const;
     void play(bool isPlay);
@@ -90,14 +86,12 @@ private:
     void leave();
 
     const SlideOptions mOptions;
-    int mIndex = 0; // position in the play array
+    SlideWalk mWalk;
     bool mIsPlay = false;
     bool mIsHolding = false; // a turn is over, and the next photo is waited for
     bool mIsListLost = false;
     int mBlockWanted = 0; // its first record; 0: the block that is there
     int mSpeed;           // seconds
-    int mMode;
-    PlayArray mPlayArray;
     QTimer mPlayTimer;
     SlideLabel *mLabel;
     SlideMarks *mMarks;

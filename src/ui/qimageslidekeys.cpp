@@ -69,19 +69,19 @@ void QImageSlide::play(bool isPlay)
 // Below 0 as well, deliberately: the update puts the position right.
 void QImageSlide::stepBack()
 {
-    logLine("{QImageSlide::keyPressEvent} mIndex = ", mIndex);
-    if (mIndex == 0)
+    logLine("{QImageSlide::keyPressEvent} mIndex = ", mWalk.position());
+    if (mWalk.position() == 0)
         logLine("{QImageSlide::keyPressEvent} mIndex is 0, return here......");
-    --mIndex;
+    mWalk.step(-1);
     update(false);
     restartTimer();
 }
 
 void QImageSlide::stepOn()
 {
-    if (mIndex >= sliderecords::count() - 1)
+    if (mWalk.isLast())
         return;
-    ++mIndex;
+    mWalk.step(1);
     update(false);
     restartTimer();
 }
@@ -105,11 +105,9 @@ void QImageSlide::saveSetting()
         logLine("Error: setting instance is not created!!");
         return;
     }
-    mMode = mSetting->mode();
-    mPlayArray.reorder(mMode);
-    mSpeed = mSetting->speed();
-    SlideSetting::SlideMode = mMode;
-    SlideSetting::SlideSpeed = mSpeed;
+    mWalk.setMode(mSetting->mode());
+    SlideSetting::SlideMode = mSetting->mode();
+    SlideSetting::SlideSpeed = mSetting->speed();
     prefetch(); // what comes next is another photo now
     closeSetting();
 }

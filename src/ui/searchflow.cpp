@@ -1,6 +1,7 @@
 #include "ui/searchflow.h"
 
 #include "base/log.h"
+#include "common/ui/closelater.h"
 #include "common/ui/qpopupform.h"
 #include "data/packagemanager.h"
 #include "ui/cellfiller.h"
@@ -47,14 +48,14 @@ void SearchFlow::showInputCommentDialog()
     mKeyboard = new QPopUpForm(mScreen);
     mKeyboard->initForm(QPopUpForm::POPUP_FORM_SEARCH_INPUT, mPages->searchBar()->text());
     connect(mKeyboard, &QPopUpForm::editFinished, this, &SearchFlow::takeWords);
-    connect(mKeyboard, &QPopUpForm::returnPopUpForm, mKeyboard, &QObject::deleteLater);
+    connect(mKeyboard, &QPopUpForm::returnPopUpForm, this, [this] { closeLater(mKeyboard); });
     mKeyboard->show();
 }
 
 void SearchFlow::takeWords(const QString &text)
 {
     mPages->searchBar()->setText(text.simplified());
-    mKeyboard->deleteLater();
+    closeLater(mKeyboard);
 }
 
 void SearchFlow::handleStartSearch(QString text)

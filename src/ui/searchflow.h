@@ -11,8 +11,7 @@ struct HomeState;
 // Searching on the home screen: the bar, the keyboard for its words, and the blocks of results.
 //
 //   open() -> bar -> showInputCommentDialog() -> words -> handleStartSearch() -> resultsWanted()
-//                                    backToBar() <- Return          changeBlock() ->
-//                                    resultsWanted()
+//   Return -> backToBar()         edge of a block -> changeBlock() -> resultsWanted()
 class SearchFlow : public QObject
 {
     Q_OBJECT

@@ -17,8 +17,7 @@ struct SlideOptions
     SlideCorner clock = SlideCorner::None;
     int marksSeconds = 0; // "MarksSeconds": arrows and indicators hide when no key came for so long
     int ahead = 1;        // "Ahead": photos fetched before their time
-    bool sharpen =
-        false; // "Sharpen": a thumbnail shown in a photo's place is replaced by the photo
+    bool sharpen = false; // "Sharpen": the photo replaces its thumbnail when it comes
     bool waitForPhoto = false;   // "WaitForPhoto": a photo stays until the next has come, for up to
                                  // a second turn
     bool loop = false;           // "Loop": after the last photo the first one follows

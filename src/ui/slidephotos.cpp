@@ -95,10 +95,8 @@ SlidePicture SlidePhotos::prepared(const QString &url)
         return {};
     ScaledPhoto scaled(mLabel->imageSize());
     Download::showPicture(&scaled, *photo);
-    const SlidePicture slide =
-        makeSlide(scaled.picture(), mLabel->imageSize(), mOptions.blurredFill);
-    mPrepared.insert(url, slide);
-    return slide;
+    return *mPrepared.insert(
+        url, makeSlide(scaled.picture(), mLabel->imageSize(), mOptions.blurredFill));
 }
 
 bool SlidePhotos::isThere(const QString &url) const

@@ -69,7 +69,7 @@ QString caption(const OrvalaPhoto &photo)
 
 QString date(const OrvalaPhoto &photo)
 {
-    return QLocale().toString(photo.published().date(), QStringLiteral("d MMMM yyyy"));
+    return QLocale::c().toString(photo.published().date(), QStringLiteral("d MMMM yyyy"));
 }
 
 } // namespace sliderecords

@@ -24,7 +24,6 @@ public:
     void load();
     int mode() const;
     int speed() const;
-    int focusIndex() const { return mFocusIndex; }
 
 signals:
     void clickConfirm();

@@ -81,7 +81,8 @@ TitleIcon::TitleIcon(const QString &text, bool signOut, QWidget *parent)
     setFont(entryFont(font(), signOut));
     setLook(Look::Normal);
     setFixedHeight(int(fontMetrics().height() * 2.6));
-    setFixedWidth(int(SystemConfig::mScreen_Width / 2 * 0.26));
+    const int half = SystemConfig::mScreen_Width / 2;
+    setFixedWidth(int(half * 0.26));
     setAlignment(Qt::AlignCenter);
     setWordWrap(false);
 }

@@ -120,15 +120,10 @@ void UpWidget::returnToHome()
 
 void UpWidget::cancelSignOut()
 {
-    if (mFocus == SignOutEntry)
-        takeSelectionBack();
-    restyle();
-}
-
-void UpWidget::takeSelectionBack()
-{
-    mPreviousFocus = mFocus;
-    mFocus = mSelected = mPreviousSelected;
+    if (mFocus == SignOutEntry) {
+        mPreviousFocus = mFocus;
+        mFocus = mSelected = mPreviousSelected;
+    }
     restyle();
 }
 

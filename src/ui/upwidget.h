@@ -29,19 +29,13 @@ public:
 
     // Takes the focus and asks for the featured photos.
     void returnToHome();
-    // Takes mark and selection back from the sign-out entry.
+    // Takes mark and selection back from the sign-out entry, to the one selected before it.
     void cancelSignOut();
-
-    // Puts mark and selection back on the entry that was selected before the last Select, when the
-    // home screen did not follow it.
-    void takeSelectionBack();
 
     // Shows whether the bar has the focus, which it counts as having until it first loses it.
     void updateFocusMark();
 
-    int focusIndex() const { return mFocus; }
-    int selectedIndex() const { return mSelected; }
-    const TitleIcon *entry(int index) const { return mEntries.at(index); }
+    int focusIndex() const { return mFocus; } // of the entry with the mark
 
 public slots:
     void handleHomeEnterEvent();

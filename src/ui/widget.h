@@ -9,8 +9,9 @@ class QStackedLayout;
 // The personal page: what is shown from sign-in to sign-out. Stacks the home screen and the slide
 // show's player, and hands from one to the other.
 //
-//   home screen -- slideShow, slidePlay --> player -- page wanted --> home screen -- records -->
-//   player player -- returnImageSlideUpdate --> home screen, with that record selected
+//   home screen -- slideShow, slidePlay --> player
+//   player -- page wanted --> home screen -- records --> player
+//   player -- returnImageSlideUpdate --> home screen, with that record selected
 class Widget : public QWidget
 {
     Q_OBJECT

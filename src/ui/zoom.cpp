@@ -14,6 +14,11 @@ constexpr qreal kMost = 64;
 constexpr qreal kPanStep = 1.0 / 3; // of the view
 constexpr int kBytesPerPixel = 4;
 
+bool isNear(int larger, int smaller)
+{
+    return larger - smaller <= std::max(1, smaller / 20);
+}
+
 qreal nearestOnAxis(qreal centre, qreal drawn, qreal view)
 {
     if (drawn <= view)
@@ -23,6 +28,14 @@ qreal nearestOnAxis(qreal centre, qreal drawn, qreal view)
 }
 
 } // namespace
+
+bool areAlike(const QSize &photo, const QSize &picture)
+{
+    if (photo.isEmpty() || picture.isEmpty())
+        return false;
+    const QSize whole = photo.scaled(picture, Qt::KeepAspectRatioByExpanding);
+    return isNear(whole.width(), picture.width()) && isNear(whole.height(), picture.height());
+}
 
 QSizeF fittedSize(const QSize &photo, const QSizeF &view)
 {

@@ -11,6 +11,10 @@
 // view; a centre is the point of the photo in the middle of the view, from 0 to 1 on both axes.
 namespace zoom {
 
+// Whether a photo's size and that of a smaller picture have the same proportions, but for rounding;
+// never for an empty size.
+bool areAlike(const QSize &photo, const QSize &picture);
+
 // The photo's size as it just fits the view.
 QSizeF fittedSize(const QSize &photo, const QSizeF &view);
 

@@ -31,7 +31,7 @@ ZoomView::ZoomView(QWidget *parent)
 
 void ZoomView::open(const QPixmap &picture, const QSize &photo)
 {
-    mPhotoSize = photo.isEmpty() ? picture.size() : photo;
+    mPhotoSize = zoom::areAlike(photo, picture.size()) ? photo : picture.size();
     mFitted = zoom::fittedSize(mPhotoSize, size());
     mFactors = zoom::factors(mFitted, size());
     mCentre = QPointF(0.5, 0.5);

@@ -17,7 +17,8 @@ class ZoomView : public QWidget, public ImageTarget
 public:
     explicit ZoomView(QWidget *parent = nullptr);
 
-    // Shows the picture at the first step. The size is that of the full-size photo.
+    // Shows the picture at the first step. The size is that of the full-size photo, as its record
+    // has it: one with other proportions than the picture's is not believed.
     void open(const QPixmap &picture, const QSize &photo);
     void dismiss();
 

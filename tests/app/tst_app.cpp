@@ -2,15 +2,14 @@
 #include "app/mainwidget.h"
 #include "common/ui/qpopupdialog.h"
 #include "common/ui/remotekeys.h"
-#include "network/systemconfig.h"
 #include "platform/devicestate.h"
 #include "platform/ipc.h"
 #include "platform/ipcthread.h"
 #include "support/logcapture.h"
+#include "support/testconfig.h"
 
 #include <QKeyEvent>
 #include <QLabel>
-#include <QSettings>
 #include <QSignalSpy>
 #include <QTemporaryDir>
 #include <QTest>
@@ -45,115 +44,89 @@ class TestApp : public QObject
     Q_OBJECT
 
 private slots:
-    void initTestCase();
-    void init();
-    void cleanup();
-    void routesKeysToTheDialog();
-    void leavesOnlyForTheShell();
-    void tellsOfTheCable();
-    void replacesTheStatusDialog();
+    void initTestCase()
+    {
+        mConfig.write("[DBPath]\nDBPath=" + mFolder.filePath("accounts.db").toUtf8());
+        netcommon::Ipc::setSocketPath(mFolder.filePath("no-shell").toStdString());
+    }
+
+    void init()
+    {
+        mMain = std::make_unique<MainWidget>();
+        mMain->resize(1280, 720);
+        mMain->show();
+    }
+
+    void cleanup() { mMain.reset(); }
+
+    void routesKeysToTheDialog()
+    {
+        KeyWidget receiver;
+        auto dialog = std::make_unique<KeyWidget>();
+        QVERIFY(!press(&receiver, DEVICE_UP_KEY)); // taken, and yet reported as not
+        MainApplication::setDialog(dialog.get(), true);
+        QVERIFY(press(&receiver, DEVICE_DOWN_KEY));
+        QVERIFY(press(dialog.get(), DEVICE_LEFT_KEY));
+        MainApplication::setDialog(dialog.get(), false);
+        press(&receiver, DEVICE_RIGHT_KEY);
+        QCOMPARE(dialog->keys, QList<int>({DEVICE_DOWN_KEY, DEVICE_LEFT_KEY}));
+        QCOMPARE(receiver.keys, QList<int>({DEVICE_UP_KEY, DEVICE_RIGHT_KEY}));
+    }
+
+    void leavesOnlyForTheShell()
+    {
+        QSignalSpy answers(mMain.get(), &MainWidget::signalResponseParent);
+        bool stayed = false;
+        QTimer::singleShot(0, mMain.get(), [&] { mMain->exitOrvala(false, true); });
+        QTimer::singleShot(1, mMain.get(), [&] {
+            stayed = answers.isEmpty();
+            mMain->exitOrvala(true, false);
+        });
+        QCOMPARE(QApplication::exec(), 0);
+        QVERIFY(stayed);
+        QCOMPARE(answers.value(0), QVariantList({2}));
+    }
+
+    void tellsOfTheCable()
+    {
+        char name[] = "eth0";
+        const LogCapture log;
+        for (int event : {1, 0, 1, 2}) {
+            std::thread([&name, event] {
+                MainWidget::NetworkStatusNotify(name, _NETWORK_EVENT_T(event));
+            }).join();
+            QTRY_COMPARE(NetworkCableStatus, event != 1);
+        }
+        QCOMPARE(log.lines().count("Notifycation: Network cable eth0 has plug out.\n"), 2);
+        QCOMPARE(log.lines().count("Notifycation: Network cable eth0 has plug in.\n"), 2);
+    }
+
+    void replacesTheStatusDialog()
+    {
+        const auto shows = [this](const QString &text) {
+            for (const QLabel *label : dialogs().first()->findChildren<QLabel *>()) {
+                if (label->text() == text)
+                    return true;
+            }
+            return false;
+        };
+        mMain->handleCableStatusChange(false);
+        QVERIFY(shows(QStringLiteral("Error")));
+        mMain->handleCableStatusChange(true);
+        QCOMPARE(dialogs().size(), 1);
+        QVERIFY(shows(QStringLiteral("Notification")));
+        QVERIFY(dialogs().first()->isVisible());
+        press(mMain.get(), DEVICE_SELECT_KEY);
+        QVERIFY(dialogs().isEmpty());
+    }
 
 private:
     QList<QPopupDialog *> dialogs() const { return mMain->findChildren<QPopupDialog *>(); }
 
+    TestConfig mConfig;
     QTemporaryDir mFolder;
     std::unique_ptr<MainWidget> mMain;
 };
-
-void TestApp::initTestCase()
-{
-    QSettings settings(mFolder.filePath("config.ini"), QSettings::IniFormat);
-    settings.setValue("DBPath/DBPath", mFolder.filePath("accounts.db"));
-    settings.sync();
-    SystemConfig::setConfigFile(settings.fileName());
-    SystemConfig::mScreen_Width = 1280;
-    SystemConfig::mScreen_Height = 720;
-    netcommon::Ipc::setSocketPath(mFolder.filePath("no-shell").toStdString());
-}
-
-void TestApp::init()
-{
-    mMain = std::make_unique<MainWidget>();
-    mMain->resize(1280, 720);
-    mMain->show();
-}
-
-void TestApp::cleanup()
-{
-    mMain.reset();
-}
-
-void TestApp::routesKeysToTheDialog()
-{
-    KeyWidget receiver;
-    auto dialog = std::make_unique<KeyWidget>();
-    QVERIFY(!press(&receiver, DEVICE_UP_KEY)); // taken, and yet reported as not
-    MainApplication::setDialog(dialog.get(), true);
-    QVERIFY(press(&receiver, DEVICE_DOWN_KEY));
-    QVERIFY(press(dialog.get(), DEVICE_LEFT_KEY));
-    MainApplication::setDialog(dialog.get(), false);
-    press(&receiver, DEVICE_RIGHT_KEY);
-    QCOMPARE(dialog->keys, QList<int>({DEVICE_DOWN_KEY, DEVICE_LEFT_KEY}));
-    QCOMPARE(receiver.keys, QList<int>({DEVICE_UP_KEY, DEVICE_RIGHT_KEY}));
-}
-
-void TestApp::leavesOnlyForTheShell()
-{
-    disconnect(mMain.get(), &MainWidget::signalResponseParent, nullptr, nullptr);
-    QSignalSpy answers(mMain.get(), &MainWidget::signalResponseParent);
-    QEventLoop loop;
-    bool stayed = false;
-    QTimer::singleShot(0, mMain.get(), [&] {
-        mMain->exitOrvala(false, true);
-        QTimer::singleShot(0, mMain.get(), [&] {
-            stayed = true;
-            mMain->exitOrvala(true, false);
-        });
-    });
-    QCOMPARE(loop.exec(), 0);
-    QVERIFY(stayed);
-    QCOMPARE(answers.size(), 1);
-    QCOMPARE(answers.first().first().toInt(), 2);
-}
-
-void TestApp::tellsOfTheCable()
-{
-    char name[] = "eth0";
-    const LogCapture log;
-    for (int event : {1, 0, 1, 2}) {
-        std::thread([&name, event] {
-            MainWidget::NetworkStatusNotify(name, _NETWORK_EVENT_T(event));
-        }).join();
-        QTRY_COMPARE(NetworkCableStatus, event != 1);
-    }
-    QCOMPARE(log.lines().count("Notifycation: Network cable eth0 has plug out.\n"), 2);
-    QCOMPARE(log.lines().count("Notifycation: Network cable eth0 has plug in.\n"), 2);
-}
-
-void TestApp::replacesTheStatusDialog()
-{
-    const auto shows = [this](const QString &text) {
-        for (const QLabel *label : dialogs().first()->findChildren<QLabel *>()) {
-            if (label->text() == text)
-                return true;
-        }
-        return false;
-    };
-    mMain->handleCableStatusChange(false);
-    QVERIFY(shows(QStringLiteral("Error")));
-    mMain->handleCableStatusChange(true);
-    QCOMPARE(dialogs().size(), 1);
-    QVERIFY(shows(QStringLiteral("Notification")));
-    QVERIFY(dialogs().first()->isVisible());
-
-    KeyWidget below(mMain.get());
-    press(&below, DEVICE_LEFT_KEY);
-    QCOMPARE(dialogs().size(), 1);
-    press(&below, DEVICE_SELECT_KEY);
-    QVERIFY(dialogs().isEmpty());
-    press(&below, DEVICE_RIGHT_KEY);
-    QCOMPARE(below.keys, QList<int>({DEVICE_RIGHT_KEY}));
-}
 
 int main(int argc, char *argv[])
 {

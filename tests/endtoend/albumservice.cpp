@@ -64,6 +64,7 @@ bool AlbumService::addUser(const QString &mail, const QString &name, const QStri
                            const QString &password) const
 {
     const QString photos = mFolder.filePath("photos/" + folder);
+    QDir().mkpath(photos);
     run({"user", "add", mail, "--name", name, "--photos", photos});
     if (!password.isEmpty())
         run({"user", "passwd", mail}, password.toUtf8() + '\n');

@@ -6,6 +6,7 @@
 #include "common/ui/scale.h"
 #include "network/systemconfig.h"
 #include "res/resources.h"
+#include "ui/picturedetailwidget.h"
 #include "ui/upwidget.h"
 
 namespace {
@@ -104,6 +105,15 @@ void RemoteCase::type(const QString &text)
             pressKey(robot.box(), 0, letter); // as a keyboard at the device has it
     }
     robot.press(EnterKey);
+}
+
+void RemoteCase::runOnPhoto(DetailAction action)
+{
+    const auto actions = detailActions(mTv->shown<PictureDetailWidget>()->isSelfPhoto());
+    mTv->press(DEVICE_DOWN_KEY);
+    mTv->press(QList<int>::fromVector(QVector<int>(actions.size(), DEVICE_LEFT_KEY)));
+    mTv->press(QList<int>::fromVector(QVector<int>(actions.indexOf(action), DEVICE_RIGHT_KEY)));
+    mTv->press(DEVICE_SELECT_KEY);
 }
 
 bool RemoteCase::isListed(const QString &position, int cells) const

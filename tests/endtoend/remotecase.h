@@ -2,6 +2,7 @@
 
 #include "endtoend/albumservice.h"
 #include "endtoend/television.h"
+#include "ui/detailaction.h"
 
 #include <QTest>
 
@@ -33,6 +34,8 @@ protected:
     void walkTo(const QString &caption);
     // Types on the keyboard that is shown, and presses its Enter.
     void type(const QString &text);
+    // Runs an action of the photo screen, wherever the mark is there.
+    void runOnPhoto(DetailAction action);
     // The cells are on the screen, with their pictures, and the focus is at this position.
     bool isListed(const QString &position, int cells) const;
 

@@ -31,24 +31,9 @@ inline QJsonObject photo(const QString &title, const QString &thumbnail = QStrin
             {"media$group", QJsonObject{{"media$thumbnail", thumbnails}}}};
 }
 
-inline QJsonObject album(const QString &title, int photos, const QString &id,
-                         const QString &thumbnail = QString())
+inline QJsonObject album(const QString &title, int photos, const QString &id)
 {
-    QJsonArray thumbnails;
-    if (!thumbnail.isEmpty())
-        thumbnails << QJsonObject{{"url", thumbnail}};
-    return {{"title", text(title)},
-            {"gphoto$numphotos", text(photos)},
-            {"gphoto$id", text(id)},
-            {"media$group", QJsonObject{{"media$thumbnail", thumbnails}}}};
-}
-
-inline QJsonObject person(const QString &name, const QString &id,
-                          const QString &thumbnail = QString())
-{
-    return {{"gphoto$user", text(id)},
-            {"gphoto$nickname", text(name)},
-            {"gphoto$thumbnail", text(thumbnail)}};
+    return {{"title", text(title)}, {"gphoto$numphotos", text(photos)}, {"gphoto$id", text(id)}};
 }
 
 // Records first to last, named "<name> <number>".
@@ -72,7 +57,8 @@ inline QByteArray people(int count)
 {
     QJsonArray entries;
     for (int i = 1; i <= count; ++i)
-        entries << person("Person " + QString::number(i), "p" + QString::number(i));
+        entries << QJsonObject{{"gphoto$user", text("p" + QString::number(i))},
+                               {"gphoto$nickname", text("Person " + QString::number(i))}};
     return feed(entries, count);
 }
 

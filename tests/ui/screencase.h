@@ -12,8 +12,11 @@
 
 #include <QKeyEvent>
 #include <QSignalSpy>
+#include <QUrlQuery>
 #include <QtTest>
 
+#include <algorithm>
+#include <functional>
 #include <memory>
 
 // What the tests of the screens share: a configuration and a server of their own, and keys.
@@ -32,6 +35,20 @@ protected:
         mLog = std::make_unique<LogCapture>();
         mServer = std::make_unique<MisbehavingServer>();
     }
+    // A feed of the records 1 to `last`, cut into pages as asked for, that says to have `total`.
+    using Record = std::function<QJsonObject(int number)>;
+    static MisbehavingServer::Behaviour pages(int last, int total, const Record &record)
+    {
+        return [=](QTcpSocket *socket, const MisbehavingServer::Request &request) {
+            const QUrlQuery query(QUrl(QString::fromLatin1(request.path)));
+            const int start = qMax(1, query.queryItemValue("start-index").toInt());
+            const int end = qMin(last + 1, start + query.queryItemValue("max-results").toInt());
+            QJsonArray entries;
+            for (int number = start; number < end; ++number)
+                entries << record(number);
+            MisbehavingServer::answer(sample::feed(entries, total, "anna"))(socket, request);
+        };
+    }
     // When the screens are gone.
     void forgetAll()
     {
@@ -45,6 +62,12 @@ protected:
         for (int key : keys)
             QTest::sendKeyEvent(QTest::Press, QApplication::focusWidget(), Qt::Key(key), QString(),
                                 {});
+    }
+    int requestsFor(const QByteArray &start) const // by the beginning of their address
+    {
+        const auto isWanted = [&](const auto &one) { return one.path.startsWith(start); };
+        const auto &all = mServer->requests();
+        return int(std::count_if(all.begin(), all.end(), isWanted));
     }
     static void show(QWidget *screen)
     {

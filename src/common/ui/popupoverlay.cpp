@@ -2,6 +2,7 @@
 
 #include "network/systemconfig.h"
 
+#include <QApplication>
 #include <QGridLayout>
 #include <QKeyEvent>
 #include <QPainter>
@@ -26,6 +27,15 @@ PopupOverlay::PopupOverlay(QWidget *parent)
 PopupOverlay::~PopupOverlay()
 {
     giveFocusBack();
+}
+
+bool PopupOverlay::holdsFocus()
+{
+    for (const QWidget *at = QApplication::focusWidget(); at; at = at->parentWidget()) {
+        if (qobject_cast<const PopupOverlay *>(at) && at->isVisible())
+            return true;
+    }
+    return false;
 }
 
 void PopupOverlay::setPanel(QWidget *panel)
@@ -93,6 +103,8 @@ void PopupOverlay::giveFocusBack()
     const bool isOurs = focus == this || isAncestorOf(focus);
     if (isOurs && mFocusBefore && mFocusBefore->isVisible())
         mFocusBefore->setFocus();
+    else if (isOurs && mFocusBefore && parentWidget() && parentWidget()->isVisible())
+        parentWidget()->setFocus();
     mFocusBefore = nullptr;
 }
 

@@ -5,8 +5,9 @@
 
 // A child that lies over the whole of its parent, dims it and shows one panel in its middle; give
 // it a parent that fills the screen. While it is shown no key passes to what lies below. It takes
-// the focus when it is shown and gives it back to where it was when it goes; with the focus policy
-// Qt::NoFocus it leaves the focus alone, for a dialog that is handed its keys.
+// the focus when it is shown and gives it back to where it was when it goes, or to its parent when
+// that is not seen any longer; with the focus policy Qt::NoFocus it leaves the focus alone, for a
+// dialog that is handed its keys.
 //
 // An overlay inside an overlay covers that one, neither dims it again nor takes the focus by
 // itself. In a parent whose layout holds it, it keeps the place that the layout gives.
@@ -17,6 +18,9 @@ class PopupOverlay : public QWidget
 public:
     explicit PopupOverlay(QWidget *parent = nullptr);
     ~PopupOverlay() override;
+
+    // Whether the focus is in an overlay that is shown: a screen below leaves it there.
+    static bool holdsFocus();
 
     // The panel, which becomes a child; one that is there already is deleted later.
     void setPanel(QWidget *panel);
