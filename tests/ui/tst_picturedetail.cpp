@@ -204,7 +204,7 @@ private slots:
         QTRY_VERIFY(!stage()->isWaiting());
         QCOMPARE(mDetail->number(), 12);
         QCOMPARE(requestsFor("/p/"), 2); // the first and the last
-        QCOMPARE(requestsFor(QByteArray(kAlbum) + "/photoid"), 2);
+        QTRY_COMPARE(requestsFor(QByteArray(kAlbum) + "/photoid"), 2);
     }
 
     // In the list, newest first, whoever wrote them; only the reader's own can be deleted.
