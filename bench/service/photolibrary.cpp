@@ -126,6 +126,7 @@ const std::vector<std::string> &libraryWords()
 void writePhotos(const PhotoLibrary &library)
 {
     std::vector<std::string> jpegs;
+    jpegs.reserve(pictures);
     for (int i = 0; i < pictures; ++i)
         jpegs.push_back(smallJpeg(i));
     for (int photo = 0; photo < library.photos; ++photo) {

@@ -84,9 +84,9 @@ QJsonObject Chromium::next()
             qFatal("the browser has gone");
         mRead.append(buffer, int(size));
     }
-    const QJsonObject message = QJsonDocument::fromJson(mRead.left(end)).object();
+    QJsonObject message = QJsonDocument::fromJson(mRead.left(end)).object();
     mRead.remove(0, end + 1);
-    mLoaded = mLoaded || message["method"].toString() == "Page.loadEventFired";
+    mLoaded = mLoaded || message.value("method").toString() == "Page.loadEventFired";
     return message;
 }
 
